@@ -1,0 +1,107 @@
+# shellcheck shell=bash
+# SPDX-License-Identifier: MIT
+# What ./run, ./test and .ci/run share; sourced by them with `set -euo pipefail`. Each step says
+# what it does and how long it took, and a failure ends the program with one line that names it.
+
+root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd -P)
+program=$(basename "$0")
+current_step=
+
+die() {  # die MESSAGE...
+  printf '%s: %s\n' "$program" "$*" >&2
+  current_step=
+  exit 1
+}
+
+report_failure() {
+  local status=$?
+  if ((status != 0)) && [[ -n $current_step ]]; then
+    printf '\n%s: failed while %s (exit status %d)\n' "$program" "$current_step" "$status" >&2
+  fi
+}
+trap report_failure EXIT
+
+step() {  # step WHAT COMMAND...: runs the command under a heading
+  local start=$SECONDS
+  current_step=$1
+  shift
+  printf '== %s\n' "$current_step"
+  "$@"
+  printf -- '-- %s: %d s\n' "$current_step" $((SECONDS - start))
+  current_step=
+}
+
+processors() {
+  nproc 2>/dev/null || echo 2
+}
+
+listed_packages() {  # one a line; the list may hold comments
+  sed -e 's/#.*//' -e 's/[[:space:]]//g' -e '/^$/d' "$root/packages.txt"
+}
+
+missing_packages() {
+  local installed
+  # shellcheck disable=SC2016  # the format is dpkg-query's to expand
+  installed=$(dpkg-query --show --showformat='${db:Status-Status} ${Package}\n' |
+    sed -n 's/^installed //p')
+  listed_packages | grep -vxF "$installed" || true
+}
+
+as_root() {
+  if ((EUID == 0)); then
+    "$@"
+  elif command -v sudo >/dev/null; then
+    if [[ -n ${CI:-} ]]; then sudo -n "$@"; else sudo "$@"; fi
+  else
+    die "installing packages takes root or sudo; as root: apt-get install $(
+      missing_packages | tr '\n' ' ')"
+  fi
+}
+
+# Touches the network only when a package is missing. KESTRO_SKIP_PACKAGES=1 leaves packages alone.
+install_packages() {
+  if [[ -n ${KESTRO_SKIP_PACKAGES:-} ]]; then
+    return
+  fi
+  if ! command -v apt-get >/dev/null || ! command -v dpkg-query >/dev/null; then
+    printf 'Building Kestro needs what these Debian packages hold:\n'
+    listed_packages | sed 's/^/  /'
+    die "no apt here: install them your way, then run again with KESTRO_SKIP_PACKAGES=1"
+  fi
+
+  local missing=() package
+  while read -r package; do
+    missing+=("$package")
+  done < <(missing_packages)
+  if ((${#missing[@]} == 0)); then
+    return
+  fi
+  printf 'Installing: %s\n' "${missing[*]}"
+  # An index that cannot be refreshed may still be good enough; the installation itself decides.
+  as_root apt-get --quiet --option DPkg::Lock::Timeout=300 update || true
+  as_root env DEBIAN_FRONTEND=noninteractive apt-get --quiet --option DPkg::Lock::Timeout=300 \
+    --option Dpkg::Use-Pty=0 install --yes --no-install-recommends "${missing[@]}"
+}
+
+# A build tree made for another place (a copied or moved folder) is made anew.
+configure() {  # configure PRESET
+  local cache="$root/build/$1/CMakeCache.txt"
+  if [[ -f $cache ]] && ! grep -qxF "CMAKE_HOME_DIRECTORY:INTERNAL=$root" "$cache"; then
+    rm -rf "$root/build/$1"
+  fi
+  (cd "$root" && cmake --preset "$1" --log-level=NOTICE)
+}
+
+build() {  # build PRESET [TARGET...]
+  local preset=$1
+  shift
+  configure "$preset"
+  (cd "$root" && cmake --build --preset "$preset" ${1:+--target "$@"})
+}
+
+run_tests() {  # run_tests PRESET [CTEST ARGUMENT...]
+  local preset=$1
+  shift
+  (cd "$root" && ctest --preset "$preset" --parallel "$(processors)" "$@" |
+    tee "build/$preset/ctest.log")
+}
