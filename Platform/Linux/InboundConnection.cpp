@@ -1,0 +1,94 @@
+// SPDX-License-Identifier: MIT
+#include "Platform/Linux/InboundConnection.h"
+
+#include <utility>
+
+namespace kestro {
+namespace {
+
+/// How long one peer is served before others get their turn.
+constexpr std::chrono::milliseconds kTurn{10};
+
+/// Nothing more is read from a peer while more than this waits for it to be read.
+constexpr std::size_t kReplyBacklog = std::size_t{1024} * 1024;
+
+// What a handler throws ends the process where it was thrown: it must not unwind through the event
+// loop.
+std::optional<Bytes> callHandler(const ReceiveHandler& handler, const PortFrame& frame) noexcept {
+  return handler(frame.header.messageId, frame.body);
+}
+
+}  // namespace
+
+InboundConnection::InboundConnection(FileDescriptor socket, std::string portName,
+                                     std::shared_ptr<PortContext> context,
+                                     std::shared_ptr<const ReceiveHandler> handler,
+                                     ClosedHandler closed)
+    : PortConnection(std::move(socket), PortDirection::ToReceiver, std::move(portName),
+                     std::move(context)),
+      _handler(std::move(handler)),
+      _closed(std::move(closed)) {}
+
+void InboundConnection::disown() {
+  _closed = nullptr;
+  close();
+}
+
+void InboundConnection::onReadable() {
+  if (_serving) {
+    setReading(false);  // a handler runs an event loop of its own; `serve` goes on after it
+    return;
+  }
+  if (!reader().hasNext()) _ended = fill() == PortFrameReader::FillStatus::End;
+  serve();
+}
+
+void InboundConnection::onDrained() {
+  if (!_serving) serve();
+}
+
+void InboundConnection::onClosed() {
+  if (const auto closed = std::exchange(_closed, nullptr)) closed(*this);
+}
+
+bool InboundConnection::mayServe() noexcept { return isOpen() && queue().size() <= kReplyBacklog; }
+
+void InboundConnection::serve() {
+  _serving = true;
+  const auto turnEnd = std::chrono::steady_clock::now() + kTurn;
+  while (mayServe() && std::chrono::steady_clock::now() < turnEnd) {
+    const auto frame = nextFrame();
+    if (!frame) break;
+    answer(*frame);
+  }
+  _serving = false;
+  arrangeNextTurn();
+}
+
+void InboundConnection::arrangeNextTurn() {
+  const bool backlog = queue().size() > kReplyBacklog;  // `onDrained` goes on
+  const bool unserved = !backlog && reader().hasNext();
+  if (unserved) readNextTurn();
+  if (_ended && !backlog && !unserved) {
+    close();
+  } else {
+    setReading(!_ended && !backlog && !unserved);
+  }
+}
+
+void InboundConnection::answer(const PortFrame& frame) {
+  const auto handler = _handler;
+  std::optional<Bytes> reply = callHandler(*handler, frame);
+  if (frame.header.kind != PortFrameKind::Request) return;
+  if (reply && reply->size() > kMaximumMessageSize) {
+    note(fmt::format("a reply of {} bytes is dropped, at most {} are allowed", reply->size(),
+                     kMaximumMessageSize));
+    reply.reset();
+  }
+  enqueue({.kind = reply ? PortFrameKind::Reply : PortFrameKind::ReplyWithoutData,
+           .messageId = frame.header.messageId,
+           .sequence = frame.header.sequence},
+          reply ? ByteView(*reply) : ByteView());
+}
+
+}  // namespace kestro

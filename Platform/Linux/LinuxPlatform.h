@@ -1,0 +1,65 @@
+// SPDX-License-Identifier: MIT
+// The one door to the Linux platform. Qt, libplist, sockets, syslog and D-Bus stay behind it.
+#pragma once
+
+#include <functional>
+#include <memory>
+#include <optional>
+#include <string>
+
+#include "Platform/Platform.h"
+#include "Platform/Result.h"
+#include "Platform/SystemLog.h"
+
+namespace kestro {
+
+struct LinuxPlatformOptions {
+  /// Lines above this priority number are dropped; without a value nothing goes to the system log.
+  std::optional<LogPriority> logThreshold = LogPriority::Notice;
+  /// The port name of the telephony server to talk to.
+  std::string telephonyServerName = "TelephonyServer";
+  /// Where ports live; without a value the environment decides ($KESTRO_PORT_DIR and so on).
+  std::optional<std::string> portDirectory;
+  /// Whether the library's own standard output goes to the process's standard error, so that what
+  /// a program prints for other programs stays clean.
+  bool standardOutputToStandardError = true;
+};
+
+/// The platform of a running process, with its event loop. At most one exists at a time, made and
+/// used on the main thread. Where a QCoreApplication (or QApplication) exists already it is used,
+/// otherwise the platform makes one of its own.
+class LinuxPlatform : public Platform {
+ public:
+  /// Serves the main queue until `quit`; returns quit's exit status.
+  virtual int run() = 0;
+  virtual void quit(int exitStatus) = 0;
+
+  /// Calls `handler` on the main thread when the process is asked to end (SIGINT, SIGTERM, SIGHUP).
+  /// Without a handler the signals end the process as usual.
+  virtual void setTerminationHandler(std::function<void()> handler) = 0;
+
+  /// Calls `handler` on the main thread when the terminal's size changes (SIGWINCH).
+  virtual void setResizeHandler(std::function<void()> handler) = 0;
+
+  /// Waits, for at most a second, until the system log has every line so far. Who ends the process
+  /// without destroying the platform calls this first.
+  virtual void flushSystemLog() = 0;
+
+  /// Makes the default device root with the folders that saving needs, where the root itself is
+  /// absent; does nothing where $KESTRO_DEVICE_ROOT chooses another.
+  [[nodiscard]] virtual Result<void> createDefaultDeviceRoot() = 0;
+};
+
+[[nodiscard]] std::unique_ptr<LinuxPlatform> createLinuxPlatform(
+    const LinuxPlatformOptions& options = {});
+
+class PropertyListCoding;
+class Clock;
+class Bundle;
+
+/// Single services, for programs and tests that need no event loop.
+[[nodiscard]] std::unique_ptr<PropertyListCoding> createPropertyListCoding();
+[[nodiscard]] std::unique_ptr<Clock> createSystemClock();
+[[nodiscard]] std::unique_ptr<Bundle> createBundle();
+
+}  // namespace kestro

@@ -1,0 +1,231 @@
+// SPDX-License-Identifier: MIT
+#include "Platform/Linux/PropertyListNodes.h"
+
+#include <fmt/format.h>
+
+#include <cstdint>
+#include <cstdlib>
+#include <string>
+#include <string_view>
+
+#include "Platform/Linux/PropertyListDates.h"
+#include "Platform/Linux/Utf8.h"
+#include "Platform/PropertyListCoding.h"
+
+namespace kestro {
+namespace {
+
+/// What the library allocated for us.
+struct Freer {
+  void operator()(void* memory) const noexcept { std::free(memory); }
+};
+using AllocatedText = std::unique_ptr<char, Freer>;
+using Iterator = std::unique_ptr<void, Freer>;
+
+// --- From nodes to values
+
+class Reader {
+ public:
+  explicit Reader(const PropertyListFacts& facts) : _facts(facts) {}
+
+  [[nodiscard]] Value value(plist_t node) const {
+    switch (plist_get_node_type(node)) {
+      case PLIST_BOOLEAN:
+        return boolean(node);
+      case PLIST_UINT:
+        return integer(node);
+      case PLIST_REAL:
+        return real(node);
+      case PLIST_STRING:
+        return text(node);
+      case PLIST_DATE:
+        return date(node);
+      case PLIST_DATA:
+        return data(node);
+      case PLIST_ARRAY:
+        return array(node);
+      case PLIST_DICT:
+        return dictionary(node);
+      default:
+        return {};  // the scan lets no other kind pass
+    }
+  }
+
+ private:
+  [[nodiscard]] static Value boolean(plist_t node) {
+    std::uint8_t flag = 0;
+    plist_get_bool_val(node, &flag);
+    return Value::boolean(flag != 0);
+  }
+
+  [[nodiscard]] Value integer(plist_t node) const {
+    std::uint64_t bits = 0;
+    plist_get_uint_val(node, &bits);
+    if (_facts.hasLargeIntegers && !isWrittenNegative(node)) return Value::unsignedInteger(bits);
+    return Value::integer(static_cast<std::int64_t>(bits));
+  }
+
+  /// The library knows which integers are negative, but only its XML shows it.
+  [[nodiscard]] static bool isWrittenNegative(plist_t node) {
+    char* xml = nullptr;
+    std::uint32_t length = 0;
+    plist_to_xml(node, &xml, &length);
+    const AllocatedText owner(xml);
+    return std::string_view(xml, length).find("<integer>-") != std::string_view::npos;
+  }
+
+  [[nodiscard]] static Value real(plist_t node) {
+    double number = 0;
+    plist_get_real_val(node, &number);
+    return Value::real(number);
+  }
+
+  [[nodiscard]] static Value text(plist_t node) {
+    std::uint64_t length = 0;
+    const char* characters = plist_get_string_ptr(node, &length);
+    return std::string_view(characters, length);
+  }
+
+  // The library truncates towards zero and gives the fraction without its sign.
+  [[nodiscard]] static Value date(plist_t node) {
+    std::int32_t seconds = 0;
+    std::int32_t fraction = 0;
+    plist_get_date_val(node, &seconds, &fraction);
+    const std::chrono::microseconds microseconds(seconds < 0 ? -fraction : fraction);
+    return Value::date(kPropertyListEpoch + std::chrono::seconds(seconds) + microseconds);
+  }
+
+  [[nodiscard]] static Value data(plist_t node) {
+    std::uint64_t length = 0;
+    const char* bytes = plist_get_data_ptr(node, &length);
+    return Value::data(Bytes(bytes, bytes + length));
+  }
+
+  [[nodiscard]] Value array(plist_t node) const {
+    Array result;
+    result.reserve(plist_array_get_size(node));
+    void* state = nullptr;
+    plist_array_new_iter(node, &state);
+    const Iterator iterator(state);
+    while (true) {
+      plist_t element = nullptr;
+      plist_array_next_item(node, state, &element);
+      if (element == nullptr) return result;
+      result.append(value(element));
+    }
+  }
+
+  [[nodiscard]] Value dictionary(plist_t node) const {
+    Dictionary result;
+    void* state = nullptr;
+    plist_dict_new_iter(node, &state);
+    const Iterator iterator(state);
+    while (true) {
+      char* key = nullptr;
+      plist_t content = nullptr;
+      plist_dict_next_item(node, state, &key, &content);
+      const AllocatedText owner(key);
+      if (content == nullptr) return result;
+      result.set(key, value(content));
+    }
+  }
+
+  const PropertyListFacts& _facts;
+};
+
+// --- From values to nodes
+
+bool isWritable(std::string_view text) { return validTextPrefix(text) == text.size(); }
+
+PlistNode textNode(std::string_view text) {
+  if (!isWritable(text)) return nullptr;
+  return PlistNode(plist_new_string(std::string(text).c_str()));
+}
+
+/// The library's own function for integers takes large ones for negative; its parser does not.
+PlistNode largeIntegerNode(std::uint64_t number) {
+  const std::string xml =
+      fmt::format("<plist version=\"1.0\"><integer>{}</integer></plist>", number);
+  plist_t node = nullptr;
+  plist_from_xml(xml.data(), static_cast<std::uint32_t>(xml.size()), &node);
+  return PlistNode(node);
+}
+
+PlistNode integerNode(const Value& value) {
+  const auto bits = static_cast<std::uint64_t>(value.integerBits());
+  return value.isAboveInt64() ? largeIntegerNode(bits) : PlistNode(plist_new_uint(bits));
+}
+
+PlistNode dateNode(Moment moment) {
+  const auto sinceEpoch = moment - kPropertyListEpoch;
+  const auto seconds = std::chrono::floor<std::chrono::seconds>(sinceEpoch);
+  const auto fraction = std::chrono::microseconds(sinceEpoch - seconds);
+  if (!isPropertyListDate(static_cast<double>(seconds.count()))) return nullptr;
+  return PlistNode(plist_new_date(static_cast<std::int32_t>(seconds.count()),
+                                  static_cast<std::int32_t>(fraction.count())));
+}
+
+PlistNode dataNode(ByteView bytes) {
+  return PlistNode(plist_new_data(reinterpret_cast<const char*>(bytes.data()), bytes.size()));
+}
+
+PlistNode anyNode(const Value& value, std::size_t levels);
+
+PlistNode arrayNode(const Array& array, std::size_t levels) {
+  PlistNode result(plist_new_array());
+  for (const Value& element : array) {
+    PlistNode node = anyNode(element, levels);
+    if (!node) return nullptr;
+    plist_array_append_item(result.get(), node.release());
+  }
+  return result;
+}
+
+PlistNode dictionaryNode(const Dictionary& dictionary, std::size_t levels) {
+  PlistNode result(plist_new_dict());
+  for (const auto& [key, value] : dictionary) {
+    if (!key.isText() || !isWritable(key.text())) return nullptr;
+    PlistNode node = anyNode(value, levels);
+    if (!node) return nullptr;
+    plist_dict_set_item(result.get(), std::string(key.text()).c_str(), node.release());
+  }
+  return result;
+}
+
+PlistNode containerNode(const Value& value, std::size_t levels) {
+  if (levels > PropertyListLimits().levels) return nullptr;
+  return value.isArray() ? arrayNode(value.array(), levels)
+                         : dictionaryNode(value.dictionary(), levels);
+}
+
+/// `levels` counts the containers around the value.
+PlistNode anyNode(const Value& value, std::size_t levels) {
+  switch (value.type()) {
+    case ValueType::Null:
+      return nullptr;
+    case ValueType::Text:
+      return textNode(value.text());
+    case ValueType::Integer:
+      return integerNode(value);
+    case ValueType::Real:
+      return PlistNode(plist_new_real(value.realNumber()));
+    case ValueType::Boolean:
+      return PlistNode(plist_new_bool(value.flag() ? 1 : 0));
+    case ValueType::Date:
+      return dateNode(value.moment());
+    case ValueType::Data:
+      return dataNode(value.bytes());
+    case ValueType::Dictionary:
+    case ValueType::Array:
+      return containerNode(value, levels + 1);
+  }
+  return nullptr;
+}
+
+}  // namespace
+
+Value valueOf(plist_t root, const PropertyListFacts& facts) { return Reader(facts).value(root); }
+
+PlistNode nodeOf(const Value& value) { return anyNode(value, 0); }
+
+}  // namespace kestro

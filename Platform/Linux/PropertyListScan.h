@@ -1,0 +1,36 @@
+// SPDX-License-Identifier: MIT
+// The look at a property list before the library parses it. The library trusts its input: it takes
+// time and memory without bound for lists that unfold or nest, cuts texts at a NUL, reads octal
+// numbers and forgets what it does not understand. Whatever passes here it parses completely,
+// quickly, and with one meaning.
+#pragma once
+
+#include "Platform/Bytes.h"
+#include "Platform/PropertyListCoding.h"
+#include "Platform/Result.h"
+
+namespace kestro {
+
+/// What the scan knows and the library's interface cannot tell.
+struct PropertyListFacts {
+  /// Whether some integer is above 2^63 - 1. The library shows those and the negative ones alike.
+  bool hasLargeIntegers = false;
+};
+
+/// Whether the bytes begin as a binary list of the one version there is, "bplist00".
+[[nodiscard]] bool isBinaryPropertyList(ByteView bytes) noexcept;
+
+/// Checks a binary list: everything that the root object reaches lies inside the list, each object
+/// has a kind that a property list holds and a well-formed content, keys are texts, and the limits
+/// hold, shared objects counted (nodes and bytes) each time they are reached.
+[[nodiscard]] Result<PropertyListFacts> scanBinaryPropertyList(ByteView bytes,
+                                                               const PropertyListLimits& limits);
+
+/// Checks an XML list: UTF-8 without NUL, well-formed as far as property lists go, numbers, dates
+/// and data that mean what they say, and the limits. Refused although XML allows them: internal
+/// subsets of the DOCTYPE (and with them entities of its own), processing instructions, attributes
+/// but for those of <plist>, and comments inside a text.
+[[nodiscard]] Result<PropertyListFacts> scanXmlPropertyList(ByteView bytes,
+                                                            const PropertyListLimits& limits);
+
+}  // namespace kestro

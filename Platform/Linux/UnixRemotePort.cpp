@@ -1,0 +1,106 @@
+// SPDX-License-Identifier: MIT
+#include "Platform/Linux/UnixRemotePort.h"
+
+#include <poll.h>
+
+#include <utility>
+
+namespace kestro {
+
+UnixRemotePort::UnixRemotePort(FileDescriptor socket, std::string portName,
+                               std::shared_ptr<PortContext> context)
+    : PortConnection(std::move(socket), PortDirection::ToSender, std::move(portName),
+                     std::move(context)) {}
+
+UnixRemotePort::~UnixRemotePort() { close(); }
+
+bool UnixRemotePort::isValid() const {
+  if (!isOpen()) return false;
+  const short state = waitFor(POLLRDHUP, portDeadline(std::chrono::nanoseconds(0)));
+  return (state & (POLLRDHUP | POLLHUP | POLLERR | POLLNVAL)) == 0;
+}
+
+SendError UnixRemotePort::post(std::int32_t messageId, ByteView message) {
+  if (!isOpen()) return SendError::InvalidPort;
+  if (message.size() > kMaximumMessageSize) return SendError::Transport;
+  const std::size_t size = PortFrameHeader::kSize + message.size();
+  const auto overflows = [&] { return queue().size() + size > kMaximumQueuedBytes; };
+  if (overflows()) flush();
+  if (overflows()) {
+    abandon(fmt::format("the peer does not read: {} bytes wait, at most {} may",
+                        queue().size() + size, kMaximumQueuedBytes));
+  }
+  if (!isOpen()) return SendError::Transport;
+  enqueue({.kind = PortFrameKind::Message, .messageId = messageId}, message);
+  return isOpen() ? SendError::None : SendError::Transport;
+}
+
+SendError UnixRemotePort::send(std::int32_t messageId, ByteView message,
+                               std::chrono::nanoseconds sendTimeout) {
+  return transmit({.kind = PortFrameKind::Message, .messageId = messageId}, message,
+                  portDeadline(sendTimeout));
+}
+
+RemotePort::Reply UnixRemotePort::request(std::int32_t messageId, ByteView message,
+                                          std::chrono::nanoseconds sendTimeout,
+                                          std::chrono::nanoseconds receiveTimeout) {
+  if (++_lastSequence == 0) ++_lastSequence;
+  const std::uint32_t sequence = _lastSequence;
+  const SendError error =
+      transmit({.kind = PortFrameKind::Request, .messageId = messageId, .sequence = sequence},
+               message, portDeadline(sendTimeout));
+  if (error != SendError::None) return {error, {}};
+  return awaitReply(sequence, portDeadline(receiveTimeout));
+}
+
+SendError UnixRemotePort::transmit(const PortFrameHeader& header, ByteView message,
+                                   PortDeadline deadline) {
+  if (!isValid()) return SendError::InvalidPort;
+  if (message.size() > kMaximumMessageSize) return SendError::Transport;
+  context().flusher.flushAll();
+  if (!isOpen()) return SendError::Transport;
+  const PortSendQueue::Position position = queue().append(header, message);
+  for (flush(); isOpen() && !queue().empty(); flush()) {
+    const short ready = waitFor(POLLOUT | POLLIN, deadline);
+    if (ready == 0) {
+      queue().withdraw(position);
+      return SendError::SendTimeout;
+    }
+    // A peer may be unable to read on before its replies are taken.
+    if ((ready & POLLIN) != 0) onReadable();
+  }
+  return isOpen() ? SendError::None : SendError::Transport;
+}
+
+RemotePort::Reply UnixRemotePort::awaitReply(std::uint32_t sequence, PortDeadline deadline) {
+  for (;;) {
+    if (const auto reply = findReply(sequence)) {
+      if (reply->header.kind == PortFrameKind::ReplyWithoutData) return {};
+      return {SendError::None, Bytes(reply->body.begin(), reply->body.end())};
+    }
+    if (!isOpen()) return {SendError::Transport, {}};
+    if (waitFor(POLLIN, deadline) == 0) return {SendError::ReceiveTimeout, {}};
+    if (!readOnce()) close();
+  }
+}
+
+std::optional<PortFrame> UnixRemotePort::findReply(std::uint32_t sequence) {
+  while (isOpen()) {
+    const auto frame = nextFrame();
+    if (!frame || frame->header.sequence == sequence) return frame;
+  }
+  return std::nullopt;
+}
+
+// False when the connection is over. The replies that came before its end stay to be found.
+bool UnixRemotePort::readOnce() { return isOpen() && fill() != PortFrameReader::FillStatus::End; }
+
+void UnixRemotePort::onReadable() {
+  constexpr std::uint32_t kNobodys = 0;  // no reply has this sequence
+  static_cast<void>(findReply(kNobodys));
+  const bool open = readOnce();
+  static_cast<void>(findReply(kNobodys));
+  if (!open) close();
+}
+
+}  // namespace kestro

@@ -1,0 +1,25 @@
+// SPDX-License-Identifier: MIT
+// What stands inside the XML elements of numbers, booleans, dates and data, and inside entities.
+#pragma once
+
+#include <string_view>
+
+namespace kestro {
+
+struct LeafVerdict {
+  std::string_view problem;     ///< empty when the element is in order; else lives for ever
+  bool isLargeInteger = false;  ///< an integer above 2^63 - 1
+};
+
+/// Checks an element that is neither a container nor a text: its name ("integer", "true", …) and
+/// its content, which is empty for an empty element.
+[[nodiscard]] LeafVerdict checkXmlLeaf(std::string_view name, std::string_view content);
+
+/// Whether `name`, the part between '&' and ';', is one of XML's five entities or the number of a
+/// Unicode character other than NUL.
+[[nodiscard]] bool isXmlEntity(std::string_view name);
+
+/// Whether an XML declaration ("<?xml …" without its end) names UTF-8 or no encoding.
+[[nodiscard]] bool isUtf8Declaration(std::string_view declaration);
+
+}  // namespace kestro

@@ -1,0 +1,52 @@
+// SPDX-License-Identifier: MIT
+// Property lists as bytes: XML and binary.
+#pragma once
+
+#include <cstddef>
+#include <optional>
+
+#include "Platform/Bytes.h"
+#include "Platform/PropertyList.h"
+#include "Platform/Result.h"
+
+namespace kestro {
+
+/// What a property list may hold before it is refused as unparsable. The count of nodes takes a
+/// shared reference of a binary list anew each time it is reached, and every dictionary entry as a
+/// key and a value.
+struct PropertyListLimits {
+  std::size_t levels = 128;  ///< of containers inside one another
+  std::size_t nodes = 200'000;
+  std::size_t bytes = std::size_t{16} * 1024 * 1024;
+
+  /// For what arrives from a port or in a packet.
+  [[nodiscard]] static constexpr PropertyListLimits message() noexcept { return {}; }
+  /// For snapshot files, which hold whole histories of displays and raw packets.
+  [[nodiscard]] static constexpr PropertyListLimits snapshotFile() noexcept {
+    return {.bytes = std::size_t{1024} * 1024 * 1024};
+  }
+};
+
+class PropertyListCoding {
+ public:
+  PropertyListCoding() = default;
+  virtual ~PropertyListCoding() = default;
+  PropertyListCoding(const PropertyListCoding&) = delete;
+  PropertyListCoding& operator=(const PropertyListCoding&) = delete;
+
+  /// Parses XML or binary, told apart by the bytes. The order of dictionary entries is the order in
+  /// the list; of entries with one key the last counts. The error says what is wrong and, where
+  /// known, at which byte. Texts that are not UTF-8 or hold a NUL are refused.
+  [[nodiscard]] virtual Result<Value> parse(
+      ByteView bytes, const PropertyListLimits& limits = PropertyListLimits::message()) const = 0;
+
+  /// The XML form, version 1.0, without a DOCTYPE line. Absent when `value` cannot be serialised:
+  /// it is null, or holds a null value, a dictionary key that is no text, a text that is not UTF-8
+  /// or holds a NUL, a date outside 1933 to 2068, or containers more than 128 levels deep.
+  [[nodiscard]] virtual std::optional<Bytes> xml(const Value& value) const = 0;
+
+  /// The binary form; absent in the same cases.
+  [[nodiscard]] virtual std::optional<Bytes> binary(const Value& value) const = 0;
+};
+
+}  // namespace kestro

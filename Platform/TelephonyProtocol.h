@@ -1,0 +1,51 @@
+// SPDX-License-Identifier: MIT
+// The messages between the telephony server and its clients: ids, keys and error numbers, named
+// once for both sides. Documentation/message-ports.md describes them.
+#pragma once
+
+#include <cstdint>
+#include <string_view>
+
+namespace kestro {
+
+/// The messages, by id. Bodies are XML property lists (a dictionary) unless said otherwise.
+enum class TelephonyMessage : std::int32_t {
+  /// On a channel port: a command; on the client's local port: log data, unparsed.
+  Channel = 0,
+  /// One-way, to the server: kTelephonyNotificationPort.
+  Register = 1,
+  /// Request, to the server: kTelephonyLocalPort. Reply: kTelephonyError, kTelephonyPort.
+  CreateLogChannel = 2,
+  /// One-way, to a registered notification port: kTelephonyNotification.
+  Notification = 3,
+};
+
+[[nodiscard]] constexpr std::int32_t messageId(TelephonyMessage message) noexcept {
+  return static_cast<std::int32_t>(message);
+}
+
+/// Register: the name of the client's port that wants notifications (text).
+inline constexpr std::string_view kTelephonyNotificationPort = "NotificationPort";
+/// CreateLogChannel: the name of the client's port that log data goes to (text).
+inline constexpr std::string_view kTelephonyLocalPort = "LocalPort";
+/// Its reply: an error number (integer, 0 for none) and, without error, the channel's port (text).
+inline constexpr std::string_view kTelephonyError = "Error";
+inline constexpr std::string_view kTelephonyPort = "Port";
+/// Notification: what happened (text).
+inline constexpr std::string_view kTelephonyNotification = "Notification";
+inline constexpr std::string_view kTelephonyTechnologyChanged = "TechnologyChanged";
+
+/// On a channel port: the request for the technology, and the reply's entry of the same name.
+inline constexpr std::string_view kTelephonyGetTechnology = "GetTechnology";
+
+/// Why there is no log channel. The server answers with the positive numbers; the numbers -1 to -4
+/// are those of SendError, -5 a reply that does not say what it should.
+enum class LogChannelError : long {
+  None = 0,
+  BadRequest = 1,      ///< no dictionary, or its local port is missing or no port name
+  NoLocalPort = 2,     ///< nobody owns the local port, or it takes no connection
+  NoChannel = 3,       ///< the server cannot open a port for it, or has too many
+  UnusableReply = -5,  ///< found by the client: no reply data, or not the expected dictionary
+};
+
+}  // namespace kestro

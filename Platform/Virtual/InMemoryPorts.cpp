@@ -1,0 +1,165 @@
+// SPDX-License-Identifier: MIT
+#include "Platform/Virtual/InMemoryPorts.h"
+
+#include <utility>
+#include <vector>
+
+#include "Platform/PortName.h"
+
+namespace kestro {
+namespace {
+
+constexpr std::size_t kMaximumWaitingBytes = std::size_t{4} * 1024 * 1024;
+
+}  // namespace
+
+class InMemoryPorts::Local : public LocalPort, public std::enable_shared_from_this<Local> {
+ public:
+  Local(MainQueue& queue, ReceiveHandler handler) : _queue(queue), _handler(std::move(handler)) {}
+
+  void setInvalidationHandler(std::function<void()> handler) override {
+    _invalidationHandler = std::move(handler);
+  }
+
+  void invalidate() override {
+    if (!_valid) return;
+    _valid = false;
+    _waiting.clear();
+    if (const auto handler = std::exchange(_invalidationHandler, {})) handler();
+  }
+
+  [[nodiscard]] bool isValid() const override { return _valid; }
+
+  /// Takes a message for delivery; false when too much waits already.
+  bool enqueue(std::int32_t messageId, ByteView message) {
+    if (_waitingBytes + message.size() > kMaximumWaitingBytes) return false;
+    _waitingBytes += message.size();
+    _waiting.push_back({messageId, Bytes(message.begin(), message.end())});
+    if (!_stalled) scheduleDelivery();
+    return true;
+  }
+
+  std::optional<Bytes> answer(std::int32_t messageId, ByteView message) {
+    return _handler(messageId, message);
+  }
+
+  void setStalled(bool stalled) {
+    _stalled = stalled;
+    if (stalled) return;
+    for (std::size_t i = 0; i < _waiting.size(); ++i) scheduleDelivery();
+  }
+
+ private:
+  struct Message {
+    std::int32_t id;
+    Bytes bytes;
+  };
+
+  void scheduleDelivery() {
+    _queue.post([weak = weak_from_this()] {
+      if (const auto port = weak.lock()) port->deliverFirst();
+    });
+  }
+
+  void deliverFirst() {
+    if (!_valid || _stalled || _waiting.empty()) return;
+    const Message message = std::move(_waiting.front());
+    _waiting.pop_front();
+    _waitingBytes -= message.bytes.size();
+    static_cast<void>(_handler(message.id, message.bytes));
+  }
+
+  MainQueue& _queue;
+  ReceiveHandler _handler;
+  std::function<void()> _invalidationHandler;
+  std::deque<Message> _waiting;
+  std::size_t _waitingBytes = 0;
+  bool _valid = true;
+  bool _stalled = false;
+};
+
+class InMemoryPorts::Remote : public RemotePort {
+ public:
+  Remote(InMemoryPorts& ports, std::weak_ptr<Local> receiver)
+      : _ports(ports), _receiver(std::move(receiver)) {}
+
+  SendError post(std::int32_t messageId, ByteView message) override {
+    return deliver(messageId, message, _ports._failures.post);
+  }
+
+  SendError send(std::int32_t messageId, ByteView message, std::chrono::nanoseconds) override {
+    return deliver(messageId, message, _ports._failures.send);
+  }
+
+  [[nodiscard]] Reply request(std::int32_t messageId, ByteView message, std::chrono::nanoseconds,
+                              std::chrono::nanoseconds) override {
+    const auto receiver = valid();
+    if (!receiver) return {SendError::InvalidPort, {}};
+    if (const auto meanwhile = std::exchange(_ports._failures.duringRequest, {})) meanwhile();
+    if (auto failure = std::exchange(_ports._failures.request, std::nullopt)) return *failure;
+    return {SendError::None, receiver->answer(messageId, message)};
+  }
+
+  void invalidate() override { _receiver.reset(); }
+
+  [[nodiscard]] bool isValid() const override { return valid() != nullptr; }
+
+ private:
+  [[nodiscard]] std::shared_ptr<Local> valid() const {
+    auto receiver = _receiver.lock();
+    return receiver && receiver->isValid() ? receiver : nullptr;
+  }
+
+  SendError deliver(std::int32_t messageId, ByteView message, std::optional<SendError>& failure) {
+    const auto receiver = valid();
+    if (!receiver) return SendError::InvalidPort;
+    if (const auto error = std::exchange(failure, std::nullopt)) return *error;
+    if (message.size() > kMaximumMessageSize) return SendError::Transport;
+    if (receiver->enqueue(messageId, message)) return SendError::None;
+    invalidate();
+    return SendError::Transport;
+  }
+
+  InMemoryPorts& _ports;
+  std::weak_ptr<Local> _receiver;
+};
+
+std::shared_ptr<LocalPort> InMemoryPorts::createLocalPort(std::string_view name,
+                                                          ReceiveHandler handler) {
+  if (std::exchange(_failures.localPort, false) || !isPortName(name) || exists(name))
+    return nullptr;
+  auto port = std::make_shared<Local>(_queue, std::move(handler));
+  _ports.insert_or_assign(std::string(name), port);
+  return port;
+}
+
+std::shared_ptr<RemotePort> InMemoryPorts::createRemotePort(std::string_view name) {
+  const auto receiver = find(name);
+  if (std::exchange(_failures.remotePort, false) || !receiver) return nullptr;
+  return std::make_shared<Remote>(*this, receiver);
+}
+
+std::vector<std::string> InMemoryPorts::names() const {
+  std::vector<std::string> result;
+  for (const auto& [name, port] : _ports) {
+    if (exists(name)) result.push_back(name);
+  }
+  return result;
+}
+
+void InMemoryPorts::lose(std::string_view name) {
+  if (const auto port = find(name)) port->invalidate();
+}
+
+void InMemoryPorts::setStalled(std::string_view name, bool stalled) {
+  if (const auto port = find(name)) port->setStalled(stalled);
+}
+
+std::shared_ptr<InMemoryPorts::Local> InMemoryPorts::find(std::string_view name) const {
+  const auto found = _ports.find(name);
+  if (found == _ports.end()) return nullptr;
+  auto port = found->second.lock();
+  return port && port->isValid() ? port : nullptr;
+}
+
+}  // namespace kestro

@@ -1,0 +1,59 @@
+// SPDX-License-Identifier: MIT
+// Message ports within one process, with failures on request.
+#pragma once
+
+#include <deque>
+#include <functional>
+#include <map>
+#include <memory>
+#include <optional>
+#include <string>
+
+#include "Platform/MainQueue.h"
+#include "Platform/MessagePort.h"
+
+namespace kestro {
+
+/// Ports that deliver through a main queue, in the order of sending. A request calls the receiver's
+/// handler at once, as the wait for a reply serves nothing else.
+class InMemoryPorts : public MessagePorts {
+ public:
+  /// What goes wrong next; each failure is used up by the first operation that it applies to.
+  struct Failures {
+    bool localPort = false;                    ///< createLocalPort yields null
+    bool remotePort = false;                   ///< createRemotePort yields null
+    std::optional<SendError> post;             ///< post yields this and delivers nothing
+    std::optional<SendError> send;             ///< send yields this and delivers nothing
+    std::optional<RemotePort::Reply> request;  ///< request yields this and delivers nothing
+    std::function<void()> duringRequest;       ///< runs while the next request waits
+  };
+
+  explicit InMemoryPorts(MainQueue& queue) : _queue(queue) {}
+
+  [[nodiscard]] std::shared_ptr<LocalPort> createLocalPort(std::string_view name,
+                                                           ReceiveHandler handler) override;
+  [[nodiscard]] std::shared_ptr<RemotePort> createRemotePort(std::string_view name) override;
+
+  Failures& failures() noexcept { return _failures; }
+
+  /// Whether somebody owns the name.
+  [[nodiscard]] bool exists(std::string_view name) const { return find(name) != nullptr; }
+  /// The names in use, in order.
+  [[nodiscard]] std::vector<std::string> names() const;
+  /// Makes the owner of `name` lose it, as if its file had been removed.
+  void lose(std::string_view name);
+  /// Stops or resumes the delivery of messages to `name`; meanwhile they wait, up to 4 MiB.
+  void setStalled(std::string_view name, bool stalled);
+
+ private:
+  class Local;
+  class Remote;
+
+  [[nodiscard]] std::shared_ptr<Local> find(std::string_view name) const;
+
+  MainQueue& _queue;
+  Failures _failures;
+  std::map<std::string, std::weak_ptr<Local>, std::less<>> _ports;
+};
+
+}  // namespace kestro
