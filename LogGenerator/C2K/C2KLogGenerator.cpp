@@ -1,0 +1,209 @@
+// SPDX-License-Identifier: MIT
+#include "LogGenerator/C2K/C2KLogGenerator.h"
+
+#include <algorithm>
+#include <array>
+
+#include "LogGenerator/C2K/C2KState.h"
+#include "LogGenerator/C2K/EVDOPilots.h"
+#include "LogGenerator/C2K/EVDOStatus.h"
+#include "LogGenerator/C2K/EVDOThroughput.h"
+#include "LogGenerator/C2K/FrameErrorRate.h"
+#include "LogGenerator/C2K/OneXStatus.h"
+#include "LogGenerator/C2K/OneXSystemParameters.h"
+#include "LogGenerator/DisplayKeys.h"
+#include "LogGenerator/Packets/PacketHeader.h"
+#include "Platform/Bundle.h"
+#include "Platform/PropertyListCoding.h"
+#include "Platform/SystemLog.h"
+
+namespace kestro {
+namespace {
+
+constexpr std::string_view kTemplateName = "C2KTemplate";
+constexpr std::string_view kTemplateExtension = "plist";
+
+std::vector<std::unique_ptr<C2KParser>> makeParsers() {
+  std::vector<std::unique_ptr<C2KParser>> parsers;
+  parsers.push_back(std::make_unique<EVDOFingers>());
+  parsers.push_back(std::make_unique<EVDOStatus>());
+  parsers.push_back(std::make_unique<EVDOThroughput>(kForwardThroughput));
+  parsers.push_back(std::make_unique<EVDOActiveSet>());
+  parsers.push_back(std::make_unique<OneXStatus>());
+  parsers.push_back(std::make_unique<TrafficFrame>());
+  parsers.push_back(std::make_unique<EVDOThroughput>(kReverseThroughput));
+  parsers.push_back(std::make_unique<OneXSystemParameters>());
+  return parsers;
+}
+
+/// The value as the display shows it: once for each place of its name, or of its row's list.
+void visitAtPlaces(const TemplatePlaces& places, ExplainedValue value,
+                   const ExplainVisitor& visit) {
+  const std::span<const DisplayPlace> shownAt =
+      places.of(value.list.empty() ? value.key : value.list);
+  for (const DisplayPlace& place : shownAt) {
+    value.section = place.section;
+    (value.list.empty() ? value.key : value.list) = place.key;
+    visit(value);
+  }
+  if (shownAt.empty()) visit(value);
+}
+
+/// What the display takes from one code, section by section in the order of the names.
+std::vector<CatalogueEntry> entriesOf(const C2KParser& parser, const TemplatePlaces& places) {
+  std::vector<CatalogueEntry> entries;
+  const PacketReading& reading = parser.reading();
+  const auto add = [&](std::string_view section, std::string_view key) {
+    auto entry = std::ranges::find(entries, section, &CatalogueEntry::section);
+    if (entry == entries.end()) {
+      entry = entries.insert(entry, {.code = reading.code,
+                                     .packetName = reading.packetName,
+                                     .minimumLength = reading.minimumLength,
+                                     .section = section});
+    }
+    entry->keys.push_back({.key = key});
+  };
+  for (const std::string_view name : parser.lookupNames()) {
+    const std::span<const DisplayPlace> shownAt = places.of(name);
+    for (const DisplayPlace& place : shownAt) add(place.section, place.key);
+    if (shownAt.empty()) add(reading.packetName, name);
+  }
+  return entries;
+}
+
+}  // namespace
+
+std::unique_ptr<C2KLogGenerator> C2KLogGenerator::generator(Platform& platform) {
+  return std::make_unique<C2KLogGenerator>(platform);
+}
+
+C2KLogGenerator::C2KLogGenerator(Platform& platform)
+    : OndrelLogGenerator(platform), _parsers(makeParsers()) {
+  init();
+}
+
+Dictionary C2KLogGenerator::getStartCommand() const {
+  Array codes;
+  for (const auto& parser : _parsers) codes.append(Value::integer(parser->reading().code));
+  return {{"SetState", "Streaming"}, {"SetOndrelLogCodes", codes}};
+}
+
+std::span<const std::string_view> C2KLogGenerator::stateKeys() const {
+  static constexpr std::array kKeys = {kStateDisplay,    kStateExtraInfo,    kStateTemplate,
+                                       kStateLookup,     kStateTrafficFER,   kStateFLDataSeqNum,
+                                       kStateFLDataSent, kStateRLDataSeqNum, kStateRLDataSent};
+  return kKeys;
+}
+
+// --- Packets
+// ---------------------------------------------------------------------------------------
+
+C2KParser* C2KLogGenerator::parserOf(LogCode code) const noexcept {
+  const auto parser = std::ranges::find(
+      _parsers, code, [](const auto& candidate) { return candidate->reading().code; });
+  return parser == _parsers.end() ? nullptr : parser->get();
+}
+
+void C2KLogGenerator::updateStateWithData(Dictionary& state, ByteView data) {
+  getDisplayFromState(state);
+  updateFromLogUsingLookupUsingState(data, state[kStateLookup].dictionary(), state);
+}
+
+void C2KLogGenerator::updateFromLogUsingLookupUsingState(ByteView message, const Dictionary& lookup,
+                                                         Dictionary& state) {
+  if (message.size() < kPacketHeaderSize) return;
+  const PacketView packet(packetOfMessage(message));
+  if (logTypeOf(packet) != kBasebandLogType) {
+    // The packet is not dropped, whatever the line says.
+    platform().systemLog().log(LogPriority::Error, "Invalid log type: {:x}. Dropping.",
+                               logTypeOf(packet));
+  }
+  C2KParser* parser = parserOf(logCodeOf(packet));
+  if (parser == nullptr) return;
+  C2KOutput output{state, LookupTable(lookup), platform().systemLog()};
+  parser->parse(packet, output);
+  collect(packet.bytes());
+}
+
+void C2KLogGenerator::explainMessage(ByteView message, const ExplainVisitor& visit) const {
+  if (message.size() < kPacketHeaderSize) return;
+  const PacketView packet(packetOfMessage(message));
+  const C2KParser* parser = parserOf(logCodeOf(packet));
+  if (parser == nullptr) return;
+  parser->explain(packet,
+                  [&](const ExplainedValue& value) { visitAtPlaces(places(), value, visit); });
+}
+
+void C2KLogGenerator::catalogue(const CatalogueVisitor& visit) const {
+  for (const auto& parser : _parsers) {
+    for (const CatalogueEntry& entry : entriesOf(*parser, places())) visit(entry);
+  }
+}
+
+// --- Display
+// ---------------------------------------------------------------------------------------
+
+Value C2KLogGenerator::generateLogUsingState(Dictionary& state) {
+  Value display = getDisplayFromState(state);
+  handOverCollected(state);
+  updateHistoryInState(state, platform().clock());
+  return display;
+}
+
+Value C2KLogGenerator::getDisplayFromState(Dictionary& state) {
+  Value known = state[kStateDisplay];
+  if (!known.isNull()) return known;
+  const Value displayTemplate = templateOfState(state);
+  if (displayTemplate.isNull()) {
+    platform().systemLog().write(LogPriority::Error, "Cannot load C2K template for display");
+    return {};
+  }
+  Dictionary display;
+  Dictionary lookup;
+  processTemplateStoreDisplayIntoDictStoreLookupIntoDict(displayTemplate.dictionary(), display,
+                                                         lookup);
+  state.set(kStateDisplay, display);
+  state.set(kStateLookup, lookup);
+  state.set(kStateExtraInfo, Dictionary());
+  return display;
+}
+
+void C2KLogGenerator::processTemplateStoreDisplayIntoDictStoreLookupIntoDict(
+    const Dictionary& displayTemplate, Dictionary& display, Dictionary& lookup) const {
+  LookupTable table(lookup);
+  for (const auto& [key, value] : displayTemplate) {
+    if (value.isDictionary()) {
+      Dictionary section;
+      processTemplateStoreDisplayIntoDictStoreLookupIntoDict(value.dictionary(), section, lookup);
+      display.set(key, section);
+    } else if (value.isText() && value.text() == kSortedMarker) {
+      display.set(key, value);
+    } else if (value.isText()) {
+      display.set(key, "");
+      table.addTarget(value, key, display);
+    }
+  }
+  platform().systemLog().write(LogPriority::Warning, "Processing the template");
+}
+
+Value C2KLogGenerator::templateOfState(Dictionary& state) {
+  Value known = state[kStateTemplate];
+  if (!known.isNull()) return known;
+  Value loaded = loadTemplate();
+  if (!loaded.isNull()) state.set(kStateTemplate, loaded);
+  return loaded;
+}
+
+Value C2KLogGenerator::loadTemplate() const {
+  const auto contents = platform().bundle().resource(kTemplateName, kTemplateExtension);
+  if (!contents) return {};
+  Result<Value> parsed = platform().propertyListCoding().parse(*contents);
+  return parsed && parsed->isDictionary() ? *parsed : Value();
+}
+
+const TemplatePlaces& C2KLogGenerator::places() const {
+  if (!_places) _places.emplace(loadTemplate().dictionary());
+  return *_places;
+}
+
+}  // namespace kestro

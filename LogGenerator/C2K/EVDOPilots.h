@@ -1,0 +1,55 @@
+// SPDX-License-Identifier: MIT
+// The EV-DO packets that list pilots: 0x12B6 (active set) and 0x108A (finger carrier to
+// interference).
+#pragma once
+
+#include "LogGenerator/C2K/C2KParser.h"
+
+namespace kestro {
+
+extern const PacketReading kEVDOActiveSetReading;
+extern const PacketReading kEVDOFingersReading;
+
+/// Shows one list of pilots. How long a packet with so many of them is, its code decides.
+class EVDOPilots : public C2KParser {
+ public:
+  void parse(PacketView packet, C2KOutput& output) override;
+  void explain(PacketView packet, const ExplainVisitor& visit) const override;
+
+ protected:
+  explicit EVDOPilots(const PacketReading& pilotsReading);
+
+  /// The length of a packet with as many records as this one says it has.
+  [[nodiscard]] std::size_t lengthWithRecords(PacketView packet) const;
+  [[nodiscard]] std::size_t recordsIn(PacketView packet) const;
+
+  [[nodiscard]] virtual bool hasRightLength(PacketView packet) const = 0;
+  virtual void reportLength(PacketView packet, SystemLog& log) const = 0;
+
+ private:
+  [[nodiscard]] const RecordTable& table() const { return reading().lists[0].table; }
+
+  BoundField _pnOffset;
+  BoundField _energy;
+  LookupName _name;
+};
+
+class EVDOActiveSet : public EVDOPilots {
+ public:
+  EVDOActiveSet() : EVDOPilots(kEVDOActiveSetReading) {}
+
+ protected:
+  [[nodiscard]] bool hasRightLength(PacketView packet) const override;
+  void reportLength(PacketView packet, SystemLog& log) const override;
+};
+
+class EVDOFingers : public EVDOPilots {
+ public:
+  EVDOFingers() : EVDOPilots(kEVDOFingersReading) {}
+
+ protected:
+  [[nodiscard]] bool hasRightLength(PacketView packet) const override;
+  void reportLength(PacketView packet, SystemLog& log) const override;
+};
+
+}  // namespace kestro

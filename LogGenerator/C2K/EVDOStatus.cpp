@@ -1,0 +1,54 @@
+// SPDX-License-Identifier: MIT
+#include "LogGenerator/C2K/EVDOStatus.h"
+
+#include "LogGenerator/C2K/BandClass.h"
+
+namespace kestro {
+namespace {
+
+constexpr NamedValue kDeviceStates[] = {
+    {0, "Inactive [0]"}, {1, "Acquisition [1]"}, {2, "Sync [2]"},
+    {3, "Idle [3]"},     {4, "Access [4]"},      {5, "Connected [5]"},
+};
+constexpr NamedValue kSessionStates[] = {
+    {0, "Closed [0]"},        {1, "AMP setup [1]"}, {2, "AT-initiated neg [2]"},
+    {3, "Initiated neg [3]"}, {4, "Open [4]"},
+};
+
+constexpr Place kDeviceState = u8(36);
+/// In earlier states there is no transmitter and no second receiver.
+constexpr Condition kHasAccess = between(kDeviceState, 4, 255);
+
+constexpr Field kFields[] = {
+    {"kChannel", u16(13).bits(0, 10), decimal()},
+    {"k1xEVDODeviceState", kDeviceState, namedElse(kDeviceStates, "[Reserved %d]")},
+    {"kBandClass", u8(14).bits(3, 7), bandClass()},
+    {"kRxAGC0", s8(15), decimal("%+d dBm")},
+    Field("kRxAGC1", s8(16), decimal("%+d dBm")).when(kHasAccess).elseText(kNotAvailable),
+    Field("kTxAGC", s8(17), decimal("%+d dBm")).when(kHasAccess).elseText(kNotAvailable),
+    {"kServingPNOffset", u16(18), decimal("%d × 64chips").absentAt(0xFFFF, "Invalid Value")},
+    {"kSessionState", u8(37), namedElse(kSessionStates, "[Reserved %d]")},
+    {"kUATI24", u24(38), decimal("0x%06x")},
+    {"kColorCode", u8(41), decimal()},
+};
+static_assert(isLayout(kFields));
+
+}  // namespace
+
+constinit const PacketReading kEVDOStatusReading = {
+    .code = 0x1183, .packetName = "EV-DO status", .minimumLength = 50, .fields = kFields};
+
+void EVDOStatus::parse(PacketView packet, C2KOutput& output) {
+  if (!hasRightLength(packet)) {
+    output.log.log(LogPriority::Error, "Log code 0x1183 is {} bytes long but should be {} bytes.",
+                   packet.size(), reading().minimumLength);
+    return;
+  }
+  _fields.store(packet, {}, output.lookup);
+}
+
+void EVDOStatus::explain(PacketView packet, const ExplainVisitor& visit) const {
+  if (hasRightLength(packet)) Explainer(reading().packetName, packet, visit).reading(reading());
+}
+
+}  // namespace kestro

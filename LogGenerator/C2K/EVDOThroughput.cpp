@@ -1,0 +1,158 @@
+// SPDX-License-Identifier: MIT
+#include "LogGenerator/C2K/EVDOThroughput.h"
+
+#include <array>
+#include <string>
+
+#include "LogGenerator/C2K/C2KState.h"
+#include "LogGenerator/LogGenerator.h"
+
+namespace kestro {
+namespace {
+
+// --- 0x1192: forward link, at least 241 bytes: 56 counters in a row
+// --------------------------------
+
+constexpr std::uint16_t kForwardBits[] = {
+    128,  256,  512, 1024, 0,    128,  256,  512,  1024, 0,    128,  256,  512,  1024,
+    0,    128,  256, 512,  1024, 0,    128,  256,  512,  1024, 0,    512,  1024, 2048,
+    0,    128,  256, 512,  1024, 0,    512,  1024, 2048, 0,    1024, 3072, 0,    512,
+    1024, 2048, 0,   4096, 0,    1024, 3072, 0,    4096, 0,    5120, 0,    5120, 0,
+};
+
+constexpr auto forwardCounters() {
+  std::array<SentCounter, std::size(kForwardBits)> counters{};
+  for (std::size_t i = 0; i < counters.size(); ++i) {
+    counters[i] = {.offset = static_cast<std::uint16_t>(17 + 4 * i), .bits = kForwardBits[i]};
+  }
+  return counters;
+}
+constexpr auto kForwardCounters = forwardCounters();
+static_assert(kForwardCounters.size() == 56);
+
+// --- 0x127E: reverse link, at least 1750 bytes: three blocks of counters for twelve rates
+// ----------
+
+constexpr std::uint16_t kReverseBits[] = {128,  256,  512,  768,  1024, 1536,
+                                          2048, 3072, 4096, 6144, 8192, 12288};
+constexpr std::uint16_t kReverseOffsets[] = {18, 22, 26, 30, 306, 310, 314, 318};
+constexpr std::size_t kReverseRateSize = 24;
+constexpr std::size_t kReverseBlockSize = 576;
+constexpr std::size_t kReverseBlocks = 3;
+
+constexpr auto reverseCounters() {
+  std::array<SentCounter, std::size(kReverseBits) * kReverseBlocks * std::size(kReverseOffsets)>
+      counters{};
+  std::size_t i = 0;
+  for (std::size_t block = 0; block < kReverseBlocks; ++block) {
+    for (std::size_t rate = 0; rate < std::size(kReverseBits); ++rate) {
+      for (const std::size_t offset : kReverseOffsets) {
+        counters[i++] = {.offset = static_cast<std::uint16_t>(offset + kReverseRateSize * rate +
+                                                              kReverseBlockSize * block),
+                         .bits = kReverseBits[rate]};
+      }
+    }
+  }
+  return counters;
+}
+constexpr auto kReverseCounters = reverseCounters();
+
+/// A rate depends on two packets.
+constexpr std::string_view kSinceLastPacket = "(since the packet before)";
+
+}  // namespace
+
+constinit const ThroughputLayout kForwardThroughput = {
+    .reading = {.code = 0x1192, .packetName = "EV-DO forward throughput", .minimumLength = 241},
+    .sequenceNumber = u32(13),
+    .counters = kForwardCounters,
+    .rateName = "kFLDataRate",
+    .sequenceStateKey = kStateFLDataSeqNum,
+    .sentStateKey = kStateFLDataSent};
+
+constinit const ThroughputLayout kReverseThroughput = {
+    .reading = {.code = 0x127E, .packetName = "EV-DO reverse throughput", .minimumLength = 1750},
+    .sequenceNumber = u32(14),
+    .counters = kReverseCounters,
+    .rateName = "kRLDataRate",
+    .sequenceStateKey = kStateRLDataSeqNum,
+    .sentStateKey = kStateRLDataSent};
+
+EVDOThroughput::Keys::Keys(std::string_view stateKey)
+    : kept(stateKey),
+      newest(std::string(stateKey).append("1")),
+      previous(std::string(stateKey).append("2")) {}
+
+EVDOThroughput::EVDOThroughput(const ThroughputLayout& layout)
+    : C2KParser(layout.reading),
+      _layout(layout),
+      _rate(layout.rateName),
+      _sequence(layout.sequenceStateKey),
+      _sent(layout.sentStateKey) {}
+
+std::vector<std::string_view> EVDOThroughput::lookupNames() const { return {_layout.rateName}; }
+
+std::int64_t EVDOThroughput::sentIn(PacketView packet) const noexcept {
+  std::int64_t sent = 0;
+  for (const SentCounter& counter : _layout.counters) {
+    sent += std::int64_t{packet.u32(counter.offset)} * counter.bits;
+  }
+  return sent;
+}
+
+EVDOThroughput::Sample EVDOThroughput::keptIn(const Dictionary& state) const {
+  const Value* sequence = state.find(_sequence.kept);
+  const Value* sent = state.find(_sent.kept);
+  return {sequence == nullptr ? Value() : *sequence, sent == nullptr ? Value() : *sent};
+}
+
+void EVDOThroughput::keep(const Sample& sample, Dictionary& state) const {
+  state.set(_sequence.kept, sample.sequence);
+  state.set(_sent.kept, sample.sent);
+  Dictionary extraInfo = state[kStateExtraInfo].dictionary();
+  extraInfo.set(_sequence.newest, sample.sequence);
+  extraInfo.set(_sent.newest, sample.sent);
+}
+
+void EVDOThroughput::parse(PacketView packet, C2KOutput& output) {
+  if (!isLongEnough(packet, output.log)) return;
+  const Sample previous = keptIn(output.state);
+  const Sample current{Value::integer(readNumber(_layout.sequenceNumber, packet, {})),
+                       Value::integer(sentIn(packet))};
+  if (previous.sequence.isInteger() && previous.sent.isInteger()) {
+    storeRate(previous, current, output.lookup);
+    Dictionary extraInfo = output.state[kStateExtraInfo].dictionary();
+    extraInfo.set(_sequence.previous, previous.sequence);
+    extraInfo.set(_sent.previous, previous.sent);
+  } else {
+    output.lookup.store(_rate, "");
+  }
+  keep(current, output.state);
+}
+
+void EVDOThroughput::storeRate(const Sample& previous, const Sample& current,
+                               const LookupTable& lookup) {
+  // The numbers wrap at 32 bits; their distance is signed all the same.
+  const auto distance = static_cast<std::int32_t>(
+      static_cast<std::uint32_t>(current.sequence.integerBits() - previous.sequence.integerBits()));
+  if (distance < 1) return;
+  const std::int64_t sent = current.sent.integerBits() - previous.sent.integerBits();
+  TextBuffer text;
+  text.append("%.2f kbps",
+              static_cast<double>(sent) / static_cast<double>(std::int64_t{distance} * 1024));
+  lookup.store(_rate, text.text());
+}
+
+void EVDOThroughput::explain(PacketView packet, const ExplainVisitor& visit) const {
+  if (!isLongEnough(packet)) return;
+  const Explainer explainer(reading().packetName, packet, visit);
+  ExplainedValue rate{.section = reading().packetName, .key = _layout.rateName};
+  rate.sources.push_back(explainer.source(_layout.sequenceNumber, {}));
+  for (const SentCounter& counter : _layout.counters) {
+    rate.sources.push_back(explainer.source(counter.place(), {}));
+  }
+  rate.text = kSinceLastPacket;
+  visit(rate);
+}
+
+}  // namespace kestro

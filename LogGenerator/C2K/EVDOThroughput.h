@@ -1,0 +1,74 @@
+// SPDX-License-Identifier: MIT
+// The EV-DO packets that count what was sent at each rate: 0x1192 (forward link) and 0x127E
+// (reverse link).
+#pragma once
+
+#include <cstdint>
+#include <span>
+#include <string_view>
+
+#include "LogGenerator/C2K/C2KParser.h"
+
+namespace kestro {
+
+/// One of a packet's counters, and how many bits each of its counts stands for.
+struct SentCounter {
+  std::uint16_t offset;
+  std::uint16_t bits;
+
+  [[nodiscard]] constexpr Place place() const { return u32(offset); }
+};
+
+/// One direction's packet.
+struct ThroughputLayout {
+  PacketReading reading;
+  Place sequenceNumber;
+  std::span<const SentCounter> counters;
+  std::string_view rateName;          ///< the lookup name of the data rate
+  std::string_view sequenceStateKey;  ///< where the state keeps the last packet's number
+  std::string_view sentStateKey;      ///< and what had been sent by then
+};
+
+extern const ThroughputLayout kForwardThroughput;
+extern const ThroughputLayout kReverseThroughput;
+
+/// Shows the data rate between one packet and the next. The first packet only primes it; a packet
+/// whose number is not above the last one's leaves the rate that is shown.
+class EVDOThroughput : public C2KParser {
+ public:
+  /// `layout` must be a constant.
+  explicit EVDOThroughput(const ThroughputLayout& layout);
+
+  void parse(PacketView packet, C2KOutput& output) override;
+  void explain(PacketView packet, const ExplainVisitor& visit) const override;
+  [[nodiscard]] std::vector<std::string_view> lookupNames() const override;
+
+  /// What the packet's counters add up to, in bits.
+  [[nodiscard]] std::int64_t sentIn(PacketView packet) const noexcept;
+
+ private:
+  /// One value of a packet: its keys in the state, and in the extra information as the newest and
+  /// as the one before.
+  struct Keys {
+    explicit Keys(std::string_view stateKey);
+
+    Value kept;
+    Value newest;
+    Value previous;
+  };
+  struct Sample {
+    Value sequence;
+    Value sent;
+  };
+
+  [[nodiscard]] Sample keptIn(const Dictionary& state) const;
+  void keep(const Sample& sample, Dictionary& state) const;
+  void storeRate(const Sample& previous, const Sample& current, const LookupTable& lookup);
+
+  const ThroughputLayout& _layout;
+  LookupName _rate;
+  Keys _sequence;
+  Keys _sent;
+};
+
+}  // namespace kestro

@@ -1,0 +1,55 @@
+// SPDX-License-Identifier: MIT
+// The frame error rate of 1x traffic: a running average over the frames, kept in the generator
+// state, and the packet that brings each frame, 0x119D.
+#pragma once
+
+#include <optional>
+#include <string_view>
+
+#include "LogGenerator/C2K/C2KParser.h"
+
+namespace kestro {
+
+inline constexpr std::string_view kFrameErrorRateName = "k1xTrafficFER";
+
+/// A rate from 0 to 1, in single precision throughout.
+class FrameErrorRate {
+ public:
+  /// The rate that the state keeps; absent when it keeps no number.
+  [[nodiscard]] static std::optional<FrameErrorRate> ofState(const Dictionary& state);
+  static void removeFrom(Dictionary& state);
+
+  /// The rate after one more frame; the first one follows on no rate.
+  [[nodiscard]] static FrameErrorRate after(const std::optional<FrameErrorRate>& previous,
+                                            bool isBadFrame);
+  void keepIn(Dictionary& state) const;
+
+  /// In per cent; the old text says that the traffic is over.
+  [[nodiscard]] Value text() const;
+  [[nodiscard]] Value oldText() const;
+
+ private:
+  explicit FrameErrorRate(float rate) : _rate(rate) {}
+
+  float _rate;
+};
+
+extern const PacketReading kTrafficFrameReading;
+
+/// The identifier of its sub-packet, and where that says whether a frame was bad.
+inline constexpr std::uint8_t kTrafficDemodulationId = 11;
+inline constexpr Place kIsBadFrame = u8(24);  ///< 0 for a good frame
+
+class TrafficFrame : public C2KParser {
+ public:
+  TrafficFrame() : C2KParser(kTrafficFrameReading), _rate(kFrameErrorRateName) {}
+
+  void parse(PacketView packet, C2KOutput& output) override;
+  void explain(PacketView packet, const ExplainVisitor& visit) const override;
+  [[nodiscard]] std::vector<std::string_view> lookupNames() const override;
+
+ private:
+  LookupName _rate;
+};
+
+}  // namespace kestro

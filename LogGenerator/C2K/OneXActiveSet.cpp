@@ -1,0 +1,116 @@
+// SPDX-License-Identifier: MIT
+#include "LogGenerator/C2K/OneXActiveSet.h"
+
+#include <cmath>
+
+#include "LogGenerator/C2K/PilotList.h"
+#include "LogGenerator/Packets/NumberFormat.h"
+
+namespace kestro {
+namespace {
+
+constexpr Place kAccumulationLength = u16(4);
+constexpr Place kFactor = u8(6);
+constexpr Place kExponent = u8(7);
+constexpr Place kPilotCount = u8(8);
+constexpr Place kPerPilotCount = u8(9);
+constexpr Place kReferencePN = u16(10);
+
+constexpr Field kFields[] = {
+    {"Accumulation Length", kAccumulationLength, hidden()},
+    {"Energy Factor", kFactor, hidden()},
+    {"Energy Exponent", kExponent, hidden()},
+    {"Pilots", kPilotCount, hidden()},
+    {"Values per Pilot", kPerPilotCount, hidden()},
+    {"Reference PN Offset", kReferencePN, hidden()},
+};
+static_assert(isLayout(kFields));
+
+/// A pilot's record: so many bytes, and so many for each of its values before the energy, then
+/// filled up to a multiple of the alignment.
+constexpr std::size_t kFixedPilotSize = 12;
+constexpr std::size_t kSizePerValue = 6;
+constexpr std::size_t kEnergyOffsetPerValue = 4;
+constexpr std::size_t kPilotAlignment = 4;
+
+/// Whatever is weaker, or no number at all, shows as this: -50 dB.
+constexpr double kWeakestEnergy = 0.00001;
+
+}  // namespace
+
+constinit const std::span<const Field> kOneXActiveSetFields = kFields;
+
+OneXActiveSet::OneXActiveSet(PacketView packet, std::size_t start)
+    : _packet(packet), _position{.here = start} {
+  const std::size_t values = readBits(kPerPilotCount, packet, _position);
+  _pilotCount = readBits(kPilotCount, packet, _position);
+  _variableSize = kEnergyOffsetPerValue * values;
+  const std::size_t size = kFixedPilotSize + kSizePerValue * values;
+  _stride = (size + kPilotAlignment - 1) / kPilotAlignment * kPilotAlignment;
+}
+
+RecordPosition OneXActiveSet::pilotAt(std::size_t index) const noexcept {
+  return {.here = _position.here + _stride * index};
+}
+
+RecordPosition OneXActiveSet::pilotEnergyAt(std::size_t index) const noexcept {
+  return {.here = pilotAt(index).here + _variableSize};
+}
+
+std::uint32_t OneXActiveSet::pnOffset(std::size_t index) const noexcept {
+  return readBits(kOneXPilotPN, _packet, pilotAt(index));
+}
+
+double OneXActiveSet::energy(std::size_t index) const noexcept {
+  const double length = readBits(kAccumulationLength, _packet, _position);
+  const double factor = readBits(kFactor, _packet, _position);
+  const int exponent = static_cast<int>(readBits(kExponent, _packet, _position));
+  const double sum = readBits(kOneXPilotEnergy, _packet, pilotEnergyAt(index));
+  // Without a length or a factor this is infinite, or no number.
+  const double energy =
+      std::ldexp(1, 2 * exponent - 3) * sum / (9 * length * length * factor) - 1 / length;
+  return energy >= kWeakestEnergy ? energy : kWeakestEnergy;
+}
+
+Value OneXActiveSet::energyText(std::size_t index) const {
+  const bool isReference = pnOffset(index) == readBits(kReferencePN, _packet, _position);
+  TextBuffer text;
+  if (isReference) text.append("(ref pilot) ");
+  text.append("%+.2f dB", 10 * std::log10(energy(index)));
+  return text.text();
+}
+
+Dictionary OneXActiveSet::list() const {
+  PilotList pilots;
+  pilots.reserve(_pilotCount);
+  for (std::size_t i = 0; i < _pilotCount; ++i) pilots.add(i, pnOffset(i), energyText(i));
+  return pilots.take();
+}
+
+void OneXActiveSet::explain(std::string_view section, std::string_view list,
+                            const ExplainVisitor& visit) const {
+  const Explainer explainer(section, _packet, visit);
+  explainer.fields(kFields, _position);
+  for (std::size_t i = 0; i < _pilotCount; ++i) {
+    explainPilot(explainer, {.section = section, .list = list, .row = i, .key = {}}, visit);
+  }
+}
+
+void OneXActiveSet::explainPilot(const Explainer& explainer, ExplainedValue value,
+                                 const ExplainVisitor& visit) const {
+  const std::size_t index = *value.row;
+  const ExplainedSource pn = explainer.source(kOneXPilotPN, pilotAt(index));
+  value.key = kPilotPNOffset;
+  value.sources = {pn};
+  value.text = std::to_string(pnOffset(index));
+  visit(value);
+  value.key = kPilotEnergy;
+  value.sources = {explainer.source(kOneXPilotEnergy, pilotEnergyAt(index)), pn};
+  for (const Place& place : {kAccumulationLength, kFactor, kExponent, kReferencePN}) {
+    value.sources.push_back(explainer.source(place, _position));
+  }
+  value.text = energyText(index);
+  visit(value);
+}
+
+}  // namespace kestro

@@ -1,0 +1,58 @@
+// SPDX-License-Identifier: MIT
+// The active-set sub-packet of the 1x status packet.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <span>
+
+#include "LogGenerator/Packets/Explain.h"
+#include "LogGenerator/Packets/Field.h"
+#include "LogGenerator/Packets/Walk.h"
+#include "Platform/PropertyList.h"
+
+namespace kestro {
+
+/// The sub-packet's fields that all pilots share.
+extern const std::span<const Field> kOneXActiveSetFields;
+
+// In each pilot's record.
+inline constexpr Place kOneXPilotPN = u16(12);
+inline constexpr Place kOneXPilotEnergy = u16(24);  ///< behind the record's variable part
+
+/// The pilots of a sub-packet at a place in its packet. The packet is borrowed; whatever lies past
+/// its end reads as 0.
+class OneXActiveSet {
+ public:
+  OneXActiveSet(PacketView packet, std::size_t start);
+
+  /// From 0 to 255.
+  [[nodiscard]] std::size_t pilotCount() const noexcept { return _pilotCount; }
+
+  /// Where `kOneXPilotPN` and `kOneXPilotEnergy` of pilot `index` count from.
+  [[nodiscard]] RecordPosition pilotAt(std::size_t index) const noexcept;
+  [[nodiscard]] RecordPosition pilotEnergyAt(std::size_t index) const noexcept;
+
+  [[nodiscard]] std::uint32_t pnOffset(std::size_t index) const noexcept;
+  /// The pilot's energy, marked when it is the reference pilot's.
+  [[nodiscard]] Value energyText(std::size_t index) const;
+
+  /// The list as the display shows it.
+  [[nodiscard]] Dictionary list() const;
+
+  /// Visits the fields that all pilots share, then PN offset and energy of each as a row of `list`.
+  void explain(std::string_view section, std::string_view list, const ExplainVisitor& visit) const;
+
+ private:
+  [[nodiscard]] double energy(std::size_t index) const noexcept;
+  void explainPilot(const Explainer& explainer, ExplainedValue value,
+                    const ExplainVisitor& visit) const;
+
+  PacketView _packet;
+  RecordPosition _position;
+  std::size_t _pilotCount;
+  std::size_t _variableSize;  ///< of a pilot's record
+  std::size_t _stride;
+};
+
+}  // namespace kestro

@@ -1,0 +1,73 @@
+// SPDX-License-Identifier: MIT
+#include "LogGenerator/C2K/OneXSystemParameters.h"
+
+namespace kestro {
+namespace {
+
+constexpr NamedValue kRoamingIndicators[] = {
+    {0, "OFF [0]"},
+    {1, "ON [1]"},
+    {2, "Flashing [2]"},
+    {3, "Out of Neighborhood [3]"},
+    {4, "Out of Building [4]"},
+    {5, "Preferred system [5]"},
+    {6, "Available system [6]"},
+    {7, "Alliance partner [7]"},
+    {8, "Premium partner [8]"},
+    {9, "Full service functionality [9]"},
+    {10, "Partial service functionality [10]"},
+    {11, "Banner ON [11]"},
+    {12, "Banner OFF [12]"},
+};
+
+constexpr Place kVersion = u8(13);
+constexpr std::int64_t kFirstKnownVersion = 2;
+
+constexpr Place kSystemType = u32(46).shared();
+constexpr std::int64_t kCDMA2000System = 2;
+
+/// An identity of the system, if the system is of the type that has it: `raw` is type and identity.
+void writeIdentity(std::span<const std::int64_t> raw, TextBuffer& text) {
+  if (raw[0] == kCDMA2000System) {
+    text.append("%d", raw[1]);
+  } else {
+    text.append("(unknown system type %d)", raw[0]);
+  }
+}
+
+// The base station's identity lies past the minimum length.
+constexpr Field kFields[] = {
+    {"Version", kVersion, hidden()},
+    {"k1xRoamingHome", s32(42), namedElse(kRoamingIndicators, "ERI - %d")},
+    {"kSystemId", {kSystemType, u16(50)}, computed(writeIdentity)},
+    {"kNetworkId", {kSystemType, u16(52)}, computed(writeIdentity)},
+    {"kPacketZoneId", u8(131), decimal()},
+    {"kBaseId", u16(184), decimal()},
+    {"kProtocolRevision", u8(133), decimal()},
+};
+static_assert(isLayout(kFields));
+
+std::int64_t versionOf(PacketView packet) { return readNumber(kVersion, packet, {}); }
+
+}  // namespace
+
+constinit const PacketReading kOneXSystemParametersReading = {
+    .code = 0x134F, .packetName = "1x system parameters", .minimumLength = 171, .fields = kFields};
+
+void OneXSystemParameters::parse(PacketView packet, C2KOutput& output) {
+  if (!isLongEnough(packet, output.log)) return;
+  if (versionOf(packet) < kFirstKnownVersion) {
+    output.log.log(LogPriority::Error,
+                   "Log code 0x134f has version={}; only version 2 or higher expected; dropping.",
+                   versionOf(packet));
+    return;
+  }
+  _fields.store(packet, {}, output.lookup);
+}
+
+void OneXSystemParameters::explain(PacketView packet, const ExplainVisitor& visit) const {
+  if (!isLongEnough(packet) || versionOf(packet) < kFirstKnownVersion) return;
+  Explainer(reading().packetName, packet, visit).reading(reading());
+}
+
+}  // namespace kestro

@@ -1,0 +1,24 @@
+// SPDX-License-Identifier: MIT
+// The 1x system parameters packet, 0x134F.
+#pragma once
+
+#include "LogGenerator/C2K/C2KParser.h"
+
+namespace kestro {
+
+extern const PacketReading kOneXSystemParametersReading;
+
+/// Shows which system and base station serve the phone, and whether it roams. Packets of an early
+/// version are rejected.
+class OneXSystemParameters : public C2KParser {
+ public:
+  OneXSystemParameters() : C2KParser(kOneXSystemParametersReading), _fields(reading().fields) {}
+
+  void parse(PacketView packet, C2KOutput& output) override;
+  void explain(PacketView packet, const ExplainVisitor& visit) const override;
+
+ private:
+  StoredFields _fields;
+};
+
+}  // namespace kestro

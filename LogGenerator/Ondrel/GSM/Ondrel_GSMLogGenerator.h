@@ -1,0 +1,21 @@
+// SPDX-License-Identifier: MIT
+// The generator of the GSM/UMTS channel.
+#pragma once
+
+#include <memory>
+
+#include "LogGenerator/Ondrel/OndrelLogGenerator2.h"
+
+namespace kestro {
+
+/// The template-driven generator with the GSM/UMTS decoders and the template "Ondrel_GSM".
+class Ondrel_GSMLogGenerator : public OndrelLogGenerator2 {
+ public:
+  [[nodiscard]] static std::unique_ptr<Ondrel_GSMLogGenerator> generator(Platform& platform);
+
+  explicit Ondrel_GSMLogGenerator(Platform& platform);
+  /// Leaves a line with the object's address in the system log.
+  ~Ondrel_GSMLogGenerator() override;
+};
+
+}  // namespace kestro

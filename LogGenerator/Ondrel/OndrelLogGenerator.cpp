@@ -1,0 +1,83 @@
+// SPDX-License-Identifier: MIT
+#include "LogGenerator/Ondrel/OndrelLogGenerator.h"
+
+#include <fmt/format.h>
+
+#include <utility>
+
+#include "LogGenerator/Ondrel/VersionReport.h"
+#include "Platform/Bundle.h"
+#include "Platform/Clock.h"
+#include "Platform/SystemLog.h"
+
+namespace kestro {
+namespace {
+
+constexpr std::string_view kExecutableName = "EXECUTABLE_NAME";
+constexpr std::uint16_t kReportVersion = 1;
+
+/// Packets of fewer bytes, their type byte included, are not worth an export.
+constexpr std::size_t kSmallestExportedBuffer = 2;
+
+std::string versionText(const Bundle& bundle) {
+  const auto version = bundle.version();
+  return version ? fmt::format("Kestro {}", *version) : "(none)";
+}
+
+std::uint64_t reportTime(const Clock& clock) {
+  const Moment now = clock.now();
+  const auto seconds = std::chrono::floor<std::chrono::seconds>(now.time_since_epoch()).count();
+  const auto zone = clock.timeZoneOffset(now).count() / 60;  // toward zero
+  return packedReportTime(static_cast<std::uint32_t>(seconds), static_cast<std::int16_t>(zone),
+                          clock.isDaylightSaving(now));
+}
+
+}  // namespace
+
+void OndrelLogGenerator::handOverCollected(Dictionary& state) {
+  state.set(kStateDisplayState, Value::data(std::exchange(_binData, {})));
+}
+
+std::optional<Bytes> OndrelLogGenerator::versionReport() {
+  Bytes report(kVersionReportSize, 0);
+  std::uint32_t written = 0;
+  const Bundle& bundle = platform().bundle();
+  const int status = QbxDLFAddVersionReport(report, kVersionReportSize, written, kReportVersion,
+                                            kReportVersion, versionText(bundle), kExecutableName,
+                                            bundle.buildDate(), reportTime(platform().clock()));
+  if (status == kVersionReportWritten) return report;
+  platform().systemLog().log(LogPriority::Error, "Could not write DLF header (result={})", status);
+  return std::nullopt;
+}
+
+std::optional<Bytes> OndrelLogGenerator::generateDlfFromState(const Dictionary& state) {
+  std::optional<Bytes> dlf = versionReport();
+  if (!dlf) return std::nullopt;
+  const Array history = state[kStateHistory].array();
+  for (const Value& entry : history) {
+    const Value packets = entry.dictionary()[kStateDisplayState];
+    if (packets.isNull()) continue;
+    if (!packets.isData()) {
+      platform().systemLog().write(
+          LogPriority::Error,
+          "Got wrong class writing history to DLF; aborting writing the DLF file");
+      return std::nullopt;
+    }
+    const ByteView bytes = packets.bytes();
+    if (bytes.size() < kSmallestExportedBuffer) continue;
+    dlf->insert(dlf->end(), bytes.begin() + 1, bytes.end());
+  }
+  return dlf;
+}
+
+Array OndrelLogGenerator::getSaveContentsFromState(const Dictionary& state) {
+  Array contents = historyOfState(state);
+  if (auto dlf = generateDlfFromState(state)) {
+    const std::string description = fmt::format("DLF binary ({} bytes)", dlf->size());
+    contents.append(Dictionary{{kHistoryDescription, description},
+                               {kSaveContentsDlf, Value::data(std::move(*dlf))}});
+  }
+  return contents;
+}
+
+}  // namespace kestro

@@ -1,0 +1,41 @@
+// SPDX-License-Identifier: MIT
+// The base of the generators whose channels deliver raw baseband packets.
+#pragma once
+
+#include <optional>
+
+#include "LogGenerator/LogGenerator.h"
+
+namespace kestro {
+
+/// The state's key of the display template, once it was loaded.
+inline constexpr std::string_view kStateTemplate = "Template";
+
+/// Keys and texts of the element that save contents gain for the DLF log.
+inline constexpr std::string_view kSaveContentsDlf = "DLF";
+
+/// Collects the raw packets between two refreshes and exports the history as a DLF log: a version
+/// report, then the packets of every history entry as they were collected.
+class OndrelLogGenerator : public LogGenerator {
+ public:
+  /// The DLF log of the state's history; absent when an entry's "DisplayState" is no data.
+  [[nodiscard]] std::optional<Bytes> generateDlfFromState(const Dictionary& state);
+
+  /// The history's entries, then the DLF log with its description when there is one.
+  [[nodiscard]] Array getSaveContentsFromState(const Dictionary& state) override;
+
+ protected:
+  explicit OndrelLogGenerator(Platform& platform) noexcept : LogGenerator(platform) {}
+
+  void collect(ByteView packet) { _binData.insert(_binData.end(), packet.begin(), packet.end()); }
+
+  /// Stores what was collected in the state under "DisplayState" and begins anew.
+  void handOverCollected(Dictionary& state);
+
+ private:
+  [[nodiscard]] std::optional<Bytes> versionReport();
+
+  Bytes _binData;
+};
+
+}  // namespace kestro

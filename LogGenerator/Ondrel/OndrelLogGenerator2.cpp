@@ -1,0 +1,218 @@
+// SPDX-License-Identifier: MIT
+#include "LogGenerator/Ondrel/OndrelLogGenerator2.h"
+
+#include <array>
+#include <charconv>
+
+#include "LogGenerator/Packets/PacketHeader.h"
+#include "Platform/Bundle.h"
+#include "Platform/PropertyListCoding.h"
+#include "Platform/SystemLog.h"
+
+namespace kestro {
+namespace {
+
+constexpr std::string_view kTemplateExtension = "plist";
+
+LogCode codeOfKey(std::string_view key) {
+  LogCode code = 0;
+  std::from_chars(key.data(), key.data() + key.size(), code);
+  return code;
+}
+
+bool isContainerOf(SectionKind kind, const Value& value) {
+  return kind == SectionKind::List ? value.isArray() : value.isDictionary();
+}
+
+}  // namespace
+
+void OndrelLogGenerator2::initWithPListNameCIndexObj(std::string pListName,
+                                                     std::unique_ptr<ClassIndex> index) {
+  platform().systemLog().log(LogPriority::Error, "Creating OndrelLogGenerator2 object with {}",
+                             addressText(index.get()));
+  init();
+  _cIndex = std::move(index);
+  _pListName = std::move(pListName);
+  // The index has one owner, this generator.
+  platform().systemLog().log(LogPriority::Error, "Class Index: {}", _cIndex ? 1 : 0);
+}
+
+OndrelLogGenerator2::~OndrelLogGenerator2() {
+  platform().systemLog().log(LogPriority::Warning, "Ondrel_GSMLogGenerator is destructed {}",
+                             addressText(this));
+}
+
+// --- Packets -------------------------------------------------------------------------------------
+
+void OndrelLogGenerator2::updateStateWithData(Dictionary& state, ByteView data) {
+  getDisplayFromState(state);
+  if (!_cIndex) return;
+  updateWithData(data);
+  collect(data);
+}
+
+void OndrelLogGenerator2::updateWithData(ByteView message) {
+  if (message.size() < kPacketHeaderSize) return;
+  const PacketView packet(packetOfMessage(message));
+  const std::uint8_t type = logTypeOf(packet);
+  if (type != kBasebandLogType && type != kExtraLogType) {
+    platform().systemLog().log(LogPriority::Error, "Invalid log type: {:x}. Dropping.", type);
+    return;
+  }
+  const LogCode code = logCodeOf(packet);
+  for (Base* subscriber : subscribersOf(code)) {
+    subscriber->updateWithDataLogCode(packet.bytes(), code);
+  }
+}
+
+std::span<Base* const> OndrelLogGenerator2::subscribersOf(LogCode code) const {
+  const auto* subscribers = _cIndex ? _cIndex->getSubscribers(code) : nullptr;
+  return subscribers == nullptr ? std::span<Base* const>() : std::span<Base* const>(*subscribers);
+}
+
+void OndrelLogGenerator2::explainMessage(ByteView message, const ExplainVisitor& visit) const {
+  if (message.size() < kPacketHeaderSize) return;
+  const PacketView packet(packetOfMessage(message));
+  const LogCode code = logCodeOf(packet);
+  for (const Base* subscriber : subscribersOf(code)) {
+    subscriber->explainPacket(packet.bytes(), code, visit);
+  }
+}
+
+void OndrelLogGenerator2::catalogue(const CatalogueVisitor& visit) const {
+  if (!_cIndex) return;
+  for (const std::string& key : _cIndex->getAllLogCodes()) {
+    const LogCode code = codeOfKey(key);
+    for (const Base* subscriber : subscribersOf(code)) visit(subscriber->catalogueCode(code));
+  }
+}
+
+Dictionary OndrelLogGenerator2::getStartCommand() const {
+  Array logCodes;
+  Array extraCodes;
+  for (const std::string& key : _cIndex ? _cIndex->getAllLogCodes() : std::vector<std::string>()) {
+    const LogCode code = codeOfKey(key);
+    if (code < kExtraCodes) {
+      logCodes.append(Value::integer(code));
+    } else {
+      extraCodes.append(Value::integer(code - kExtraCodes));
+    }
+  }
+  return {
+      {"SetState", "Streaming"}, {"SetOndrelLogCodes", logCodes}, {"SetTqExtraCodes", extraCodes}};
+}
+
+// --- Display -------------------------------------------------------------------------------------
+
+Value OndrelLogGenerator2::generateLogUsingState(Dictionary& state) {
+  Value display = getDisplayFromState(state);
+  handOverCollected(state);
+  updateHistoryInState(state, platform().clock());
+  return display;
+}
+
+std::span<const std::string_view> OndrelLogGenerator2::stateKeys() const {
+  static constexpr std::array kKeys = {kStateDisplay, kStateExtraInfo, kStateTemplate};
+  return kKeys;
+}
+
+Value OndrelLogGenerator2::getDisplayFromState(Dictionary& state) {
+  Value display = state[kStateDisplay];
+  if (display.isNull()) {
+    buildDisplay(state);
+  } else {
+    bindDisplay(display);
+  }
+  return display;
+}
+
+void OndrelLogGenerator2::buildDisplay(Dictionary& state) {
+  const Value displayTemplate = templateOfState(state);
+  if (displayTemplate.isNull()) {
+    platform().systemLog().write(LogPriority::Error, "Cannot load template for display");
+    return;
+  }
+  platform().systemLog().log(LogPriority::Warning, "Initialized class index: {}, Self: {}",
+                             addressText(_cIndex.get()), addressText(this));
+  if (_cIndex) _cIndex->status();
+  const Value display = processTemplate(displayTemplate);
+  printDict(display);
+  state.set(kStateDisplay, display);
+  state.set(kStateExtraInfo, Dictionary());
+  _boundDisplay = WeakValue(display);
+}
+
+Value OndrelLogGenerator2::templateOfState(Dictionary& state) {
+  Value known = state[kStateTemplate];
+  if (!known.isNull()) return known;
+  const auto contents = platform().bundle().resource(_pListName, kTemplateExtension);
+  if (!contents) return {};
+  Result<Value> parsed = platform().propertyListCoding().parse(*contents);
+  if (!parsed || !parsed->isDictionary()) return {};
+  state.set(kStateTemplate, *parsed);
+  return *parsed;
+}
+
+Value OndrelLogGenerator2::processTemplate(const Value& templateObject) {
+  if (templateObject.isText()) return templateObject;
+  if (templateObject.isDictionary()) return processDictionary(templateObject.dictionary());
+  if (templateObject.isArray()) {
+    Array result;
+    for (const Value& element : templateObject.array()) result.append(processTemplate(element));
+    return result;
+  }
+  platform().systemLog().write(LogPriority::Error, "Received an object of unknown type");
+  platform().systemLog().write(LogPriority::Warning, "Processing the template");
+  return {};
+}
+
+Value OndrelLogGenerator2::processDictionary(const Dictionary& dictionary) {
+  Dictionary result;
+  for (const auto& [key, value] : dictionary) {
+    if (!key.isText()) {
+      platform().systemLog().write(LogPriority::Error, "Dictionary Key is not a string?");
+      continue;
+    }
+    Value processed = processTemplate(value);
+    if (Base* decoder = decoderOf(key)) decoder->updateSectionRef(processed);
+    result.set(key, std::move(processed));
+  }
+  return result;
+}
+
+void OndrelLogGenerator2::printDict(const Value& object) const {
+  if (object.isDictionary()) {
+    for (const auto& [key, value] : object.dictionary()) printDict(value);
+  } else if (object.isArray()) {
+    for (const Value& element : object.array()) printDict(element);
+  } else if (!object.isText()) {
+    platform().systemLog().write(LogPriority::Error, "Received an object of unknown type");
+  }
+}
+
+Base* OndrelLogGenerator2::decoderOf(const Value& key) const {
+  return _cIndex && key.isText() ? _cIndex->getClass(key.text()) : nullptr;
+}
+
+void OndrelLogGenerator2::bindDisplay(const Value& display) {
+  if (_boundDisplay.refersTo(display)) return;
+  bindSections(display);
+  _boundDisplay = WeakValue(display);
+}
+
+void OndrelLogGenerator2::bindSections(const Value& object) {
+  if (object.isArray()) {
+    for (const Value& element : object.array()) bindSections(element);
+    return;
+  }
+  for (const auto& [key, value] : object.dictionary()) {
+    Base* decoder = decoderOf(key);
+    if (decoder == nullptr) {
+      bindSections(value);
+    } else if (isContainerOf(decoder->sectionKind(), value)) {
+      decoder->updateSectionRef(value);
+    }
+  }
+}
+
+}  // namespace kestro

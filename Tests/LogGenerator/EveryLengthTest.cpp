@@ -1,0 +1,182 @@
+// SPDX-License-Identifier: MIT
+// Every packet that any technology's decoders subscribe to, cut at every length.
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "LogGenerator/LogGenerator.h"
+#include "LogGenerator/Ondrel/CellMonitor.h"
+#include "LogGenerator/Ondrel/SharedDecoders.h"
+#include "Platform/Linux/LinuxPlatform.h"
+#include "Platform/TelephonyService.h"
+#include "Platform/Virtual/VirtualPlatform.h"
+#include "Tests/Support/PacketBytes.h"
+
+namespace kestro::testing {
+namespace {
+
+constexpr std::string_view kTechnologies[] = {
+    kTqLogChannelTechnology_IFX, kTqLogChannelTechnology_Ondrel_GSM,
+    kTqLogChannelTechnology_Ondrel_CDMA, kTqLogChannelTechnology_Ondrel_LTE,
+    kTqLogChannelTechnology_Ondrel_UTRAN2};
+
+/// A generator of one technology with the program's templates, and its state.
+class Channel {
+ public:
+  explicit Channel(std::string_view technology) {
+    const auto bundle = createBundle();
+    for (const std::string& path : bundle->resourcesOfType("plist")) {
+      const std::string name = path.substr(0, path.rfind('.'));
+      if (auto contents = bundle->resource(name, "plist")) {
+        _platform.bundle().setResource(path, std::move(*contents));
+      }
+    }
+    _generator = LogGenerator::generatorFromTechnology(_platform, technology);
+  }
+
+  [[nodiscard]] LogGenerator* generator() const noexcept { return _generator.get(); }
+  [[nodiscard]] const Value& display() const { return _state[kStateDisplay]; }
+  [[nodiscard]] const PropertyListCoding& coding() const noexcept { return *_coding; }
+
+  /// Hands a message over. What it throws must be one of the failures that a packet may raise.
+  void receive(ByteView message) {
+    try {
+      _generator->updateStateWithData(_state, message);
+    } catch (const ArrayOutOfBoundsException&) {
+    } catch (const LogCode_0xFF0000::UnknownDataException&) {
+    }
+    static_cast<void>(_platform.systemLog().take());
+  }
+
+  /// Drops the packets collected so far.
+  void refresh() { static_cast<void>(_generator->generateLogUsingState(_state)); }
+
+ private:
+  std::unique_ptr<PropertyListCoding> _coding = createPropertyListCoding();
+  VirtualPlatform _platform{*_coding};
+  std::unique_ptr<LogGenerator> _generator;
+  Dictionary _state;
+};
+
+struct Subscription {
+  std::string_view technology;
+  LogCode code;
+};
+
+void PrintTo(const Subscription& subscription, std::ostream* stream) {
+  *stream << subscription.technology << " " << CodeDictionary::keyOf(subscription.code);
+}
+
+std::string nameOf(const ::testing::TestParamInfo<Subscription>& info) {
+  return fmt::format("{}_0x{:04X}", info.param.technology, info.param.code);
+}
+
+void addCodes(const Array& codes, LogCode offset, std::string_view technology,
+              std::vector<Subscription>& subscriptions) {
+  for (const Value& code : codes) {
+    subscriptions.push_back({technology, offset + static_cast<LogCode>(code.integerBits())});
+  }
+}
+
+/// What the technologies' start commands ask for.
+std::vector<Subscription> allSubscriptions() {
+  std::vector<Subscription> subscriptions;
+  for (const std::string_view technology : kTechnologies) {
+    const Channel channel(technology);
+    if (channel.generator() == nullptr) continue;
+    const Dictionary command = channel.generator()->getStartCommand();
+    addCodes(command["SetOndrelLogCodes"].array(), 0, technology, subscriptions);
+    addCodes(command["SetTqExtraCodes"].array(), kExtraCodes, technology, subscriptions);
+  }
+  return subscriptions;
+}
+
+constexpr std::size_t kFullLength = 300;
+
+/// Packets whose counts are as high as they can be, middling, and different from byte to byte.
+std::vector<Bytes> binaryPackets(LogCode code) {
+  std::vector<Bytes> packets;
+  for (const std::uint8_t filler : Bytes{0xFF, 0x01, 0x42}) {
+    packets.push_back(packet(code).length(kFullLength, filler).bytes());
+  }
+  Bytes mixed = packet(code).length(kFullLength).bytes();
+  std::uint32_t state = code + 1;
+  for (std::size_t i = kPacketHeaderSize; i < mixed.size(); ++i) {
+    state = state * 1664525 + 1013904223;
+    mixed[i] = static_cast<std::uint8_t>(state >> 24);
+  }
+  packets.push_back(std::move(mixed));
+  return packets;
+}
+
+/// Packets with a cell of each kind, with a dictionary, and with one cell as XML.
+std::vector<Bytes> listPackets(LogCode code, const PropertyListCoding& coding) {
+  Array cells;
+  for (const auto technology :
+       {kTqCellMonitorRadioAccessTechnologyGSM, kTqCellMonitorRadioAccessTechnologyUMTS,
+        kTqCellMonitorRadioAccessTechnologyUTRAN2, kTqCellMonitorRadioAccessTechnologyLTE}) {
+    for (const auto type : {kTqCellMonitorCellTypeServing, kTqCellMonitorCellTypeNeighbor}) {
+      cells.append(Dictionary{{kTqCellMonitorCellRadioAccessTechnology, technology},
+                              {kTqCellMonitorCellType, type},
+                              {kTqCellMonitorCellId, Value::integer(-1)},
+                              {kTqCellMonitorUARFCN, Value::real(1)},
+                              {kTqCellMonitorRSCP, Value::integer(0x7FFF)}});
+    }
+  }
+  const Dictionary files = {{"kSimFile_ICCID", "8944"}, {"kSimFile_LOCI", cells}};
+  return {packet(code).append(*coding.binary(cells)).bytes(),
+          packet(code).append(*coding.binary(files)).bytes(),
+          packet(code).append(*coding.xml(Array{cells[0]})).bytes()};
+}
+
+/// Hands the same message to two channels, in memory that ends with it and in memory that goes on.
+class EveryLengthTest : public ::testing::TestWithParam<Subscription> {
+ protected:
+  void receive(ByteView message) {
+    const auto exact = std::make_unique<std::uint8_t[]>(message.size());
+    std::ranges::copy(message, exact.get());
+    alone.receive({exact.get(), message.size()});
+
+    Bytes followed(message.begin(), message.end());
+    followed.resize(message.size() + kNeighborhood, 0xA5);
+    among.receive(ByteView(followed).first(message.size()));
+  }
+
+  void cutEverywhere(const Bytes& message) {
+    for (std::size_t length = 0; length <= message.size(); ++length) {
+      receive(ByteView(message).first(length));
+      ASSERT_EQ(alone.display(), among.display()) << "at length " << length;
+    }
+    alone.refresh();
+    among.refresh();
+  }
+
+  static constexpr std::size_t kNeighborhood = 64;
+  Channel alone{GetParam().technology};
+  Channel among{GetParam().technology};
+};
+
+TEST_P(EveryLengthTest, PacketsAreDecodedWithoutALookBeyondTheirEnd) {
+  const LogCode code = GetParam().code;
+  for (const Bytes& bytes : binaryPackets(code)) cutEverywhere(bytes);
+  if (code < kExtraCodes) return;
+  for (const Bytes& bytes : listPackets(code, alone.coding())) cutEverywhere(bytes);
+}
+
+TEST_P(EveryLengthTest, SoArePacketsBehindAPrefix) {
+  for (Bytes bytes : binaryPackets(GetParam().code)) {
+    bytes.resize(50);
+    bytes.insert(bytes.begin(), {0x81, 0x00});
+    cutEverywhere(bytes);
+  }
+}
+
+INSTANTIATE_TEST_SUITE_P(AllTechnologies, EveryLengthTest, ::testing::ValuesIn(allSubscriptions()),
+                         nameOf);
+
+}  // namespace
+}  // namespace kestro::testing

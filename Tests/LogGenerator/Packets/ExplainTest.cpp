@@ -1,0 +1,131 @@
+// SPDX-License-Identifier: MIT
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+#include "LogGenerator/Packets/Catalogue.h"
+#include "LogGenerator/Packets/Explain.h"
+
+namespace kestro {
+namespace {
+
+using ::testing::ElementsAre;
+using ::testing::IsEmpty;
+
+void sum(std::span<const std::int64_t> raw, TextBuffer& text) {
+  text.append("%d", raw[0] + raw[1]);
+}
+
+constexpr Field kFields[] = {
+    {"Count", u8(13), hidden()},
+    {"Sum", {u8(14), u8(15)}, computed(sum)},
+    {"Gone", removed()},
+    {"Area", u16(16).bigEndian().bits(4, 11), decimal()},
+};
+constexpr Field kRecordFields[] = {
+    {"ID", u8(0), decimal()},
+    {"Odd", u8(1).bits(1, 7), decimal("%d dB")},
+};
+constexpr ListReading kLists[] = {
+    {.table = {.name = "cell", .count = u8(13), .base = 18, .stride = 2, .fields = kRecordFields}}};
+constexpr PacketReading kReadings[] = {{0x1234, "test packet", 16, kFields, kLists}};
+constexpr LogCode kCodes[] = {0x1234};
+constexpr Section kSection = {"Test", "Test", SectionKind::Dictionary, kReadings, kCodes};
+
+class ExplainTest : public ::testing::Test {
+ protected:
+  void explain(const Bytes& packet) {
+    values.clear();
+    explainReading(kSection, kReadings[0], PacketView(packet),
+                   [this](const ExplainedValue& value) { values.push_back(value); });
+  }
+
+  static Bytes packet(const Bytes& payload) {
+    Bytes bytes(13, 0);
+    bytes.insert(bytes.end(), payload.begin(), payload.end());
+    return bytes;
+  }
+
+  std::vector<std::string_view> keys() {
+    std::vector<std::string_view> result;
+    for (const ExplainedValue& value : values) result.push_back(value.key);
+    return result;
+  }
+
+  std::vector<ExplainedValue> values;
+};
+
+TEST_F(ExplainTest, VisitsEveryFieldAndRecordInOrder) {
+  explain(packet({2, 3, 4, 0xAB, 0xCD, 1, 0x07, 2, 0x09}));
+  EXPECT_THAT(keys(),
+              ElementsAre("Count", "Sum", "Gone", "Area", "count", "ID", "Odd", "ID", "Odd"));
+}
+
+TEST_F(ExplainTest, NamesBytesBitsAndRawValue) {
+  explain(packet({1, 3, 4, 0xAB, 0xCD, 9, 0x07}));
+  const ExplainedSource& odd = values[6].sources.at(0);
+  EXPECT_EQ(odd.offset, 19U);
+  EXPECT_EQ(odd.width, 1U);
+  EXPECT_EQ(odd.firstBit, 1U);
+  EXPECT_EQ(odd.bitCount, 7U);
+  EXPECT_EQ(odd.raw, 3);
+  EXPECT_FALSE(odd.isPastEnd);
+  EXPECT_EQ(values[6].text, Value("3 dB"));
+  EXPECT_EQ(values[6].row, 0U);
+  EXPECT_EQ(values[6].list, "cell");
+}
+
+TEST_F(ExplainTest, ShowsAComputedValueWithEverySource) {
+  explain(packet({0, 3, 4}));
+  ASSERT_EQ(values[1].sources.size(), 2U);
+  EXPECT_EQ(values[1].sources[0].raw, 3);
+  EXPECT_EQ(values[1].sources[1].offset, 15U);
+  EXPECT_EQ(values[1].text, Value("7"));
+}
+
+TEST_F(ExplainTest, ReadsBigEndianPlaces) {
+  explain(packet({0, 0, 0, 0xAB, 0xCD}));
+  EXPECT_EQ(values[3].sources[0].raw, 0xBC);
+  EXPECT_TRUE(values[3].sources[0].isBigEndian);
+}
+
+TEST_F(ExplainTest, HasNoTextForHiddenAndRemovedFields) {
+  explain(packet({0, 3, 4}));
+  EXPECT_TRUE(values[0].text.isNull());
+  EXPECT_TRUE(values[2].text.isNull());
+  EXPECT_THAT(values[2].sources, IsEmpty());
+}
+
+TEST_F(ExplainTest, MarksWhatLiesPastTheEnd) {
+  explain(packet({2, 3, 4, 0xAB, 0xCD, 1}));
+  EXPECT_FALSE(values[5].sources[0].isPastEnd);
+  EXPECT_TRUE(values[6].sources[0].isPastEnd);
+  EXPECT_TRUE(values[7].sources[0].isPastEnd);
+  EXPECT_EQ(values[7].text, Value("0"));
+}
+
+TEST_F(ExplainTest, MarksAPlaceThatIsCutOff) {
+  explain(packet({0, 3, 4, 0xAB}));
+  EXPECT_TRUE(values[3].sources[0].isPastEnd);
+}
+
+TEST_F(ExplainTest, SaysNothingOfAPacketThatIsTooShort) {
+  explain(packet({1, 2}));
+  EXPECT_THAT(values, IsEmpty());
+}
+
+TEST(CatalogueTest, ListsShownKeysOnce) {
+  const CatalogueEntry entry = catalogueReading(kSection, kReadings[0]);
+  EXPECT_EQ(entry.code, 0x1234U);
+  EXPECT_EQ(entry.packetName, "test packet");
+  EXPECT_EQ(entry.minimumLength, 16U);
+  EXPECT_EQ(entry.section, "Test");
+  std::vector<std::string_view> keys;
+  for (const CatalogueKey& key : entry.keys) keys.push_back(key.key);
+  EXPECT_THAT(keys, ElementsAre("Sum", "Area", "ID", "Odd"));
+}
+
+}  // namespace
+}  // namespace kestro
