@@ -1,0 +1,151 @@
+// SPDX-License-Identifier: MIT
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <vector>
+
+#include "LogGenerator/ArrayLock.h"
+#include "Model/KestroModelNode.h"
+
+namespace kestro {
+namespace {
+
+using ::testing::ElementsAre;
+using ::testing::IsEmpty;
+using ::testing::UnorderedElementsAre;
+
+class KestroModelNodeTest : public ::testing::Test {
+ protected:
+  void build(const Value& object) {
+    nodesByPath.clear();
+    root = KestroModelNode::makeTreeFromObjectWithPathDictionary(object, nodesByPath);
+  }
+
+  std::vector<std::string> names(std::string_view path = "/") {
+    std::vector<std::string> result;
+    for (const auto& child : *nodesByPath.at(std::string(path))->childNodes()) {
+      result.push_back(child->displayName());
+    }
+    return result;
+  }
+
+  std::vector<std::string> paths() {
+    std::vector<std::string> result;
+    for (const auto& [path, node] : nodesByPath) result.push_back(path);
+    return result;
+  }
+
+  NodesByPath nodesByPath;
+  NodePointer root;
+};
+
+TEST_F(KestroModelNodeTest, MakesALeafOfAText) {
+  build("value");
+  EXPECT_EQ(root->displayName(), "Kestro");
+  EXPECT_EQ(*root->value(), "value");
+  EXPECT_EQ(root->childNodes(), nullptr);
+}
+
+TEST_F(KestroModelNodeTest, MakesAnUnknownLeafOfNothing) {
+  build(Value());
+  EXPECT_EQ(root->displayName(), "Kestro");
+  EXPECT_EQ(*root->value(), "(unknown)");
+  EXPECT_THAT(paths(), ElementsAre("/"));
+}
+
+TEST_F(KestroModelNodeTest, ShowsNumbersDataAndDatesAsUnknown) {
+  for (const Value& value : {Value::integer(7), Value::real(0.5), Value::boolean(true),
+                             Value::data({1}), Value::date(Moment())}) {
+    build(Dictionary{{"key", value}});
+    EXPECT_EQ(*nodesByPath.at("/key")->value(), "(unknown)");
+  }
+}
+
+TEST_F(KestroModelNodeTest, KeepsTheOrderOfAnUnsortedDictionary) {
+  build(Dictionary{{"b", "1"}, {"a", "2"}, {"c", "3"}});
+  EXPECT_THAT(names(), ElementsAre("b", "a", "c"));
+}
+
+TEST_F(KestroModelNodeTest, KeepsWholeKeysInAnUnsortedDictionary) {
+  build(Dictionary{{"02;B", "x"}, {"01;A", "y"}});
+  EXPECT_THAT(names(), ElementsAre("02;B", "01;A"));
+}
+
+TEST_F(KestroModelNodeTest, SortsByStringAndShowsTheSecondPiece) {
+  build(Dictionary{{"_sorted", "_sorted"}, {"02;B", "x"}, {"01;A", "y"}, {"10;C", "z"}});
+  EXPECT_THAT(names(), ElementsAre("A", "B", "C"));
+}
+
+TEST_F(KestroModelNodeTest, SortsTenBeforeTwoWithoutPadding) {
+  build(Dictionary{{"_sorted", "_sorted"}, {"2;B", "x"}, {"10;C", "z"}});
+  EXPECT_THAT(names(), ElementsAre("C", "B"));
+}
+
+TEST_F(KestroModelNodeTest, SortsByUnsignedBytes) {
+  build(Dictionary{{"_sorted", "_sorted"}, {"\xC3\x84", "x"}, {"z", "y"}, {"Z", "w"}});
+  EXPECT_THAT(names(), ElementsAre("Z", "z", "\xC3\x84"));
+}
+
+TEST_F(KestroModelNodeTest, KeepsKeysWithoutOneSeparatorWhole) {
+  build(
+      Dictionary{{"_sorted", Value::boolean(false)}, {"a;b;c", "x"}, {"plain", "y"}, {"1;", "z"}});
+  EXPECT_THAT(names(), ElementsAre("", "a;b;c", "plain"));
+}
+
+TEST_F(KestroModelNodeTest, LeavesOutKeysThatAreNoTextAndNullValues) {
+  Dictionary dictionary{{"a", "1"}, {"null", Value()}};
+  dictionary.set(Value::integer(3), "three");
+  build(dictionary);
+  EXPECT_THAT(names(), ElementsAre("a"));
+  EXPECT_THAT(paths(), UnorderedElementsAre("/", "/a"));
+}
+
+TEST_F(KestroModelNodeTest, NeverShowsTheSortedMarkerEvenWithoutAValue) {
+  build(Dictionary{{"_sorted", Value()}, {"02;b", "1"}, {"01;a", "2"}});
+  EXPECT_THAT(names(), ElementsAre("02;b", "01;a"));
+}
+
+TEST_F(KestroModelNodeTest, NamesArrayElementsByTheirNumber) {
+  build(Dictionary{{"Active Set", Array{"x", Dictionary{{"PSC", "9"}}}}});
+  EXPECT_THAT(names("/Active Set"), ElementsAre("0", "1"));
+  EXPECT_EQ(*nodesByPath.at("/Active Set/0")->value(), "x");
+  EXPECT_EQ(*nodesByPath.at("/Active Set/1/PSC")->value(), "9");
+}
+
+TEST_F(KestroModelNodeTest, MakesTreeNodesOfEmptyContainers) {
+  build(Dictionary{{"d", Dictionary()}, {"a", Array()}});
+  EXPECT_THAT(names("/d"), IsEmpty());
+  EXPECT_THAT(names("/a"), IsEmpty());
+  EXPECT_EQ(nodesByPath.at("/a")->value(), nullptr);
+}
+
+TEST_F(KestroModelNodeTest, PutsAnArrayAtTheRootUnderNumbers) {
+  build(Array{"x"});
+  EXPECT_THAT(paths(), UnorderedElementsAre("/", "/0"));
+}
+
+TEST_F(KestroModelNodeTest, TakesSlashesInNamesAsTheyStand) {
+  build(Dictionary{{"EF-GPRS/PS-LOCI", "1"}});
+  EXPECT_THAT(paths(), UnorderedElementsAre("/", "/EF-GPRS/PS-LOCI"));
+}
+
+TEST_F(KestroModelNodeTest, KeepsTheLaterOfTwoNodesWithOnePath) {
+  build(Dictionary{{"_sorted", "_sorted"}, {"1;A", "first"}, {"2;A", "second"}});
+  EXPECT_THAT(names(), ElementsAre("A", "A"));
+  EXPECT_EQ(*nodesByPath.at("/A")->value(), "second");
+}
+
+TEST_F(KestroModelNodeTest, HoldsTheArrayLockOncePerNestedArrayAndGivesItBack) {
+  ArrayLock::initialize();
+  build(Array{Array{Array{"x"}}});
+  EXPECT_EQ(ArrayLock::nesting(), 0);
+  EXPECT_EQ(*nodesByPath.at("/0/0/0")->value(), "x");
+}
+
+TEST(PathByAppendingTest, PutsOneSlashBetween) {
+  EXPECT_EQ(pathByAppending("/", "A"), "/A");
+  EXPECT_EQ(pathByAppending("/A", "B"), "/A/B");
+}
+
+}  // namespace
+}  // namespace kestro
