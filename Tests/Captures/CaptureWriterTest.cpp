@@ -1,0 +1,139 @@
+// SPDX-License-Identifier: MIT
+// Writing captures: the bytes, the limits, and disks that refuse them.
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+#include <sys/resource.h>
+
+#include <csignal>
+#include <string>
+
+#include "Captures/CaptureFormat.h"
+#include "Captures/CaptureReader.h"
+#include "Captures/CaptureWriter.h"
+#include "Tests/Captures/CaptureBytes.h"
+#include "Tests/Support/TemporaryDirectory.h"
+
+namespace kestro {
+namespace {
+
+using std::chrono::microseconds;
+using std::chrono::seconds;
+using ::testing::HasSubstr;
+
+class CaptureWriterTest : public ::testing::Test {
+ protected:
+  TemporaryDirectory _directory;
+  const std::string _path = _directory.pathOf("a.pcap");
+};
+
+TEST_F(CaptureWriterTest, writesTheFormatByteForByte) {
+  auto writer = CaptureWriter::create(_path, "UTRAN2");
+  ASSERT_TRUE(writer.has_value()) << writer.error().message;
+  ASSERT_TRUE(writer->write(Moment(microseconds(1'330'862'709'000'250)), Bytes{'a', 'b', 'c'}));
+  ASSERT_TRUE(writer->write(Moment(microseconds(1'330'862'710'500'250)), Bytes{'d', 'e'}));
+  EXPECT_EQ(TemporaryDirectory::read(_path), joined({captureHeader(151), twoRecords()}));
+}
+
+TEST_F(CaptureWriterTest, theHeaderIsThereBeforeAnyMessage) {
+  const auto writer = CaptureWriter::create(_path, "IFX");
+  ASSERT_TRUE(writer.has_value());
+  EXPECT_EQ(TemporaryDirectory::read(_path), captureHeader(147));
+}
+
+TEST_F(CaptureWriterTest, anEarlierFileIsReplaced) {
+  _directory.write("a.pcap", std::string(1000, 'x'));
+  const auto writer = CaptureWriter::create(_path, "IFX");
+  ASSERT_TRUE(writer.has_value());
+  EXPECT_EQ(TemporaryDirectory::read(_path), captureHeader(147));
+}
+
+TEST_F(CaptureWriterTest, theLongestMessageIsReadBackWhole) {
+  const Bytes longest(kMaximumCapturedMessageSize, 0x5A);
+  auto writer = CaptureWriter::create(_path, "LTE");
+  ASSERT_TRUE(writer.has_value());
+  ASSERT_TRUE(writer->write(Moment(seconds(1)), longest));
+  auto reader = CaptureReader::open(_path);
+  ASSERT_TRUE(reader.has_value());
+  const auto message = reader->next();
+  ASSERT_TRUE(message.has_value() && message->has_value());
+  EXPECT_EQ(Bytes((*message)->bytes.begin(), (*message)->bytes.end()), longest);
+}
+
+TEST_F(CaptureWriterTest, aLongerMessageIsRefusedAndTheFileGoesOn) {
+  auto writer = CaptureWriter::create(_path, "LTE");
+  ASSERT_TRUE(writer.has_value());
+  const auto refused = writer->write(Moment(), Bytes(kMaximumCapturedMessageSize + 1));
+  ASSERT_FALSE(refused.has_value());
+  EXPECT_THAT(refused.error().message, HasSubstr("262145"));
+  EXPECT_TRUE(writer->write(Moment(), Bytes{'x'}).has_value());
+  EXPECT_EQ(TemporaryDirectory::read(_path).size(), 24U + 16U + 1U);
+}
+
+TEST_F(CaptureWriterTest, timesOutsideTheFormatAreMovedInside) {
+  auto writer = CaptureWriter::create(_path, "LTE");
+  ASSERT_TRUE(writer.has_value());
+  ASSERT_TRUE(writer->write(Moment(seconds(-5)), {}));
+  ASSERT_TRUE(writer->write(Moment(seconds(std::int64_t{1} << 40)), {}));
+  const Bytes records = {0,    0,    0,    0,    0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0,
+                         0xFF, 0xFF, 0xFF, 0xFF, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0};
+  EXPECT_EQ(TemporaryDirectory::read(_path), joined({captureHeader(150), records}));
+}
+
+TEST_F(CaptureWriterTest, anUnknownTechnologyIsRefusedBeforeTheFileIsTouched) {
+  _directory.write("a.pcap", std::string_view("precious"));
+  const auto writer = CaptureWriter::create(_path, "5G");
+  ASSERT_FALSE(writer.has_value());
+  EXPECT_THAT(writer.error().message, HasSubstr("\"5G\""));
+  EXPECT_EQ(TemporaryDirectory::read(_path).size(), 8U);
+}
+
+TEST_F(CaptureWriterTest, aFileThatCannotBeCreatedIsAnErrorWithTheReason) {
+  const auto path = _directory.pathOf("no/such/folder.pcap");
+  const auto writer = CaptureWriter::create(path, "IFX");
+  ASSERT_FALSE(writer.has_value());
+  EXPECT_EQ(writer.error().message, path + ": cannot create: No such file or directory");
+}
+
+TEST_F(CaptureWriterTest, aFullDiskIsReportedAtOnce) {
+  const auto writer = CaptureWriter::create("/dev/full", "IFX");
+  ASSERT_FALSE(writer.has_value());
+  EXPECT_EQ(writer.error().message, "/dev/full: cannot write: No space left on device");
+}
+
+/// Lets no file of this process grow beyond `bytes`.
+class FileSizeLimit {
+ public:
+  explicit FileSizeLimit(rlim_t bytes) : _handler(std::signal(SIGXFSZ, SIG_IGN)) {
+    getrlimit(RLIMIT_FSIZE, &_before);
+    const rlimit limit{.rlim_cur = bytes, .rlim_max = _before.rlim_max};
+    setrlimit(RLIMIT_FSIZE, &limit);
+  }
+  FileSizeLimit(const FileSizeLimit&) = delete;
+  FileSizeLimit& operator=(const FileSizeLimit&) = delete;
+  ~FileSizeLimit() {
+    setrlimit(RLIMIT_FSIZE, &_before);
+    std::signal(SIGXFSZ, _handler);
+  }
+
+ private:
+  rlimit _before{};
+  void (*_handler)(int);
+};
+
+TEST_F(CaptureWriterTest, bytesRefusedLaterAreReportedFromThenOn) {
+  auto writer = CaptureWriter::create(_path, "IFX");
+  ASSERT_TRUE(writer.has_value());
+  ASSERT_TRUE(writer->write(Moment(), Bytes{'a'}));
+  {
+    const FileSizeLimit limit(24 + 17 + 5);
+    const auto refused = writer->write(Moment(), Bytes{'b'});
+    ASSERT_FALSE(refused.has_value());
+    EXPECT_EQ(refused.error().message, _path + ": cannot write: File too large");
+  }
+  const auto afterwards = writer->write(Moment(), Bytes{'c'});
+  ASSERT_FALSE(afterwards.has_value());
+  EXPECT_EQ(afterwards.error().message, _path + ": cannot write: File too large");
+}
+
+}  // namespace
+}  // namespace kestro
