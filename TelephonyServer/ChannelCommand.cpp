@@ -1,0 +1,67 @@
+// SPDX-License-Identifier: MIT
+#include "TelephonyServer/ChannelCommand.h"
+
+#include <fmt/format.h>
+
+#include <cstdint>
+#include <limits>
+#include <string_view>
+#include <utility>
+#include <vector>
+
+#include "Platform/TelephonyProtocol.h"
+
+namespace kestro {
+namespace {
+
+constexpr std::string_view kSetState = "SetState";
+constexpr std::string_view kStreaming = "Streaming";
+constexpr std::string_view kSetOndrelLogCodes = "SetOndrelLogCodes";
+constexpr std::string_view kSetTqExtraCodes = "SetTqExtraCodes";
+
+/// Adds the codes in the array under `key`, if there is one, to `codes`.
+Result<void> addCodes(const Dictionary& command, std::string_view key, LogCode offset,
+                      std::vector<LogCode>& codes) {
+  const Value& list = command[key];
+  if (list.isNull()) return {};
+  if (!list.isArray()) return failure(fmt::format("{} is no array", key));
+  for (const Value& element : list.array()) {
+    const auto number = element.integerBits();
+    if (!element.isInteger() || number < 0 || number > std::numeric_limits<std::uint16_t>::max()) {
+      return failure(fmt::format("an element of {} is no 16-bit code", key));
+    }
+    codes.push_back(offset | static_cast<LogCode>(number));
+  }
+  return {};
+}
+
+Result<ChannelCommand> startCommand(const Dictionary& command) {
+  if (command[kSetState].text() != kStreaming) {
+    return failure(fmt::format("{} is not \"{}\"", kSetState, kStreaming));
+  }
+  if (!command.contains(kSetOndrelLogCodes) && !command.contains(kSetTqExtraCodes)) {
+    return StartCommand{};
+  }
+  std::vector<LogCode> codes;
+  if (auto added = addCodes(command, kSetOndrelLogCodes, 0, codes); !added) {
+    return tl::unexpected(added.error());
+  }
+  if (auto added = addCodes(command, kSetTqExtraCodes, kExtraCodes, codes); !added) {
+    return tl::unexpected(added.error());
+  }
+  return StartCommand{CodeFilter(std::move(codes))};
+}
+
+}  // namespace
+
+Result<ChannelCommand> parseChannelCommand(const PropertyListCoding& coding, ByteView message) {
+  const auto parsed = coding.parse(message);
+  if (!parsed) return tl::unexpected(parsed.error());
+  if (!parsed->isDictionary()) return failure("the property list is no dictionary");
+  const auto command = parsed->dictionary();
+  if (command.contains(kTelephonyGetTechnology)) return GetTechnologyCommand{};
+  if (command.contains(kSetState)) return startCommand(command);
+  return failure("the dictionary holds no command");
+}
+
+}  // namespace kestro

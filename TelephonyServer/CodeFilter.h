@@ -1,0 +1,28 @@
+// SPDX-License-Identifier: MIT
+// Which log messages a client has asked for.
+#pragma once
+
+#include <vector>
+
+#include "LogGenerator/Packets/Section.h"
+#include "Platform/Bytes.h"
+
+namespace kestro {
+
+class CodeFilter {
+ public:
+  /// Accepts every message.
+  CodeFilter() = default;
+  /// Accepts the messages with one of these codes; extra codes have their offset.
+  explicit CodeFilter(std::vector<LogCode> codes);
+
+  /// Whether the message is wanted. One that is too short to have a code is not, unless everything
+  /// is.
+  [[nodiscard]] bool accepts(ByteView message) const noexcept;
+
+ private:
+  bool _acceptsEverything = true;
+  std::vector<LogCode> _codes;
+};
+
+}  // namespace kestro

@@ -1,0 +1,98 @@
+// SPDX-License-Identifier: MIT
+// Plays a source at its own pace.
+#pragma once
+
+#include <chrono>
+#include <cstdint>
+#include <memory>
+#include <optional>
+#include <string_view>
+
+#include "Platform/Clock.h"
+#include "Platform/MainQueue.h"
+#include "TelephonyServer/Sources/LogSource.h"
+
+namespace kestro {
+
+/// Who takes what is played.
+class PlaybackListener {
+ public:
+  PlaybackListener() = default;
+  virtual ~PlaybackListener() = default;
+  PlaybackListener(const PlaybackListener&) = delete;
+  PlaybackListener& operator=(const PlaybackListener&) = delete;
+
+  /// The technology of the following messages, before the first of them; a constant text. Called
+  /// for changes only: the listener knows the technology with which the source begins.
+  virtual void technologyChanged(std::string_view technology) = 0;
+
+  /// One message, at its time. Valid during the call.
+  virtual void messageDue(ByteView message) = 0;
+};
+
+struct PlaybackOptions {
+  /// How many seconds of the source pass in one second; above 0.
+  double speed = 1.0;
+  /// Whether the source begins again when it has ended.
+  bool loop = false;
+};
+
+/// Hands a source's events to a listener when they are due. Time passes whether or not anybody is
+/// there to listen; events that are late (a busy machine) follow at once, in portions that leave
+/// room for everything else on the main thread. A clock that is set does not disturb the pace.
+class Playback {
+ public:
+  /// The references must outlive the playback. `report` gets a line when the source ends, fails or
+  /// pauses for long.
+  Playback(std::unique_ptr<LogSource> source, const PlaybackOptions& options, MainQueue& queue,
+           const Clock& clock, PlaybackListener& listener, SourceReporter report);
+  Playback(const Playback&) = delete;
+  Playback& operator=(const Playback&) = delete;
+  ~Playback() = default;
+
+  /// Starts the source's time. Nothing is handed over inside this call.
+  void start();
+
+ private:
+  /// What one turn on the main thread may hand over before others have theirs.
+  static constexpr std::size_t kMessagesPerTurn = 256;
+  static constexpr std::size_t kBytesPerTurn = std::size_t{1024} * 1024;
+
+  using Microseconds = std::chrono::duration<double, std::micro>;
+
+  void turn();
+  void passTime();
+  [[nodiscard]] bool fetch();
+  void handOver();
+  void finishPass(std::string_view error);
+  void restart();
+  void wakeAfter(std::chrono::nanoseconds delay);
+  void wakeWhenDue();
+
+  std::unique_ptr<LogSource> _source;
+  PlaybackOptions _options;
+  MainQueue& _queue;
+  const Clock& _clock;
+  PlaybackListener& _listener;
+  SourceReporter _report;
+
+  std::string_view _technology;
+  /// The event that waits for its time.
+  std::optional<SourceEvent> _event;
+  bool _isPauseAnnounced = false;
+  /// How far the source's time has come, and when that was so.
+  Microseconds _position{0};
+  Moment _looked;
+  std::chrono::nanoseconds _asked{0};
+
+  std::uint64_t _messages = 0;
+  std::uint64_t _eventsOfPass = 0;
+  bool _isStopped = false;
+  bool _isInTurn = false;
+  bool _isRestarting = false;
+  std::uint64_t _wakes = 0;
+  /// Blocks on the queue hold it weakly, to know whether the playback still is.
+  std::shared_ptr<bool> _alive = std::make_shared<bool>(true);
+};
+
+}  // namespace kestro

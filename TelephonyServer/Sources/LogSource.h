@@ -1,0 +1,63 @@
+// SPDX-License-Identifier: MIT
+// Where the telephony server's log messages come from.
+#pragma once
+
+#include <chrono>
+#include <functional>
+#include <optional>
+#include <string_view>
+#include <variant>
+
+#include "Platform/Bytes.h"
+#include "Platform/Result.h"
+
+namespace kestro {
+
+/// What a source says next: a message, a technology, or both at one moment.
+struct SourceEvent {
+  /// When the event is due, in the source's own time since its beginning; never before the event
+  /// before it. Absent for a source that happens now: the event is due at once.
+  std::optional<std::chrono::microseconds> time;
+  /// The technology from this event on; a constant text of Platform/TelephonyService.h.
+  std::string_view technology;
+  /// The message, in that technology's format. Valid until the source's next `next` or `restart`.
+  /// Empty when the event only changes the technology.
+  ByteView message;
+};
+
+/// Nothing is there yet; the source's ready handler will say when to ask again.
+struct SourceWaits {};
+
+/// The source has come to its regular end.
+struct SourceEnded {};
+
+using SourceStep = std::variant<SourceEvent, SourceWaits, SourceEnded>;
+
+/// A source of log messages. It knows nothing of clients, and nobody's clock but its own: whoever
+/// plays it decides when to ask. Main thread only.
+class LogSource {
+ public:
+  LogSource() = default;
+  virtual ~LogSource() = default;
+  LogSource(const LogSource&) = delete;
+  LogSource& operator=(const LogSource&) = delete;
+
+  /// The technology with which the source begins, before its first event.
+  [[nodiscard]] virtual std::string_view technology() const = 0;
+
+  /// The next event. An error is final, as the end is: the source yields nothing more until a
+  /// `restart`.
+  [[nodiscard]] virtual Result<SourceStep> next() = 0;
+
+  /// Goes back to the beginning: the times of the events start again from there.
+  [[nodiscard]] virtual Result<void> restart() = 0;
+
+  /// For sources that yield SourceWaits: `handler` runs on the main thread when `next` may have
+  /// more. It must not destroy the source.
+  virtual void setReadyHandler(std::function<void()> handler) { static_cast<void>(handler); }
+};
+
+/// Takes one line for the people who run the server: what a source left out, and why.
+using SourceReporter = std::function<void(std::string_view line)>;
+
+}  // namespace kestro

@@ -1,0 +1,166 @@
+// SPDX-License-Identifier: MIT
+#include "TelephonyServer/Sources/LtePackets.h"
+
+#include <algorithm>
+#include <cmath>
+#include <map>
+#include <string>
+
+#include "LogGenerator/Ondrel/LTE/Measurements.h"
+#include "LogGenerator/Ondrel/LTE/Reselection.h"
+#include "LogGenerator/Ondrel/LTE/ServingCellInfo.h"
+
+namespace kestro {
+namespace {
+
+constexpr unsigned kPacketVersion = 1;
+
+/// The name of a bandwidth, as the display has it.
+std::string_view bandwidthName(unsigned resourceBlocks) {
+  static const std::map<unsigned, std::string_view> kNames = {
+      {6, "1.4 MHz"}, {15, "3 MHz"}, {25, "5 MHz"}, {50, "10 MHz"}, {75, "15 MHz"}, {100, "20 MHz"},
+  };
+  const auto name = kNames.find(resourceBlocks);
+  return name == kNames.end() ? "Unknown" : name->second;
+}
+
+const RecordTable& tableOf(const Section& section, LogCode code) {
+  return readingOf(section, code)->lists.front().table;
+}
+
+PacketWriter writerFor(const Section& section, LogCode code) {
+  return {code, readingOf(section, code)->minimumLength};
+}
+
+PacketWriter::Fields fieldsOf(PacketWriter& writer, const Section& section, LogCode code) {
+  return writer.fields(readingOf(section, code)->fields);
+}
+
+void writeNeighbour(PacketWriter::Fields record, const LteNeighbour& neighbour,
+                    const LteReselectionParameters& reselection) {
+  record.raw("Physical Cell ID", neighbour.physicalCellId)
+      .number("Measured RSSI", neighbour.now.rssi)
+      .number("Measured RSRP", neighbour.now.rsrp)
+      .number("Average RSRP", neighbour.average.rsrp)
+      .number("Measured RSRQ", neighbour.now.rsrq)
+      .number("Average RSRQ", neighbour.average.rsrq)
+      .number("Srxlev", reselection.selectionLevel(neighbour.now.rsrp))
+      .raw("Ant 0 Frame Offset", neighbour.frameOffset)
+      .raw("Ant 0 Sample Offset", neighbour.sampleOffset);
+}
+
+}  // namespace
+
+int LteReselectionParameters::selectionLevel(double rsrp) const noexcept {
+  return static_cast<int>(std::floor(rsrp)) - minimumRsrp;
+}
+
+std::optional<Bytes> lteSystemInformation(const LteCell& cell, Moment time) {
+  const Section& section = kLTEServingCellInfoSection;
+  PacketWriter writer = writerFor(section, kLteSystemInformationCode);
+  fieldsOf(writer, section, kLteSystemInformationCode)
+      .raw("Physical Cell ID", cell.physicalCellId)
+      .raw("Download Frequency", cell.earfcn)
+      .raw("Upload Frequency", cell.uplinkEarfcn)
+      .text("Download Bandwidth", bandwidthName(cell.resourceBlocks))
+      .text("Upload Bandwidth", bandwidthName(cell.resourceBlocks))
+      .raw("Cell Identity", cell.cellIdentity)
+      .raw("Tracking Area Code", cell.trackingAreaCode)
+      .raw("Freq Band Indicator", cell.band);
+  return writer.finish(time);
+}
+
+std::optional<Bytes> lteAntennas(const LteCell& cell, Moment time) {
+  const Section& section = kLTEServingCellInfoSection;
+  PacketWriter writer = writerFor(section, kLteAntennasCode);
+  fieldsOf(writer, section, kLteAntennasCode).raw("Num Tx Antennas", cell.antennas);
+  return writer.finish(time);
+}
+
+std::optional<Bytes> lteServingCell(const LteServing& serving, Moment time) {
+  const Section& section = kServingCellMeasurementSection;
+  const LteReselectionParameters& reselection = serving.reselection;
+  PacketWriter writer = writerFor(section, kLteServingCellCode);
+  fieldsOf(writer, section, kLteServingCellCode)
+      .raw("Version", kPacketVersion)
+      .raw("E-ARFCN", serving.cell.earfcn)
+      .raw("Physical Cell ID", serving.cell.physicalCellId)
+      .raw("Serving Layer Priority", reselection.priority)
+      .number("Measured RSRP", serving.now.rsrp)
+      .number("Average RSRP", serving.average.rsrp)
+      .number("Measured RSRQ", serving.now.rsrq)
+      .number("Average RSRQ", serving.average.rsrq)
+      .number("Measured RSSI", serving.now.rssi)
+      .number("Qrxlevmin", reselection.minimumRsrp)
+      .number("P_Max", reselection.maximumPower)
+      .number("Max UE Tx Power", reselection.maximumPower)
+      .number("Srxlev", reselection.selectionLevel(serving.now.rsrp))
+      .raw("Num of Consecutive DRX Cycles of S < 0", serving.consecutiveLowCycles)
+      .number("S Intra Search", reselection.intraSearch)
+      .number("S Non Intra Search", reselection.nonIntraSearch)
+      .raw("Measurement Rules Updated", serving.rulesUpdated ? 1 : 0);
+  return writer.finish(time);
+}
+
+std::optional<Bytes> lteIntraFrequency(const LteServing& serving,
+                                       std::span<const LteNeighbour> measured,
+                                       std::span<const unsigned> detectedCellIds, unsigned subframe,
+                                       Moment time) {
+  const Section& section = kConnectedModeMeasurementSection;
+  const RecordTable& neighbours = tableOf(kMeasuredNeighborCellsSection, kLteIntraFrequencyCode);
+  const RecordTable& detected = tableOf(kDetectedCellsSection, kLteIntraFrequencyCode);
+  PacketWriter writer = writerFor(section, kLteIntraFrequencyCode);
+  fieldsOf(writer, section, kLteIntraFrequencyCode)
+      .raw("E-ARFCN", serving.cell.earfcn)
+      .raw("Serving Physical Cell ID", serving.cell.physicalCellId)
+      .raw("Subframe Number", subframe)
+      .number("Serving Filtered RSRP", serving.average.rsrp)
+      .number("Serving Filtered RSRQ", serving.average.rsrq);
+  writer.setCount(neighbours, measured.size());
+  writer.setCount(detected, detectedCellIds.size());
+  for (std::size_t i = 0; i < measured.size(); ++i) {
+    writer.record(neighbours, i)
+        .raw("Physical Cell ID", measured[i].physicalCellId)
+        .number("Filtered RSRP", measured[i].average.rsrp)
+        .number("Filtered RSRQ", measured[i].average.rsrq);
+  }
+  for (std::size_t i = 0; i < detectedCellIds.size(); ++i) {
+    writer.record(detected, i).raw("Physical Cell ID", detectedCellIds[i]);
+  }
+  return writer.finish(time);
+}
+
+std::optional<Bytes> lteNeighbours(const LteServing& serving,
+                                   std::span<const LteNeighbour> neighbours, Moment time) {
+  const Section& section = kNeighborMeasurementSection;
+  const RecordTable& table = tableOf(kNeighborCellsListSection, kLteNeighborCode);
+  PacketWriter writer = writerFor(section, kLteNeighborCode);
+  fieldsOf(writer, section, kLteNeighborCode)
+      .raw("Version", kPacketVersion)
+      .raw("E-ARFCN", serving.cell.earfcn)
+      .number("Qrxlevmin", serving.reselection.minimumRsrp);
+  writer.setCount(table, neighbours.size());
+  for (std::size_t i = 0; i < neighbours.size(); ++i) {
+    writeNeighbour(writer.record(table, i), neighbours[i], serving.reselection);
+  }
+  return writer.finish(time);
+}
+
+std::optional<Bytes> lteReselection(const LteServing& serving, const LteCandidate& candidate,
+                                    Moment time) {
+  const Section& section = kReselectionCandidatesSection;
+  const RecordTable& table = tableOf(kReselectionCandidatesListSection, kLteReselectionCode);
+  PacketWriter writer = writerFor(section, kLteReselectionCode);
+  fieldsOf(writer, section, kLteReselectionCode)
+      .raw("Version", kPacketVersion)
+      .raw("Serving EARFCN", serving.cell.earfcn)
+      .raw("Serving Cell ID", serving.cell.physicalCellId);
+  writer.setCount(table, 1);
+  auto record = writer.record(table, 0);
+  record.raw("Candidate Priority", candidate.priority)
+      .text("Candidate RAT Type", candidate.technology);
+  for (const auto& [key, raw] : candidate.fields) record.raw(key, raw);
+  return writer.finish(time);
+}
+
+}  // namespace kestro

@@ -1,0 +1,63 @@
+// SPDX-License-Identifier: MIT
+// kestro-telephonyd: the telephony server.
+#include <fmt/format.h>
+
+#include <cstdio>
+#include <string>
+#include <string_view>
+#include <utility>
+#include <variant>
+
+#include "Platform/Linux/LinuxPlatform.h"
+#include "Platform/TextSink.h"
+#include "TelephonyServer/EndWithParent.h"
+#include "TelephonyServer/Options.h"
+#include "TelephonyServer/Playback.h"
+#include "TelephonyServer/Server.h"
+
+namespace kestro {
+namespace {
+
+int fail(Platform& platform, std::string_view why) {
+  platform.consoleLog().writeLine(fmt::format("kestro-telephonyd: {}", why));
+  return 1;
+}
+
+int serve(LinuxPlatform& platform, const ServerOptions& options) {
+  const SourceReporter report = [&platform](std::string_view line) {
+    platform.systemLog().write(LogPriority::Notice, line);
+    platform.consoleLog().writeLine(fmt::format("kestro-telephonyd: {}", line));
+  };
+  auto source = openSource(options.source, platform, report);
+  if (!source) return fail(platform, source.error().message);
+  auto server = Server::open(platform, options.portName, (*source)->technology(), [&platform] {
+    platform.quit(fail(platform, "the server's port was removed"));
+  });
+  if (!server) return fail(platform, server.error().message);
+  Playback playback(std::move(*source), options.playback, platform.mainQueue(), platform.clock(),
+                    **server, report);
+  platform.setTerminationHandler([&platform] { platform.quit(0); });
+  playback.start();
+  return platform.run();
+}
+
+int runServer(int argumentCount, const char* const* arguments) {
+  const auto parsed = parseServerOptions(argumentCount, arguments);
+  if (const auto* text = std::get_if<OptionsText>(&parsed)) {
+    std::fputs(text->text.c_str(), text->exitStatus == 0 ? stdout : stderr);
+    return text->exitStatus;
+  }
+  const auto& options = std::get<ServerOptions>(parsed);
+  if (options.exitsWithParent && !endWithParent(options.parent)) return 0;
+  LinuxPlatformOptions platformOptions;
+  platformOptions.logThreshold = options.logThreshold;
+  const auto platform = createLinuxPlatform(platformOptions);
+  return serve(*platform, options);
+}
+
+}  // namespace
+}  // namespace kestro
+
+int main(int argumentCount, char** arguments) {
+  return kestro::runServer(argumentCount, arguments);
+}

@@ -1,0 +1,369 @@
+// SPDX-License-Identifier: MIT
+// The server and its clients, on in-memory ports.
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <map>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "Platform/Linux/LinuxPlatform.h"
+#include "Platform/Virtual/VirtualPlatform.h"
+#include "TelephonyServer/Server.h"
+
+namespace kestro {
+namespace {
+
+using std::chrono::seconds;
+using ::testing::AllOf;
+using ::testing::Contains;
+using ::testing::ElementsAre;
+using ::testing::HasSubstr;
+using ::testing::IsEmpty;
+using ::testing::StartsWith;
+
+/// A server under its usual name, and clients that speak to it with bytes of their own.
+class ServerTest : public ::testing::Test {
+ protected:
+  void SetUp() override {
+    auto server = Server::open(_platform, "TelephonyServer", "IFX", [this] { _portLost = true; });
+    ASSERT_TRUE(server.has_value()) << server.error().message;
+    _server = std::move(*server);
+  }
+
+  static Bytes bytesOf(std::string_view text) { return {text.begin(), text.end()}; }
+  Bytes xml(const Dictionary& dictionary) const { return *_coding->xml(dictionary); }
+  Dictionary parsed(const std::optional<Bytes>& bytes) const {
+    if (!bytes) return Dictionary::null();
+    const auto value = _coding->parse(*bytes);
+    return value ? value->dictionary() : Dictionary::null();
+  }
+  std::shared_ptr<RemotePort> connect(std::string_view name) {
+    return _platform.messagePorts().createRemotePort(name);
+  }
+
+  /// Opens a client's local port, whose messages are collected under its name.
+  void openClientPort(const std::string& name) {
+    _clientPorts[name] = _platform.messagePorts().createLocalPort(
+        name, [this, name](std::int32_t id, ByteView message) -> std::optional<Bytes> {
+          _received[name].push_back(std::to_string(id) + ":" +
+                                    std::string(message.begin(), message.end()));
+          return std::nullopt;
+        });
+  }
+  Dictionary request(const Bytes& body) {
+    const auto reply = connect("TelephonyServer")->request(2, body, seconds(1), seconds(1));
+    EXPECT_EQ(reply.error, SendError::None);
+    return parsed(reply.data);
+  }
+  Dictionary requestChannel(const std::string& localPort) {
+    return request(xml({{"LocalPort", localPort}}));
+  }
+  /// Opens a client with a channel; returns the connection on which commands go.
+  std::shared_ptr<RemotePort> openChannel(const std::string& client) {
+    openClientPort(client);
+    const auto reply = requestChannel(client);
+    EXPECT_EQ(reply["Error"], Value::integer(0));
+    return connect(reply["Port"].text());
+  }
+  std::shared_ptr<RemotePort> openStream(const std::string& client) {
+    auto channel = openChannel(client);
+    command(channel, {{"SetState", "Streaming"}});
+    return channel;
+  }
+  void command(const std::shared_ptr<RemotePort>& channel, const Dictionary& body) {
+    EXPECT_EQ(channel->send(0, xml(body), seconds(1)), SendError::None);
+    run();
+  }
+  void registerPort(const std::string& name) {
+    EXPECT_EQ(connect("TelephonyServer")->send(1, xml({{"NotificationPort", name}}), seconds(1)),
+              SendError::None);
+    run();
+  }
+  void stream(std::string_view message) {
+    _server->messageDue(bytesOf(message));
+    run();
+  }
+  void run() { _platform.mainQueue().runReady(); }
+  std::vector<std::string> logLines() {
+    std::vector<std::string> lines;
+    for (const auto& line : _platform.systemLog().take()) lines.push_back(line.text);
+    return lines;
+  }
+
+  std::unique_ptr<PropertyListCoding> _coding = createPropertyListCoding();
+  VirtualPlatform _platform{*_coding};
+  std::map<std::string, std::shared_ptr<LocalPort>> _clientPorts;
+  std::map<std::string, std::vector<std::string>> _received;
+  std::unique_ptr<Server> _server;
+  bool _portLost = false;
+};
+
+TEST_F(ServerTest, aNameThatIsTakenIsAnError) {
+  const auto second = Server::open(_platform, "TelephonyServer", "IFX", [] {});
+  ASSERT_FALSE(second.has_value());
+  EXPECT_EQ(second.error().message,
+            "another server is running: the port name \"TelephonyServer\" is taken");
+}
+
+TEST_F(ServerTest, aNameThatIsNoneIsAnError) {
+  EXPECT_FALSE(Server::open(_platform, "a/b", "IFX", [] {}).has_value());
+}
+
+TEST_F(ServerTest, losingItsNameIsReported) {
+  _platform.messagePorts().lose("TelephonyServer");
+  EXPECT_TRUE(_portLost);
+}
+
+TEST_F(ServerTest, everyChannelHasAPortOfItsOwn) {
+  openClientPort("A");
+  const auto first = requestChannel("A");
+  const auto second = requestChannel("A");
+  EXPECT_EQ(first["Error"], Value::integer(0));
+  EXPECT_EQ(first["Port"].text(), "LogChannel.00000000-0000-0000-0000-000000000001");
+  EXPECT_EQ(second["Port"].text(), "LogChannel.00000000-0000-0000-0000-000000000002");
+  EXPECT_EQ(_server->channelCount(), 2U);
+}
+
+TEST_F(ServerTest, badChannelRequestsAreAnsweredWithOne) {
+  openClientPort("A");
+  EXPECT_EQ(request(bytesOf("garbage"))["Error"], Value::integer(1));
+  EXPECT_EQ(request({})["Error"], Value::integer(1));
+  EXPECT_EQ(request(xml({{"Port", "A"}}))["Error"], Value::integer(1));
+  EXPECT_EQ(request(xml({{"LocalPort", "a/b"}}))["Error"], Value::integer(1));
+  EXPECT_EQ(request(xml({{"LocalPort", Value::integer(1)}}))["Error"], Value::integer(1));
+  EXPECT_EQ(request(*_coding->xml(Array{"LocalPort", "A"}))["Error"], Value::integer(1));
+  EXPECT_EQ(_server->channelCount(), 0U);
+}
+
+TEST_F(ServerTest, aLocalPortThatNobodyOwnsIsAnsweredWithTwo) {
+  const auto reply = requestChannel("Nobody");
+  EXPECT_EQ(reply["Error"], Value::integer(2));
+  EXPECT_TRUE(reply["Port"].isNull());
+}
+
+TEST_F(ServerTest, aChannelWithoutAPortIsAnsweredWithThree) {
+  openClientPort("A");
+  _platform.messagePorts().failures().localPort = true;
+  EXPECT_EQ(requestChannel("A")["Error"], Value::integer(3));
+  _platform.uuids().setExhausted(true);
+  EXPECT_EQ(requestChannel("A")["Error"], Value::integer(3));
+  EXPECT_EQ(_server->channelCount(), 0U);
+}
+
+TEST_F(ServerTest, thereAreNoMoreThan512Channels) {
+  openClientPort("A");
+  for (int i = 0; i < 512; ++i) {
+    ASSERT_EQ(requestChannel("A")["Error"], Value::integer(0)) << i;
+  }
+  EXPECT_EQ(requestChannel("A")["Error"], Value::integer(3));
+  _clientPorts["A"]->invalidate();
+  openClientPort("B");
+  EXPECT_EQ(requestChannel("B")["Error"], Value::integer(0));
+}
+
+TEST_F(ServerTest, answersGetTechnology) {
+  const auto channel = openChannel("A");
+  const auto body = xml({{"GetTechnology", "GetTechnology"}});
+  const auto reply = channel->request(0, body, seconds(1), seconds(1));
+  EXPECT_EQ(Value(parsed(reply.data)), Value(Dictionary{{"GetTechnology", "IFX"}}));
+}
+
+TEST_F(ServerTest, streamsNothingBeforeTheStartCommand) {
+  const auto channel = openChannel("A");
+  stream("one");
+  command(channel, {{"SetState", "Streaming"}});
+  stream("two");
+  EXPECT_THAT(_received["A"], ElementsAre("0:two"));
+}
+
+TEST_F(ServerTest, everyStreamingClientGetsEveryMessage) {
+  const auto a = openStream("A");
+  const auto b = openStream("B");
+  stream("one");
+  stream("two");
+  EXPECT_THAT(_received["A"], ElementsAre("0:one", "0:two"));
+  EXPECT_THAT(_received["B"], ElementsAre("0:one", "0:two"));
+}
+
+TEST_F(ServerTest, eachClientGetsTheCodesThatItAskedFor) {
+  const auto a = openChannel("A");
+  const auto b = openChannel("B");
+  command(a, {{"SetState", "Streaming"}, {"SetOndrelLogCodes", Array{Value::integer(0x4241)}}});
+  command(b, {{"SetState", "Streaming"},
+              {"SetOndrelLogCodes", Array{}},
+              {"SetTqExtraCodes", Array{Value::integer(0x4241)}}});
+  stream("\x01..AB");
+  stream("\xFF..AB");
+  stream("\x01..XY");
+  EXPECT_THAT(_received["A"], ElementsAre("0:\x01..AB"));
+  EXPECT_THAT(_received["B"], ElementsAre("0:\xFF..AB"));
+}
+
+TEST_F(ServerTest, aLaterStartCommandReplacesTheEarlier) {
+  const auto channel = openChannel("A");
+  command(channel, {{"SetState", "Streaming"}, {"SetOndrelLogCodes", Array{}}});
+  stream("\x01..AB");
+  command(channel, {{"SetState", "Streaming"}});
+  stream("\x01..XY");
+  EXPECT_THAT(_received["A"], ElementsAre("0:\x01..XY"));
+}
+
+TEST_F(ServerTest, malformedCommandsAreDroppedWithALine) {
+  const auto channel = openChannel("A");
+  logLines();
+  const std::vector<Bytes> bodies = {
+      bytesOf("garbage"),
+      {},
+      *_coding->xml(Array{"SetState", "Streaming"}),
+      xml({{"Other", "x"}}),
+      xml({{"SetState", "Dancing"}}),
+      xml({{"SetState", Value::integer(1)}}),
+      xml({{"SetState", "Streaming"}, {"SetOndrelLogCodes", "17"}}),
+      xml({{"SetState", "Streaming"}, {"SetOndrelLogCodes", Array{"17"}}}),
+      xml({{"SetState", "Streaming"}, {"SetTqExtraCodes", Array{Value::integer(-1)}}}),
+      xml({{"SetState", "Streaming"}, {"SetTqExtraCodes", Array{Value::integer(65536)}}})};
+  for (std::size_t i = 0; i < bodies.size(); ++i) {
+    channel->send(0, bodies[i], seconds(1));
+    run();
+    EXPECT_THAT(logLines(),
+                ElementsAre(AllOf(StartsWith("LogChannel."), HasSubstr(" received no command: "))))
+        << i;
+  }
+  stream("one");
+  EXPECT_THAT(_received["A"], IsEmpty());
+  EXPECT_EQ(_server->channelCount(), 1U);
+}
+
+TEST_F(ServerTest, messagesWithOtherIdsAreIgnored) {
+  const auto channel = openChannel("A");
+  channel->send(7, xml({{"SetState", "Streaming"}}), seconds(1));
+  connect("TelephonyServer")->send(0, xml({{"LocalPort", "A"}}), seconds(1));
+  run();
+  stream("one");
+  EXPECT_THAT(_received["A"], IsEmpty());
+  EXPECT_EQ(_server->channelCount(), 1U);
+}
+
+TEST_F(ServerTest, aClientThatGoesAwayFreesItsChannel) {
+  const auto a = openStream("A");
+  const auto b = openStream("B");
+  _clientPorts["A"]->invalidate();
+  _platform.mainQueue().advance(seconds(1));
+  EXPECT_EQ(_server->channelCount(), 1U);
+  EXPECT_FALSE(a->isValid());
+  EXPECT_TRUE(b->isValid());
+}
+
+TEST_F(ServerTest, aClientThatHasGoneIsNoticedByTheNextMessageToo) {
+  const auto a = openStream("A");
+  _clientPorts["A"]->invalidate();
+  stream("one");
+  EXPECT_EQ(_server->channelCount(), 0U);
+}
+
+TEST_F(ServerTest, aSlowClientLosesItsChannelAndStallsNobody) {
+  const auto slow = openStream("Slow");
+  const auto quick = openStream("Quick");
+  logLines();
+  _platform.messagePorts().setStalled("Slow", true);
+  const std::string megabyte(1024 * 1024, 'x');
+  for (int i = 0; i < 6; ++i) stream(megabyte);
+  EXPECT_EQ(_received["Quick"].size(), 6U);
+  EXPECT_EQ(_server->channelCount(), 1U);
+  EXPECT_FALSE(slow->isValid());
+  EXPECT_TRUE(quick->isValid());
+  EXPECT_THAT(logLines(), Contains(HasSubstr("reads too slowly")));
+}
+
+TEST_F(ServerTest, aMessageThatNoQueueHoldsIsLeftOutForAll) {
+  const auto channel = openStream("A");
+  logLines();
+  _server->messageDue(Bytes(Server::kMaximumStreamedMessage + 1));
+  run();
+  EXPECT_THAT(_received["A"], IsEmpty());
+  EXPECT_TRUE(channel->isValid());
+  EXPECT_THAT(logLines(), ElementsAre(HasSubstr("A message of 4194289 bytes is left out")));
+}
+
+TEST_F(ServerTest, aChangeOfTechnologyInvalidatesTheChannelsBeforeItNotifies) {
+  const auto channel = openStream("A");
+  bool wasValidWhenNotified = true;
+  std::vector<std::string> notifications;
+  const auto port = _platform.messagePorts().createLocalPort(
+      "N", [&](std::int32_t id, ByteView message) -> std::optional<Bytes> {
+        wasValidWhenNotified = channel->isValid();
+        const auto body = parsed(Bytes(message.begin(), message.end()));
+        notifications.push_back(std::to_string(id) + ":" +
+                                std::string(body["Notification"].text()));
+        return std::nullopt;
+      });
+  registerPort("N");
+  _server->technologyChanged("LTE");
+  EXPECT_FALSE(channel->isValid());
+  EXPECT_EQ(_server->channelCount(), 0U);
+  run();
+  EXPECT_THAT(notifications, ElementsAre("3:TechnologyChanged"));
+  EXPECT_FALSE(wasValidWhenNotified);
+}
+
+TEST_F(ServerTest, aNewChannelSpeaksTheNewTechnology) {
+  _server->technologyChanged("LTE");
+  const auto reply = openChannel("A")->request(0, xml({{"GetTechnology", "GetTechnology"}}),
+                                               seconds(1), seconds(1));
+  EXPECT_EQ(parsed(reply.data)["GetTechnology"], Value("LTE"));
+}
+
+TEST_F(ServerTest, aRegistrationTwiceCountsOnce) {
+  openClientPort("N");
+  registerPort("N");
+  registerPort("N");
+  EXPECT_EQ(_server->registrationCount(), 1U);
+  _server->technologyChanged("LTE");
+  run();
+  EXPECT_EQ(_received["N"].size(), 1U);
+}
+
+TEST_F(ServerTest, aRegistrationEndsWithItsPort) {
+  openClientPort("N");
+  registerPort("N");
+  _clientPorts["N"]->invalidate();
+  _platform.mainQueue().advance(seconds(1));
+  EXPECT_EQ(_server->registrationCount(), 0U);
+}
+
+TEST_F(ServerTest, aPortThatCameBackCanRegisterAgainAtOnce) {
+  openClientPort("N");
+  registerPort("N");
+  _clientPorts["N"]->invalidate();
+  openClientPort("N");
+  registerPort("N");
+  _server->technologyChanged("LTE");
+  run();
+  EXPECT_EQ(_received["N"].size(), 1U);
+}
+
+TEST_F(ServerTest, unusableRegistrationsAreDroppedWithALine) {
+  connect("TelephonyServer")->send(1, bytesOf("garbage"), seconds(1));
+  run();
+  registerPort("a/b");
+  registerPort("Nobody");
+  EXPECT_EQ(_server->registrationCount(), 0U);
+  EXPECT_THAT(logLines(), ElementsAre("A registration is dropped: it names no port",
+                                      "A registration is dropped: it names no port",
+                                      "A registration is dropped: nobody owns the port Nobody"));
+}
+
+TEST_F(ServerTest, thereAreNoMoreThan512Registrations) {
+  for (int i = 0; i < 513; ++i) {
+    const auto name = "N" + std::to_string(i);
+    openClientPort(name);
+    registerPort(name);
+  }
+  EXPECT_EQ(_server->registrationCount(), 512U);
+  EXPECT_THAT(logLines(), ElementsAre("A registration is dropped: there are too many"));
+}
+
+}  // namespace
+}  // namespace kestro
