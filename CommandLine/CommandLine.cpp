@@ -1,0 +1,58 @@
+// SPDX-License-Identifier: MIT
+#include "CommandLine/CommandLine.h"
+
+#include <CLI/CLI.hpp>
+#include <algorithm>
+#include <array>
+#include <string>
+#include <vector>
+
+#include "CommandLine/Command.h"
+#include "CommandLine/DecodeCommand.h"
+#include "CommandLine/ExitStatus.h"
+#include "CommandLine/RecordCommand.h"
+#include "CommandLine/WatchCommand.h"
+#include "Platform/Bundle.h"
+#include "Platform/Linux/LinuxPlatform.h"
+
+namespace kestro {
+namespace {
+
+/// Every command, in the order of the help.
+constexpr std::array kCommands = {addWatchCommand, addDecodeCommand, addRecordCommand};
+
+constexpr const char* kFooter = R"(Exit status:
+  0  done
+  1  nothing could be done; one line says why
+  2  wrong usage
+  3  done, but some messages could not be decoded; each is named on standard error
+
+`kestro-cli COMMAND --help` explains a command.)";
+
+std::string versionText() {
+  return "kestro-cli " + createBundle()->version().value_or("of unknown version");
+}
+
+}  // namespace
+
+int runCommandLine(int argumentCount, const char* const* arguments) {
+  CLI::App program("Shows live, or from a recording, what a phone's cellular baseband is doing.",
+                   "kestro-cli");
+  program.set_version_flag("--version", versionText);
+  program.require_subcommand(1);
+  program.footer(kFooter);
+  std::vector<Command> commands;
+  std::ranges::transform(kCommands, std::back_inserter(commands),
+                         [&](const auto& add) { return add(program); });
+  try {
+    program.parse(argumentCount, arguments);
+  } catch (const CLI::ParseError& error) {
+    // Help and version are "errors" of status 0, and go to standard output.
+    return program.exit(error) == 0 ? kExitDone : kExitWrongUsage;
+  }
+  const auto chosen = std::ranges::find_if(
+      commands, [](const Command& command) { return command.declaration->parsed(); });
+  return chosen->run();
+}
+
+}  // namespace kestro

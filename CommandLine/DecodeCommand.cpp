@@ -1,0 +1,162 @@
+// SPDX-License-Identifier: MIT
+#include "CommandLine/DecodeCommand.h"
+
+#include <fmt/format.h>
+
+#include <CLI/CLI.hpp>
+#include <algorithm>
+#include <memory>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "Captures/CaptureReader.h"
+#include "CommandLine/DecodeWriter.h"
+#include "CommandLine/ExitStatus.h"
+#include "CommandLine/OfflinePlatform.h"
+#include "CommandLine/Output.h"
+#include "Model/Replay.h"
+
+namespace kestro {
+namespace {
+
+constexpr const char* kFooter = R"(Formats:
+  tree    the display after the last message, for people
+  json    one object: "technology", "messages" (how many) and the last "display"
+  ndjson  one line a refresh: "time", "message" (the last one's number) and "display"
+  csv     one line for each value and refresh: time,message,path,value
+Times are the capture's, in UTC. Messages are numbered from 1, counting every record.
+
+Examples:
+  kestro-cli decode drive.pcap
+  kestro-cli decode drive.pcap --format=json | jq '.display'
+  kestro-cli decode drive.pcap --format=csv --refresh-every=0 > every-message.csv)";
+
+struct DecodeOptions {
+  std::string capture;
+  std::string format;
+  double refreshSeconds = 2;
+  std::string logFile;
+};
+
+/// One run of the command.
+class Decoder {
+ public:
+  Decoder(const DecodeOptions& options, CaptureReader reader, std::optional<Output> logFile)
+      : _options(options), _reader(std::move(reader)), _platform(std::move(logFile)) {}
+
+  int run() {
+    const auto generator = LogGenerator::generatorFromTechnology(_platform, _reader.technology());
+    if (!generator) {
+      complain(fmt::format("{}: nothing here decodes the technology {}", _options.capture,
+                           _reader.technology()));
+      return kExitNothingDone;
+    }
+    const std::unique_ptr<DecodeWriter> writer = makeWriter();
+    Replay replay(*generator, _platform.clock(),
+                  {.refreshInterval = durationOfSeconds(_options.refreshSeconds)},
+                  [&](const ReplayRefresh& refresh) { writer->refreshed(refresh); });
+    writer->begin();
+    if (!feedMessages(replay)) return kExitNothingDone;
+    replay.finish();
+    writer->finish({.technology = _reader.technology(),
+                    .messages = _reader.messageCount(),
+                    .display = replay.display()});
+    return finish();
+  }
+
+ private:
+  [[nodiscard]] std::unique_ptr<DecodeWriter> makeWriter() {
+    const auto& formats = decodeFormats();
+    return std::ranges::find(formats, _options.format, &DecodeFormat::name)->makeWriter(_output);
+  }
+
+  /// Feeds the capture up to its end or to where it is damaged; false when that yields nothing.
+  [[nodiscard]] bool feedMessages(Replay& replay) {
+    while (_output.failureMessage().empty()) {
+      const auto next = _reader.next();
+      if (!next) {
+        complain(next.error().message);
+        _status = kExitPartlyDone;
+        return _reader.messageCount() > 0;
+      }
+      if (!*next) return true;
+      feed(replay, **next);
+    }
+    return true;
+  }
+
+  void feed(Replay& replay, const RecordedMessage& message) {
+    if (message.isCut()) {
+      return skip(message, fmt::format("only {} of its {} bytes were recorded",
+                                       message.bytes.size(), message.originalLength));
+    }
+    const auto outcome =
+        replay.feed({.number = message.number, .time = message.time, .bytes = message.bytes});
+    if (!outcome) skip(message, outcome.error().message);
+  }
+
+  void skip(const RecordedMessage& message, const std::string& reason) {
+    complain(fmt::format("{}: message {}: {}", _options.capture, message.number, reason));
+    _status = kExitPartlyDone;
+  }
+
+  /// Hands the outputs to the system; the exit status.
+  [[nodiscard]] int finish() {
+    _output.flush();
+    if (!_output.failureMessage().empty()) {
+      complain(_output.failureMessage());
+      return kExitNothingDone;
+    }
+    if (const auto logged = _platform.finishLog(); !logged) {
+      complain(logged.error().message);
+      return kExitNothingDone;
+    }
+    return _status;
+  }
+
+  const DecodeOptions& _options;
+  CaptureReader _reader;
+  OfflinePlatform _platform;
+  Output _output = Output::standardOutput();
+  ExitStatus _status = kExitDone;
+};
+
+int runDecode(const DecodeOptions& options) {
+  auto reader = CaptureReader::open(options.capture);
+  if (!reader) {
+    complain(reader.error().message);
+    return kExitNothingDone;
+  }
+  std::optional<Output> logFile;
+  if (!options.logFile.empty()) {
+    auto created = Output::create(options.logFile);
+    if (!created) {
+      complain(created.error().message);
+      return kExitNothingDone;
+    }
+    logFile = *std::move(created);
+  }
+  return Decoder(options, *std::move(reader), std::move(logFile)).run();
+}
+
+}  // namespace
+
+Command addDecodeCommand(CLI::App& program) {
+  const auto options = std::make_shared<DecodeOptions>();
+  CLI::App* command = program.add_subcommand("decode", "Decode a recorded capture");
+  command->add_option("CAPTURE", options->capture, "The capture, a pcap file")
+      ->required()
+      ->option_text(" ");
+  addFormatOption(*command, options->format, formatNames(decodeFormats()));
+  addSecondsOption(*command, "--refresh-every", options->refreshSeconds,
+                   "The capture's time between refreshes; 0: after every message");
+  command
+      ->add_option("--log-json", options->logFile,
+                   "Write every line of the system log there, as {\"priority\",\"message\"}")
+      ->option_text("FILE");
+  command->footer(kFooter);
+  return {command, [options] { return runDecode(*options); }};
+}
+
+}  // namespace kestro

@@ -1,0 +1,44 @@
+// SPDX-License-Identifier: MIT
+#include "CommandLine/Output.h"
+
+#include <fmt/format.h>
+
+#include <cerrno>
+#include <cstring>
+
+namespace kestro {
+
+void Output::Closer::operator()(std::FILE* file) const noexcept {
+  if (file == stdout) {
+    static_cast<void>(std::fflush(file));
+  } else {
+    static_cast<void>(std::fclose(file));
+  }
+}
+
+Output Output::standardOutput() { return {"standard output", stdout}; }
+
+Result<Output> Output::create(const std::string& path) {
+  std::FILE* file = std::fopen(path.c_str(), "wbe");
+  if (file == nullptr) return failure(fmt::format("{}: {}", path, std::strerror(errno)));
+  return Output(path, file);
+}
+
+void Output::write(std::string_view text) {
+  if (!_failure.empty()) return;
+  checkSystemError(std::fwrite(text.data(), 1, text.size(), _file.get()) == text.size());
+}
+
+void Output::flush() {
+  if (_failure.empty()) checkSystemError(std::fflush(_file.get()) == 0);
+}
+
+void Output::checkSystemError(bool succeeded) {
+  if (succeeded) return;
+  _failure = fmt::format("{}: {}", _name, std::strerror(errno));
+  _readerIsGone = errno == EPIPE;
+}
+
+void complain(std::string_view message) { fmt::print(stderr, "kestro-cli: {}\n", message); }
+
+}  // namespace kestro

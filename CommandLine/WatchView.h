@@ -1,0 +1,58 @@
+// SPDX-License-Identifier: MIT
+// The ways in which `watch` shows displays.
+#pragma once
+
+#include <memory>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "CommandLine/Output.h"
+#include "Model/KestroModelNode.h"
+#include "Platform/Clock.h"
+
+namespace kestro {
+
+/// What is to be seen at a moment.
+struct WatchState {
+  Moment time;           ///< of the last refresh
+  std::string status;    ///< "Connecting..." or "Updated …"
+  NodePointer tree;      ///< null before the first refresh
+  NodePointer previous;  ///< the tree of the refresh before, or null
+};
+
+/// Who shows it.
+class WatchView {
+ public:
+  WatchView() = default;
+  virtual ~WatchView() = default;
+  WatchView(const WatchView&) = delete;
+  WatchView& operator=(const WatchView&) = delete;
+
+  /// The display was refreshed: `state.tree` is new.
+  virtual void refreshed(const WatchState& state) = 0;
+  /// Only the status changed, or the window.
+  virtual void changed(const WatchState& state) = 0;
+  /// Why nothing more can be shown, as Output has it; an empty text while all is well.
+  [[nodiscard]] virtual std::string_view failureMessage() const { return {}; }
+  /// Whether the failure is just that nobody reads any more.
+  [[nodiscard]] virtual bool readerIsGone() const { return false; }
+};
+
+/// A format's name on the command line, and its view.
+struct WatchFormat {
+  std::string_view name;
+  std::unique_ptr<WatchView> (*makeView)(const std::string& title);
+};
+
+/// All formats, the default first.
+[[nodiscard]] const std::vector<WatchFormat>& watchFormats();
+
+/// The displays one below the other, each after its status line, and a line when the connection is
+/// lost.
+[[nodiscard]] std::unique_ptr<WatchView> makePlainView(Output output);
+
+/// One line of JSON a refresh.
+[[nodiscard]] std::unique_ptr<WatchView> makeNdjsonView(Output output);
+
+}  // namespace kestro

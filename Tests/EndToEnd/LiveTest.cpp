@@ -1,0 +1,175 @@
+// SPDX-License-Identifier: MIT
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <csignal>
+#include <filesystem>
+#include <fstream>
+#include <nlohmann/json.hpp>
+#include <set>
+
+#include "Tests/EndToEnd/LiveFixture.h"
+
+namespace kestro::testing {
+namespace {
+
+using ::testing::Contains;
+using ::testing::HasSubstr;
+using ::testing::IsSupersetOf;
+using ::testing::MatchesRegex;
+using ::testing::Not;
+using ::testing::SizeIs;
+
+/// The displays of lines of ndjson, each as compact JSON.
+std::vector<std::string> displaysIn(const std::vector<std::string>& lines) {
+  std::vector<std::string> result;
+  result.reserve(lines.size());
+  for (const std::string& line : lines) {
+    result.push_back(nlohmann::ordered_json::parse(line)["display"].dump());
+  }
+  return result;
+}
+
+/// The children of a process.
+std::vector<pid_t> childrenOf(pid_t process) {
+  const std::string id = std::to_string(process);
+  std::ifstream stream("/proc/" + id + "/task/" + id + "/children");
+  std::vector<pid_t> result;
+  for (pid_t child = 0; stream >> child;) result.push_back(child);
+  return result;
+}
+
+bool isRunning(pid_t process) {
+  std::ifstream stream("/proc/" + std::to_string(process) + "/stat");
+  std::string word;
+  for (int i = 0; i < 3; ++i) stream >> word;
+  return stream && word != "Z";
+}
+
+TEST_F(LiveTest, WatchWritesTheSourcesDisplays) {
+  startServer();
+  const auto watch = start({"kestro-cli", "watch", "--format=ndjson", "--count=2"});
+  EXPECT_EQ(watch->wait(), 0);
+  const auto displays = displaysIn(watch->outputLines());
+  ASSERT_THAT(displays, SizeIs(2));
+  const int first = std::stoi(std::string(nlohmann::json::parse(displays[0])["Count"]));
+  const int second = std::stoi(std::string(nlohmann::json::parse(displays[1])["Count"]));
+  EXPECT_EQ(displays[0], ifxDisplay(std::to_string(first)));
+  EXPECT_EQ(displays[1], ifxDisplay(std::to_string(second)));
+  EXPECT_GT(second, first);
+}
+
+TEST_F(LiveTest, ARecordingDecodesToTheDisplaysThatWereWatched) {
+  startServer();
+  const std::string recording = source.directory() + "/recording.pcap";
+  const auto record = start({"kestro-cli", "record", "-o", recording});
+  ASSERT_TRUE(record->waitUntil(
+      [&] { return record->errors().find("recording IFX") != std::string::npos; }));
+  const auto watch = start({"kestro-cli", "watch", "--format=ndjson", "--count=2"});
+  EXPECT_EQ(watch->wait(), 0);
+  record->signal(SIGINT);
+  EXPECT_EQ(record->wait(), 0);
+  EXPECT_THAT(record->errors(), HasSubstr(" 0 dropped, in " + recording));
+
+  const Outcome decoded =
+      run({"kestro-cli", "decode", recording, "--format=ndjson", "--refresh-every=0"});
+  EXPECT_EQ(decoded.status, 0);
+  std::istringstream stream(decoded.output);
+  std::vector<std::string> lines;
+  for (std::string line; std::getline(stream, line);) lines.push_back(line);
+  EXPECT_THAT(displaysIn(lines), IsSupersetOf(displaysIn(watch->outputLines())));
+}
+
+TEST_F(LiveTest, RecordEndsAfterItsDuration) {
+  startServer();
+  const std::string recording = source.directory() + "/recording.pcap";
+  const auto record = start({"kestro-cli", "record", "-o", recording, "--duration=0.5"});
+  EXPECT_EQ(record->wait(), 0);
+  EXPECT_THAT(record->errors(), HasSubstr("kestro-cli: recorded "));
+}
+
+TEST_F(LiveTest, RecordWithoutAServerHasDoneNothing) {
+  const auto record = start({"kestro-cli", "record", "-o", "/tmp/never", "--duration=0.2"});
+  EXPECT_EQ(record->wait(), 1);
+  EXPECT_EQ(record->errors(),
+            "kestro-cli: connecting...\n"
+            "kestro-cli: nothing was recorded: no telephony server could be connected to\n");
+}
+
+TEST_F(LiveTest, AKilledServerIsReconnectedToAndTheDisplayGoesOn) {
+  startServer();
+  const auto watch = start({"kestro-cli", "watch"});
+  ASSERT_TRUE(watch->waitForOutput("Updated "));
+  server->signal(SIGKILL);
+  server->wait();
+  watch->forgetOutput();
+  ASSERT_TRUE(watch->waitForOutput("Connecting...\n"));
+  watch->forgetOutput();
+  startServer();
+  ASSERT_TRUE(watch->waitForOutput("\n\nCount  "));
+  EXPECT_THAT(watch->output(), HasSubstr("Updated "));
+  watch->signal(SIGINT);
+  EXPECT_EQ(watch->wait(), 0);
+}
+
+TEST_F(LiveTest, AGarbageDisplayListEndsWatchWithItsName) {
+  startGarbageServer();
+  const auto watch = start({"kestro-cli", "watch"});
+  EXPECT_EQ(watch->wait(), -SIGABRT);
+  EXPECT_THAT(watch->errors(),
+              HasSubstr("kestro-cli: ended by a failure: Could not deserialize the object "
+                        "(LogGenerator/GSM/GSMLogGenerator, line 90)\n"));
+}
+
+TEST_F(LiveTest, AReaderThatGoesAwayEndsWatchQuietly) {
+  startServer();
+  const auto watch = start({"kestro-cli", "watch", "--format=ndjson"});
+  ASSERT_TRUE(watch->waitForLines(1));
+  watch->closeOutput();
+  EXPECT_EQ(watch->wait(), 0);
+  EXPECT_THAT(watch->errors(), Not(HasSubstr("Broken pipe")));
+}
+
+TEST_F(LiveTest, EndingWhileConnectingIsClean) {
+  const auto watch = start({"kestro-cli", "watch"});
+  ASSERT_TRUE(watch->waitForOutput("Connecting...\n"));
+  watch->signal(SIGTERM);
+  EXPECT_EQ(watch->wait(), 0);
+}
+
+TEST_F(LiveTest, TheDemoNeedsNoServerAndLeavesNothing) {
+  const auto watch = start({"kestro-cli", "watch", "--demo", "--format=ndjson", "--count=1"});
+  EXPECT_EQ(watch->wait(), 0);
+  EXPECT_THAT(watch->outputLines(), SizeIs(1));
+  for (const auto& entry : std::filesystem::directory_iterator(source.directory())) {
+    EXPECT_EQ(entry.path(), source.path());
+  }
+}
+
+TEST_F(LiveTest, TheDemoIsConnectedToAtTheFirstAttempt) {
+  const auto record = start({"kestro-cli", "record", "--demo=capture:" + source.path(), "-o",
+                             source.directory() + "/demo.pcap", "--duration=0.3"});
+  EXPECT_EQ(record->wait(), 0);
+  EXPECT_THAT(record->errors(), Not(HasSubstr("connecting...")));
+}
+
+TEST_F(LiveTest, ADemoThatCannotStartSaysWhy) {
+  const auto watch = start({"kestro-cli", "watch", "--demo=capture:/nowhere.pcap"});
+  EXPECT_EQ(watch->wait(), 1);
+  EXPECT_THAT(watch->errors(), MatchesRegex("kestro-cli: the demo's telephony server: .*"
+                                            "/nowhere.pcap.*\n"));
+}
+
+TEST_F(LiveTest, TheDemosServerEndsWithAKilledWatch) {
+  const auto watch = start({"kestro-cli", "watch", "--demo", "--format=ndjson"});
+  ASSERT_TRUE(watch->waitForLines(1));
+  const auto children = childrenOf(watch->id());
+  ASSERT_THAT(children, SizeIs(1));
+  watch->signal(SIGKILL);
+  watch->wait();
+  EXPECT_TRUE(eventually([&] { return !isRunning(children[0]); }));
+}
+
+}  // namespace
+}  // namespace kestro::testing
