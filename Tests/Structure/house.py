@@ -1,0 +1,152 @@
+# SPDX-License-Identifier: MIT
+"""The house: which folder's sources may include what, and the check of a tree against it."""
+
+import dataclasses
+import pathlib
+import re
+
+# Headers from outside the project, by what they bring in. The first pattern that matches decides.
+KINDS = (
+    ("qt", r"Q[A-Z]\w*|Qt\w*/.*"),
+    ("property lists", r"plist/.*"),
+    ("system log", r"syslog\.h"),
+    ("sockets", r"sys/(socket|un)\.h|netinet/.*|arpa/.*|netdb\.h|linux/.*"),
+    ("captures", r"pcap(/.*)?(\.h)?"),
+    ("command lines", r"CLI/.*"),
+    ("json", r"nlohmann/.*"),
+    ("tests", r"(gtest|gmock)/.*"),
+    ("benchmarks", r"benchmark/.*"),
+    ("text", r"fmt/.*"),
+    ("results", r"tl/expected\.hpp"),
+    ("unicode", r"utf8proc\.h"),
+    ("files", r"fstream|filesystem|iostream|cstdio|stdio\.h"),
+    ("posix", r"(sys/)?[a-z]+\.h|csignal"),
+    ("standard", r"[a-z_]+"),
+)
+
+CORE = frozenset({"standard", "text", "results"})
+HOSTED = CORE | {"files", "posix"}
+LINUX_DOOR = "Platform/Linux/LinuxPlatform.h"
+
+
+@dataclasses.dataclass(frozen=True)
+class Room:
+    """What the sources of one folder may include: headers of its own and of `rooms`, the single
+    headers in `doors`, and headers from outside of these `kinds`."""
+
+    rooms: tuple
+    kinds: frozenset
+    doors: tuple = ()
+
+
+_SERVER = ("LogGenerator", "Captures", "Platform")
+_COMMAND_LINE = ("Model", "LogGenerator", "Captures", "Platform", "Platform/Virtual")
+_APP = ("Model", "LogGenerator", "Platform")
+
+# A source belongs to the room with the longest path that it lies under; a single file can be one.
+ROOMS = {
+    "Platform": Room((), CORE),
+    "Platform/Virtual": Room(("Platform",), CORE),
+    "Platform/Linux": Room(
+        ("Platform",), HOSTED | {"qt", "property lists", "system log", "sockets"}
+    ),
+    "LogGenerator": Room(("Platform",), CORE),
+    "Model": Room(("LogGenerator", "Platform"), CORE),
+    "Captures": Room(("Platform",), HOSTED | {"captures"}),
+    "TelephonyServer": Room(_SERVER, HOSTED | {"command lines"}),
+    "TelephonyServer/main.cpp": Room(
+        ("TelephonyServer", *_SERVER), HOSTED | {"command lines"}, (LINUX_DOOR,)
+    ),
+    "CommandLine": Room(
+        _COMMAND_LINE, HOSTED | {"command lines", "json", "unicode"}, (LINUX_DOOR,)
+    ),
+    "App": Room(_APP, CORE | {"qt"}),
+    "App/main.cpp": Room(("App", *_APP), HOSTED | {"qt", "command lines"}, (LINUX_DOOR,)),
+}
+
+
+def _with_tests(rooms):
+    """Tests of a room see the room and what it sees, the helpers of those rooms' tests, both
+    platforms and the operating system; only the Linux platform's own tests see its inside.
+    Benchmarks and fuzzers see every other room."""
+    public = tuple(
+        name for name in rooms if "." not in name and name not in ("App", "Platform/Linux")
+    )
+    kinds = HOSTED | {"tests", "json", "sockets"}
+    everything = Room(("Tests", *public), kinds, (LINUX_DOOR,))
+    all_rooms = dict(rooms)
+    all_rooms["Tests"] = everything
+    all_rooms["Fuzz"] = everything
+    all_rooms["Benchmarks"] = dataclasses.replace(everything, kinds=kinds | {"benchmarks"})
+    for name, room in rooms.items():
+        if "." in name:
+            continue
+        seen = {name, *room.rooms, "Platform", "Platform/Virtual", "Tests"}
+        seen |= {f"Tests/{lower}" for lower in room.rooms}
+        all_rooms[f"Tests/{name}"] = Room(tuple(seen), kinds | room.kinds, (LINUX_DOOR,))
+    return all_rooms
+
+
+ALL_ROOMS = _with_tests(ROOMS)
+SOURCE_SUFFIXES = (".cpp", ".h")
+INCLUDE = re.compile(r'^\s*#\s*include\s*[<"]([^>"]+)[>"]')
+
+
+def room_of(path):
+    """The name of the room that a path (text, relative to the root) lies in; None for no room."""
+    parts = path.split("/")
+    prefixes = ("/".join(parts[:count]) for count in range(len(parts), 0, -1))
+    return next((prefix for prefix in prefixes if prefix in ALL_ROOMS), None)
+
+
+def kind_of(header):
+    """What a header from outside brings in; None for one that the table does not know."""
+    return next((kind for kind, pattern in KINDS if re.fullmatch(pattern, header)), None)
+
+
+def includes(source):
+    """Yields the line number and the header of every include directive."""
+    for number, line in enumerate(source.read_text(encoding="utf-8").splitlines(), 1):
+        match = INCLUDE.match(line)
+        if match:
+            yield number, match.group(1)
+
+
+def fault_of_include(root, path, header):
+    """Why the source at `path` must not include `header`; None when it may."""
+    own = room_of(path)
+    room = ALL_ROOMS[own]
+    if (root / header).is_file():
+        target = room_of(header)
+        if target in (own, *room.rooms) or header in room.doors:
+            return None
+        return f"{own} must not know {target}"
+    kind = kind_of(header)
+    if kind is None:
+        return "neither a path from the root nor a library that the house knows"
+    return None if kind in room.kinds else f"{own} must not use {kind}"
+
+
+def sources(root):
+    """Yields every source, relative to the root. Hidden folders and build trees hold none."""
+    for folder in sorted(root.iterdir()):
+        if not folder.is_dir() or folder.name.startswith(".") or folder.name == "build":
+            continue
+        for path in sorted(folder.rglob("*")):
+            if path.suffix in SOURCE_SUFFIXES:
+                yield path.relative_to(root).as_posix()
+
+
+def wrong_arrows(root):
+    """Every include that the house forbids, each as "file:line: header: why"."""
+    root = pathlib.Path(root)
+    faults = []
+    for path in sources(root):
+        if room_of(path) is None:
+            faults.append(f"{path}: in no room of the house")
+            continue
+        for number, header in includes(root / path):
+            fault = fault_of_include(root, path, header)
+            if fault:
+                faults.append(f"{path}:{number}: {header}: {fault}")
+    return faults
