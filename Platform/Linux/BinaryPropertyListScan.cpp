@@ -11,7 +11,7 @@
 
 #include "Platform/Linux/PropertyListDates.h"
 #include "Platform/Linux/PropertyListScan.h"
-#include "Platform/Linux/Utf8.h"
+#include "Platform/Utf8.h"
 
 namespace kestro {
 namespace {

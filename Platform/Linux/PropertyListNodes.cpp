@@ -9,8 +9,8 @@
 #include <string_view>
 
 #include "Platform/Linux/PropertyListDates.h"
-#include "Platform/Linux/Utf8.h"
 #include "Platform/PropertyListCoding.h"
+#include "Platform/Utf8.h"
 
 namespace kestro {
 namespace {

@@ -7,8 +7,8 @@
 #include <vector>
 
 #include "Platform/Linux/PropertyListScan.h"
-#include "Platform/Linux/Utf8.h"
 #include "Platform/Linux/XmlPropertyListLeaves.h"
+#include "Platform/Utf8.h"
 
 namespace kestro {
 namespace {

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "Platform/Linux/Utf8.h"
+#include "Platform/Utf8.h"
 
 #include <algorithm>
 #include <cstdint>

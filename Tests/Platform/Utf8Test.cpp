@@ -4,7 +4,7 @@
 
 #include <string>
 
-#include "Platform/Linux/Utf8.h"
+#include "Platform/Utf8.h"
 
 namespace kestro {
 namespace {
