@@ -33,7 +33,7 @@ bool CellSelection::update(std::span<const CellLevel> levels, std::chrono::milli
   return true;
 }
 
-void ActiveSet::update(std::span<const CellLevel> levels) {
+void SoftHandoverSet::update(std::span<const CellLevel> levels) {
   const double strongest = levels.front().level;
   std::vector<std::size_t> cells;
   for (const auto& [cell, level, distance] : levels) {
@@ -43,7 +43,7 @@ void ActiveSet::update(std::span<const CellLevel> levels) {
   _cells = std::move(cells);
 }
 
-bool ActiveSet::contains(std::size_t cell) const {
+bool SoftHandoverSet::contains(std::size_t cell) const {
   return std::ranges::find(_cells, cell) != _cells.end();
 }
 

@@ -39,7 +39,7 @@ class CellSelection {
 
 /// The cells that a phone in soft handover is connected to: at most three, those that are not much
 /// weaker than the strongest. Cells join sooner than they leave.
-class ActiveSet {
+class SoftHandoverSet {
  public:
   static constexpr std::size_t kMaximumSize = 3;
   static constexpr double kJoinRange = 4;   ///< dB below the strongest

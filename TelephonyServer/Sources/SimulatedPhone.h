@@ -60,7 +60,7 @@ class SimulatedPhone {
   /// The serving cell's index in the layer of the present radio access.
   [[nodiscard]] std::size_t servingCell() const;
   [[nodiscard]] const RadioQuality& quality() const noexcept { return _quality; }
-  [[nodiscard]] const ActiveSet& activeSet() const noexcept { return _activeSet; }
+  [[nodiscard]] const SoftHandoverSet& activeSet() const noexcept { return _activeSet; }
   /// Ec/N0 of a UMTS level, in dB.
   [[nodiscard]] double energyOverNoise(double level) const { return level - _umtsTotal; }
 
@@ -89,7 +89,7 @@ class SimulatedPhone {
   DataSession _session;
   CellSelection _umtsSelection{3, std::chrono::milliseconds(1'280)};
   CellSelection _gsmSelection{4, std::chrono::milliseconds(2'000)};
-  ActiveSet _activeSet;
+  SoftHandoverSet _activeSet;
 
   std::vector<CellLevel> _umtsLevels;
   std::vector<CellLevel> _gsmLevels;

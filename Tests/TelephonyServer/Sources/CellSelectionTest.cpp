@@ -59,8 +59,8 @@ TEST_F(CellSelectionTest, anotherCandidateStartsTheTimeAnew) {
   EXPECT_EQ(_selection.serving(), 4U);
 }
 
-TEST(ActiveSetTest, cellsJoinNearTheStrongestAndLeaveFartherFromIt) {
-  ActiveSet set;
+TEST(SoftHandoverSetTest, cellsJoinNearTheStrongestAndLeaveFartherFromIt) {
+  SoftHandoverSet set;
   set.update(levels({{1, -70}, {2, -73}, {3, -75}}));
   EXPECT_TRUE(set.contains(1) && set.contains(2));
   EXPECT_FALSE(set.contains(3));
@@ -72,8 +72,8 @@ TEST(ActiveSetTest, cellsJoinNearTheStrongestAndLeaveFartherFromIt) {
   EXPECT_FALSE(set.contains(2));
 }
 
-TEST(ActiveSetTest, holdsThreeCellsAtMost) {
-  ActiveSet set;
+TEST(SoftHandoverSetTest, holdsThreeCellsAtMost) {
+  SoftHandoverSet set;
   set.update(levels({{1, -70}, {2, -70}, {3, -70}, {4, -70}}));
   EXPECT_EQ(set.size(), 3U);
   EXPECT_FALSE(set.contains(4));

@@ -106,7 +106,7 @@ TEST_F(IfxSimulationTest, theActiveSetHoldsOneToThreeWholeCells) {
     const auto set = section(display, "Active Set").array();
     if (set.isNull()) continue;
     ASSERT_GE(set.size(), 1U);
-    ASSERT_LE(set.size(), ActiveSet::kMaximumSize);
+    ASSERT_LE(set.size(), SoftHandoverSet::kMaximumSize);
     for (const Value& cell : set) {
       ASSERT_EQ(cell.dictionary().size(), 3U);
     }
