@@ -13,8 +13,7 @@ namespace {
 
 // How often what changes rarely is said again, in steps.
 constexpr unsigned kBroadcastSteps = 10;
-constexpr unsigned kRareSteps = 20;
-constexpr unsigned kSimSteps = 120;
+constexpr unsigned kContextSteps = 4;
 
 constexpr std::size_t kMostNeighbours = 6;
 constexpr unsigned kUarfcn = 10613;
@@ -147,7 +146,10 @@ std::vector<Bytes> GsmUmtsSimulation::step(std::chrono::milliseconds elapsed, Mo
   }
   packets.add(gsmRadioResource(radioResourceState(), _mobility.isInCall() ? 1 : 0, now));
   addMobility(packets, now);
-  if (_steps % kRareSteps == 0) addRare(packets, now);
+  if (_steps % kContextSteps == 0) {
+    packets.add(extraPacket(kPacketDataContextsCode, contexts(_phone), _coding, now));
+  }
+  if (repeatsRareLists(_steps)) addRare(packets, now);
   _lastAccess = _phone.access();
   ++_steps;
   return packets.take();
@@ -235,11 +237,8 @@ void GsmUmtsSimulation::addMobility(PacketList& packets, Moment now) {
 
 void GsmUmtsSimulation::addRare(PacketList& packets, Moment now) {
   packets.add(equivalentNetwork({.networkCode = 991}, now));
-  packets.add(extraPacket(kPacketDataContextsCode, contexts(_phone), _coding, now));
-  if (_steps % kSimSteps == 0) {
-    const unsigned area = areaOf(_phone).locationArea;
-    packets.add(extraPacket(kSimFilesCode, simulatedSimFiles(area), _coding, now));
-  }
+  const unsigned area = areaOf(_phone).locationArea;
+  packets.add(extraPacket(kSimFilesCode, simulatedSimFiles(area), _coding, now));
   for (const LogCode code : kUndescribedCodes) packets.add(undescribedPacket(code, now));
 }
 

@@ -14,7 +14,6 @@ namespace {
 // How often what changes rarely is said again, in steps.
 constexpr unsigned kBroadcastSteps = 10;
 constexpr unsigned kListSteps = 4;
-constexpr unsigned kSimSteps = 120;
 constexpr unsigned kTechnologySteps = 20;
 
 constexpr std::size_t kReportedNeighbours = 4;  // with their levels; the others are only detected
@@ -113,7 +112,7 @@ void LteSimulation::addReselection(PacketList& packets, Moment now) {
 }
 
 void LteSimulation::addLists(PacketList& packets, Moment now) {
-  if (_steps % kSimSteps == 0) {
+  if (repeatsRareLists(_steps)) {
     const unsigned area = _phone.serving().cell.trackingAreaCode;
     packets.add(extraPacket(kSimFilesCode, simulatedSimFiles(area), _coding, now));
   }

@@ -22,6 +22,14 @@ inline constexpr Moment kSimulationBegin{std::chrono::seconds(1'330'862'400)};
 /// The time from one step of a simulated drive to the next.
 inline constexpr std::chrono::milliseconds kSimulationStep{500};
 
+/// Whether what hardly ever changes is said again in a step, counted from 0: every two seconds in a
+/// drive's first twenty, for those who have only just connected, and every twenty seconds then.
+[[nodiscard]] constexpr bool repeatsRareLists(unsigned step) noexcept {
+  constexpr unsigned kEarlySteps = 4;
+  constexpr unsigned kSteps = 40;
+  return step % (step < kSteps ? kEarlySteps : kSteps) == 0;
+}
+
 /// The packets of one step, in order. A packet that could not carry its values is left out.
 class PacketList {
  public:

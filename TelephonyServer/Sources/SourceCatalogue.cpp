@@ -35,7 +35,7 @@ constexpr std::array kTechnologyChoices = {kTechnologies[0], kTechnologies[1],
                                            kTechnologies[2], kTechnologies[3],
                                            kTechnologies[4], kAutomaticTechnology};
 
-// What a source speaks that does not know better.
+// What is made of logs and streams that do not know better.
 std::string_view orDefault(std::string_view technology) {
   return technology.empty() ? kTqLogChannelTechnology_IFX : technology;
 }
@@ -98,8 +98,9 @@ tl::unexpected<Error> notMade(const SourceRequest& request, std::string_view tec
 
 OpenedSource openSimulation(const SourceRequest& request, Platform& platform,
                             const SourceReporter& /*report*/) {
-  const auto technology = orDefault(request.technology.empty() ? technologyNamed(request.argument)
-                                                               : request.technology);
+  std::string_view technology = request.technology;
+  if (technology.empty()) technology = technologyNamed(request.argument);
+  if (technology.empty()) technology = kTqLogChannelTechnology_Ondrel_LTE;
   const auto* row = std::ranges::find(kSimulations, technology, &Simulation::technology);
   if (row == kSimulations.end()) return notMade(request, technology, kSimulations);
   return row->make(platform.propertyListCoding());
@@ -150,8 +151,8 @@ bool isGiven(std::string_view argument) { return !argument.empty(); }
 constexpr std::array kKinds = {
     SourceKind{"simulation", isTechnologyOrEmpty, "simulation[:TECHNOLOGY]",
                "A made-up drive, the same in every run: cells, path loss, fading,\n"
-               "handovers, data transfers. Technology: IFX (unless given),\n"
-               "Ondrel_GSM or LTE.",
+               "handovers, data transfers. Technology: LTE (unless given), IFX or\n"
+               "Ondrel_GSM.",
                openSimulation},
     SourceKind{"capture", isGiven, "capture:FILE",
                "A recorded capture, with the pauses that it was recorded with. The\n"

@@ -141,7 +141,8 @@ TEST_F(LiveTest, EndingWhileConnectingIsClean) {
 TEST_F(LiveTest, TheDemoNeedsNoServerAndLeavesNothing) {
   const auto watch = start({"kestro-cli", "watch", "--demo", "--format=ndjson", "--count=1"});
   EXPECT_EQ(watch->wait(), 0);
-  EXPECT_THAT(watch->outputLines(), SizeIs(1));
+  ASSERT_THAT(watch->outputLines(), SizeIs(1));
+  EXPECT_THAT(watch->outputLines()[0], HasSubstr("\"Serving Cell Measurements\""));
   for (const auto& entry : std::filesystem::directory_iterator(source.directory())) {
     EXPECT_EQ(entry.path(), source.path());
   }

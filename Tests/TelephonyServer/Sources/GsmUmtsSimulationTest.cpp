@@ -30,6 +30,14 @@ class GsmUmtsSimulationTest : public ::testing::Test {
     return packets;
   }
 
+  std::set<LogCode> codesOfSteps(int steps) {
+    std::set<LogCode> codes;
+    for (int i = 0; i < steps; ++i) {
+      for (const Bytes& packet : step()) codes.insert(logCodeOf(PacketView(packet)));
+    }
+    return codes;
+  }
+
   /// What a key showed in the course of a drive.
   std::set<std::string> shown(std::string_view section, std::string_view key) {
     std::set<std::string> texts;
@@ -47,14 +55,22 @@ class GsmUmtsSimulationTest : public ::testing::Test {
 };
 
 TEST_F(GsmUmtsSimulationTest, SendsEveryCodeThatTheGeneratorAsksFor) {
-  std::set<LogCode> sent;
-  for (int i = 0; i < kStepsOfTwentyMinutes; ++i) {
-    for (const Bytes& packet : step()) sent.insert(logCodeOf(PacketView(packet)));
-  }
+  const std::set<LogCode> sent = codesOfSteps(kStepsOfTwentyMinutes);
   EXPECT_THAT(sent, ElementsAre(0x4005, 0x4031, 0x4116, 0x4125, 0x4127, 0x4157, 0x417A, 0x4221,
                                 0x5072, 0x5076, 0x512C, 0x5134, 0x5137, 0x51F4, 0x51F5, 0x51F6,
                                 0x51F8, 0x51FB, 0x51FD, 0x51FF, 0x7130, 0x7131, 0x7132, 0x7135,
                                 0x7150, 0xFF0000, 0xFF0001, 0xFF0002));
+}
+
+TEST_F(GsmUmtsSimulationTest, SaysTheListsSoonAfterTheBeginningAndAgainLater) {
+  constexpr int kStepsOfTwoSeconds = 4;
+  constexpr int kStepsOfTwentySeconds = 40;
+  step();  // nobody is connected yet
+  const auto first = codesOfSteps(kStepsOfTwoSeconds);
+  EXPECT_THAT(first, IsSupersetOf({kSimFilesCode, kPacketDataContextsCode}));
+  codesOfSteps(200);
+  const auto later = codesOfSteps(kStepsOfTwentySeconds);
+  EXPECT_THAT(later, IsSupersetOf({kSimFilesCode, kPacketDataContextsCode}));
 }
 
 TEST_F(GsmUmtsSimulationTest, MovesThroughMobilityManagement) {

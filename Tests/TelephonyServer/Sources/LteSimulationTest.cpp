@@ -18,6 +18,7 @@ namespace {
 using ::testing::Contains;
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
+using ::testing::IsSupersetOf;
 using ::testing::Not;
 
 constexpr int kStepsOfTenMinutes = 1'200;
@@ -31,6 +32,14 @@ class LteSimulationTest : public ::testing::Test {
     _now += kSimulationStep;
     for (const Bytes& packet : packets) display.receive(packet);
     return packets;
+  }
+
+  std::set<LogCode> codesOfSteps(int steps) {
+    std::set<LogCode> codes;
+    for (int i = 0; i < steps; ++i) {
+      for (const Bytes& packet : step()) codes.insert(logCodeOf(PacketView(packet)));
+    }
+    return codes;
   }
 
   std::string serving(std::string_view key) { return display.text("Serving Cell Info", key); }
@@ -55,10 +64,7 @@ TEST_F(LteSimulationTest, SaysTheSameInEveryRun) {
 }
 
 TEST_F(LteSimulationTest, SendsEveryCodeThatTheGeneratorAsksFor) {
-  std::set<LogCode> sent;
-  for (int i = 0; i < kStepsOfTenMinutes; ++i) {
-    for (const Bytes& packet : step()) sent.insert(logCodeOf(PacketView(packet)));
-  }
+  const std::set<LogCode> sent = codesOfSteps(kStepsOfTenMinutes);
   EXPECT_THAT(sent, ElementsAre(0xB0C1, 0xB0C2, 0xB179, 0xB17F, 0xB180, 0xB186, 0xFF0000, 0xFF0001,
                                 0xFF0002));
 }
@@ -131,6 +137,17 @@ TEST_F(LteSimulationTest, ShowsSimFilesAndContexts) {
   EXPECT_EQ(display.section("SIM Info").dictionary().size(), 14U);
   EXPECT_EQ(display.row("PDP Context Info", 0)["APN"], Value("internet"));
   EXPECT_EQ(display.row("PDP Context Info", 1)["APN"], Value("ims"));
+}
+
+TEST_F(LteSimulationTest, SaysTheListsSoonAfterTheBeginningAndAgainLater) {
+  constexpr int kStepsOfTwoSeconds = 4;
+  constexpr int kStepsOfTwentySeconds = 40;
+  step();  // nobody is connected yet
+  const auto first = codesOfSteps(kStepsOfTwoSeconds);
+  EXPECT_THAT(first, IsSupersetOf({kSimFilesCode, kPacketDataContextsCode}));
+  codesOfSteps(200);
+  const auto later = codesOfSteps(kStepsOfTwentySeconds);
+  EXPECT_THAT(later, IsSupersetOf({kSimFilesCode, kPacketDataContextsCode}));
 }
 
 TEST_F(LteSimulationTest, NeverMakesTheDecodersComplain) {

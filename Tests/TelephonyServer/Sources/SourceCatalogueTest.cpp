@@ -54,7 +54,7 @@ TEST_F(SourceCatalogueTest, opensEveryKind) {
   const auto capture = _directory.write("a.pcap", captureHeader(151));
   const auto log = _directory.write("a.csv", std::string_view("Timestamp,NetworkMode,RSRP\n"));
   _platform.inputStreams().allow("pipe");
-  EXPECT_EQ((*open("simulation"))->technology(), "IFX");
+  EXPECT_EQ((*open("simulation"))->technology(), "LTE");
   EXPECT_EQ((*open("simulation:IFX"))->technology(), "IFX");
   EXPECT_EQ((*open("capture:" + capture))->technology(), "UTRAN2");
   EXPECT_EQ((*open("drive-test:" + log))->technology(), "IFX");
