@@ -10,17 +10,16 @@
 #include <string_view>
 #include <utility>
 
-#include "CommandLine/DemoServer.h"
 #include "CommandLine/ExitStatus.h"
-#include "CommandLine/LastWords.h"
+#include "CommandLine/FullScreen.h"
 #include "CommandLine/Output.h"
+#include "Model/LastWords.h"
 #include "Platform/MainQueue.h"
 #include "Platform/PortName.h"
 
 namespace kestro {
 namespace {
 
-constexpr const char* kDefaultDemoSource = "simulation";
 constexpr int kDebugPriority = static_cast<int>(LogPriority::Debug);
 
 std::string checkPortName(const std::string& name) {
@@ -45,6 +44,8 @@ struct Ending {
 int run(const LiveOptions& options, const LiveTaskMaker& makeTask, DemoServer* demo) {
   const auto platform = createLinuxPlatform(platformOptions(options, demo));
   const LastWords lastWords([&](std::string_view line) {
+    FullScreen::restore();
+    complain(line);
     platform->systemLog().write(LogPriority::Error, line);
     platform->flushSystemLog();
     if (demo != nullptr) demo->removeDirectory();
@@ -103,7 +104,7 @@ int runLive(const LiveOptions& options, const LiveTaskMaker& makeTask) {
   // behind.
   std::signal(SIGPIPE, SIG_IGN);
   if (options.demoSource.empty()) return run(options, makeTask, nullptr);
-  const auto demo = DemoServer::start(options.demoSource);
+  const auto demo = startDemoServer(options.demoSource);
   if (!demo) {
     complain(demo.error().message);
     return kExitNothingDone;

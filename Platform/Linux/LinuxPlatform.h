@@ -7,6 +7,7 @@
 #include <optional>
 #include <string>
 
+#include "Platform/DemoServer.h"
 #include "Platform/Platform.h"
 #include "Platform/Result.h"
 #include "Platform/SystemLog.h"
@@ -52,6 +53,11 @@ class LinuxPlatform : public Platform {
 
 [[nodiscard]] std::unique_ptr<LinuxPlatform> createLinuxPlatform(
     const LinuxPlatformOptions& options = {});
+
+/// Starts a kestro-telephonyd process, which is looked for beside this program and then in PATH, on
+/// a fresh port directory (0700). Call it on the main thread. The error says why it could not be
+/// started.
+[[nodiscard]] Result<std::unique_ptr<DemoServer>> startDemoServer(const std::string& source);
 
 class PropertyListCoding;
 class Clock;

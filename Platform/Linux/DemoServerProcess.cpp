@@ -1,6 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "CommandLine/DemoServer.h"
-
+// A kestro-telephonyd process as a demo's telephony server.
 #include <fcntl.h>
 #include <fmt/format.h>
 #include <spawn.h>
@@ -19,6 +18,8 @@
 #include <utility>
 #include <vector>
 
+#include "Platform/DemoServer.h"
+#include "Platform/Linux/LinuxPlatform.h"
 #include "Platform/MessagePort.h"
 
 namespace kestro {
@@ -105,36 +106,54 @@ class SpawnSettings {
   posix_spawnattr_t attributes{};
 };
 
-}  // namespace
+class DemoServerProcess final : public DemoServer {
+ public:
+  /// Takes over the directory; the server is not started yet.
+  explicit DemoServerProcess(std::string directory) : _directory(std::move(directory)) {}
+  ~DemoServerProcess() override {
+    end();
+    removeDirectory();
+  }
+  DemoServerProcess(const DemoServerProcess&) = delete;
+  DemoServerProcess& operator=(const DemoServerProcess&) = delete;
 
-Result<std::unique_ptr<DemoServer>> DemoServer::start(const std::string& source) {
-  auto directory = makeDirectory();
-  if (!directory) return tl::unexpected(directory.error());
-  std::unique_ptr<DemoServer> server(new DemoServer(*std::move(directory)));
+  [[nodiscard]] Result<void> start(const std::string& source);
 
+  [[nodiscard]] const std::string& portDirectory() const noexcept override { return _directory; }
+  [[nodiscard]] std::unique_ptr<Timer> watch(
+      Platform& platform, const std::string& serverName, std::function<void()> ready,
+      std::function<void(const std::string& reason)> ended) override;
+  void removeDirectory() noexcept override;
+
+ private:
+  [[nodiscard]] std::string logPath() const { return _directory + "/telephonyd.log"; }
+  [[nodiscard]] std::string lastLogLine() const;
+  [[nodiscard]] bool hasEnded() noexcept;
+  void end() noexcept;
+
+  std::string _directory;
+  pid_t _process = -1;  ///< -1 before it runs and after it has ended
+};
+
+Result<void> DemoServerProcess::start(const std::string& source) {
   const std::string program = serverProgram();
   std::vector<std::string> arguments{program, "--source=" + source,
                                      fmt::format("--exit-with-parent={}", ::getpid())};
-  std::vector<std::string> environment = environmentWithPortDirectory(server->_directory);
-  const SpawnSettings settings(server->logPath());
+  std::vector<std::string> environment = environmentWithPortDirectory(_directory);
+  const SpawnSettings settings(logPath());
   const int error =
-      ::posix_spawnp(&server->_process, program.c_str(), &settings.actions, &settings.attributes,
+      ::posix_spawnp(&_process, program.c_str(), &settings.actions, &settings.attributes,
                      nullTerminated(arguments).data(), nullTerminated(environment).data());
   if (error != 0) {
-    server->_process = -1;
+    _process = -1;
     return failure(fmt::format("{}: {}", program, std::strerror(error)));
   }
-  return server;
+  return {};
 }
 
-DemoServer::~DemoServer() {
-  end();
-  removeDirectory();
-}
-
-std::unique_ptr<Timer> DemoServer::watch(Platform& platform, const std::string& serverName,
-                                         std::function<void()> ready,
-                                         std::function<void(const std::string& reason)> ended) {
+std::unique_ptr<Timer> DemoServerProcess::watch(
+    Platform& platform, const std::string& serverName, std::function<void()> ready,
+    std::function<void(const std::string& reason)> ended) {
   enum class Stage { Starting, Ready, Over };
   const auto poll = [this, &platform, serverName, ready = std::move(ready),
                      ended = std::move(ended), stage = Stage::Starting, polls = 0]() mutable {
@@ -153,7 +172,7 @@ std::unique_ptr<Timer> DemoServer::watch(Platform& platform, const std::string& 
   return platform.mainQueue().scheduleRepeating(kPollInterval, poll);
 }
 
-std::string DemoServer::lastLogLine() const {
+std::string DemoServerProcess::lastLogLine() const {
   std::ifstream log(logPath());
   std::string last = "it ended without a word";
   for (std::string line; std::getline(log, line);) {
@@ -162,12 +181,12 @@ std::string DemoServer::lastLogLine() const {
   return last;
 }
 
-bool DemoServer::hasEnded() noexcept {
+bool DemoServerProcess::hasEnded() noexcept {
   if (_process > 0 && ::waitpid(_process, nullptr, WNOHANG) != 0) _process = -1;
   return _process < 0;
 }
 
-void DemoServer::end() noexcept {
+void DemoServerProcess::end() noexcept {
   if (hasEnded()) return;
   ::kill(_process, SIGTERM);
   for (int i = 0; i < kEndPollsUntilKilled; ++i) {
@@ -179,9 +198,19 @@ void DemoServer::end() noexcept {
   _process = -1;
 }
 
-void DemoServer::removeDirectory() noexcept {
+void DemoServerProcess::removeDirectory() noexcept {
   std::error_code error;
   std::filesystem::remove_all(_directory, error);
+}
+
+}  // namespace
+
+Result<std::unique_ptr<DemoServer>> startDemoServer(const std::string& source) {
+  auto directory = makeDirectory();
+  if (!directory) return tl::unexpected(directory.error());
+  auto server = std::make_unique<DemoServerProcess>(*std::move(directory));
+  if (auto started = server->start(source); !started) return tl::unexpected(started.error());
+  return server;
 }
 
 }  // namespace kestro

@@ -1,13 +1,11 @@
 // SPDX-License-Identifier: MIT
-#include "CommandLine/LastWords.h"
+#include "Model/LastWords.h"
 
 #include <cstdlib>
 #include <exception>
 #include <string>
 #include <utility>
 
-#include "CommandLine/FullScreen.h"
-#include "CommandLine/Output.h"
 #include "Model/FailureText.h"
 
 namespace kestro {
@@ -17,10 +15,10 @@ std::function<void(std::string_view)> lastHandler;
 std::terminate_handler handlerBefore = nullptr;
 
 [[noreturn]] void sayLastWords() {
-  FullScreen::restore();
-  const std::string line = "ended by a failure: " + failureText(std::current_exception());
-  complain(line);
-  if (const auto handler = std::exchange(lastHandler, nullptr)) handler(line);
+  // Taken out first: a failure of the handler itself comes here again, and finds none.
+  if (const auto handler = std::exchange(lastHandler, nullptr)) {
+    handler("ended by a failure: " + failureText(std::current_exception()));
+  }
   std::abort();
 }
 

@@ -7,12 +7,12 @@
 
 namespace kestro {
 
-/// While it exists, std::terminate gives the terminal back, writes one line that names the failure
-/// to standard error, calls the handler with that line, and aborts. At most one exists at a time.
+/// While it exists, std::terminate calls the handler with one line that names the failure, and
+/// aborts. At most one exists at a time.
 class LastWords {
  public:
-  /// `handler` runs once, in whatever state the process is: it should do no more than log the line
-  /// and remove what would be left behind.
+  /// `handler` runs once, in whatever state the process is: it should say the line first, and do no
+  /// more after it than save and remove what would be lost or left behind. A failure in it aborts.
   explicit LastWords(std::function<void(std::string_view line)> handler);
   ~LastWords();
   LastWords(const LastWords&) = delete;

@@ -5,8 +5,8 @@
 #include <csignal>
 #include <cstdio>
 
-#include "CommandLine/LastWords.h"
 #include "LogGenerator/InternalConsistencyFailure.h"
+#include "Model/LastWords.h"
 
 namespace kestro {
 namespace {
@@ -23,8 +23,19 @@ void failWithLastWords() {
 
 TEST(LastWordsDeathTest, TheFailureIsNamedThenHandledThenTheProcessAborts) {
   EXPECT_EXIT(failWithLastWords(), ::testing::KilledBySignal(SIGABRT),
-              "^kestro-cli: ended by a failure: No good \\(Source, line 90\\)\n"
-              "log: ended by a failure: No good \\(Source, line 90\\)\n");
+              "^log: ended by a failure: No good \\(Source, line 90\\)\n");
+}
+
+void failTwice() {
+  const LastWords lastWords([](std::string_view) {
+    fmt::print(stderr, "once\n");
+    fail();
+  });
+  failUncaught();
+}
+
+TEST(LastWordsDeathTest, AFailureOfTheHandlerEndsTheProcessToo) {
+  EXPECT_EXIT(failTwice(), ::testing::KilledBySignal(SIGABRT), "^once\n$");
 }
 
 void failAfterwards() {
