@@ -37,6 +37,12 @@ constexpr std::array kTechnologies = {
     TechnologyRow{kTqLogChannelTechnology_Ondrel_UTRAN2, makeGenerator<UTRANLogGenerator>},
 };
 
+constexpr auto kTechnologyNames = [] {
+  std::array<std::string_view, kTechnologies.size()> names;
+  for (std::size_t i = 0; i < names.size(); ++i) names[i] = kTechnologies[i].technology;
+  return names;
+}();
+
 /// The entry for the state as it is now, up to the first value that the state lacks.
 Dictionary makeHistoryEntry(const Dictionary& state, const Clock& clock) {
   Dictionary entry;
@@ -65,6 +71,8 @@ std::span<const std::string_view> LogGenerator::stateKeys() const {
 void LogGenerator::explainMessage(ByteView /*message*/, const ExplainVisitor& /*visit*/) const {}
 
 void LogGenerator::catalogue(const CatalogueVisitor& /*visit*/) const {}
+
+std::span<const std::string_view> LogGenerator::technologies() { return kTechnologyNames; }
 
 std::unique_ptr<LogGenerator> LogGenerator::generatorFromTechnology(Platform& platform,
                                                                     std::string_view technology) {

@@ -66,6 +66,9 @@ class LogGenerator {
   /// What a snapshot stores: an array that the caller owns, beginning with the history's entries.
   [[nodiscard]] virtual Array getSaveContentsFromState(const Dictionary& state) = 0;
 
+  /// The technologies that a generator speaks, in the order in which they are looked up.
+  [[nodiscard]] static std::span<const std::string_view> technologies();
+
   /// A new generator for the technology that the telephony server reports; null when none speaks
   /// it.
   [[nodiscard]] static std::unique_ptr<LogGenerator> generatorFromTechnology(

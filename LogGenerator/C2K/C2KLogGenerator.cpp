@@ -3,6 +3,7 @@
 
 #include <algorithm>
 #include <array>
+#include <iterator>
 
 #include "LogGenerator/C2K/C2KState.h"
 #include "LogGenerator/C2K/EVDOPilots.h"
@@ -49,27 +50,50 @@ void visitAtPlaces(const TemplatePlaces& places, ExplainedValue value,
   if (shownAt.empty()) visit(value);
 }
 
-/// What the display takes from one code, section by section in the order of the names.
-std::vector<CatalogueEntry> entriesOf(const C2KParser& parser, const TemplatePlaces& places) {
-  std::vector<CatalogueEntry> entries;
-  const PacketReading& reading = parser.reading();
-  const auto add = [&](std::string_view section, std::string_view key) {
-    auto entry = std::ranges::find(entries, section, &CatalogueEntry::section);
-    if (entry == entries.end()) {
-      entry = entries.insert(entry, {.code = reading.code,
-                                     .packetName = reading.packetName,
-                                     .minimumLength = reading.minimumLength,
-                                     .section = section});
-    }
-    entry->keys.push_back({.key = key});
-  };
-  for (const std::string_view name : parser.lookupNames()) {
-    const std::span<const DisplayPlace> shownAt = places.of(name);
-    for (const DisplayPlace& place : shownAt) add(place.section, place.key);
-    if (shownAt.empty()) add(reading.packetName, name);
-  }
-  return entries;
+/// What the catalogue knows of a lookup name that the display shows as `key`: the rows of the list
+/// that it names, or the fields that write it.
+std::vector<CatalogueKey> keysOf(const PacketReading& reading, std::string_view lookupName,
+                                 std::string_view key) {
+  const auto list = std::ranges::find(reading.lists, lookupName, &ListReading::key);
+  if (list != reading.lists.end()) return catalogueFields(list->table.fields, key, &list->table);
+  CatalogueKey found = catalogueKey(lookupName, reading.fields);
+  found.key = key;
+  return {found};
 }
+
+/// What the display takes from one code, section by section in the order of the names.
+class CodeEntries {
+ public:
+  explicit CodeEntries(const C2KParser& parser, const TemplatePlaces& places)
+      : _reading(parser.reading()) {
+    for (const std::string_view name : parser.lookupNames()) {
+      const std::span<const DisplayPlace> shownAt = places.of(name);
+      for (const DisplayPlace& place : shownAt) {
+        const std::string_view section = place.section;
+        add(name, place.key, section).group = section.substr(0, section.find('/'));
+      }
+      if (shownAt.empty()) add(name, name, _reading.packetName);
+    }
+  }
+
+  [[nodiscard]] const std::vector<CatalogueEntry>& entries() const noexcept { return _entries; }
+
+ private:
+  CatalogueEntry& add(std::string_view lookupName, std::string_view key, std::string_view section) {
+    auto entry = std::ranges::find(_entries, section, &CatalogueEntry::section);
+    if (entry == _entries.end()) {
+      entry = _entries.insert(entry, {.code = _reading.code,
+                                      .packetName = _reading.packetName,
+                                      .minimumLength = _reading.minimumLength,
+                                      .section = section});
+    }
+    std::ranges::copy(keysOf(_reading, lookupName, key), std::back_inserter(entry->keys));
+    return *entry;
+  }
+
+  const PacketReading& _reading;
+  std::vector<CatalogueEntry> _entries;
+};
 
 }  // namespace
 
@@ -136,7 +160,8 @@ void C2KLogGenerator::explainMessage(ByteView message, const ExplainVisitor& vis
 
 void C2KLogGenerator::catalogue(const CatalogueVisitor& visit) const {
   for (const auto& parser : _parsers) {
-    for (const CatalogueEntry& entry : entriesOf(*parser, places())) visit(entry);
+    const CodeEntries found(*parser, places());
+    for (const CatalogueEntry& entry : found.entries()) visit(entry);
   }
 }
 

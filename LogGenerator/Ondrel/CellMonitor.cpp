@@ -22,9 +22,10 @@ bool isText(const Value& value, std::string_view text) {
 ExplainedValue explainValue(const Section& section, const ListedValue& value,
                             const Dictionary& cell) {
   ExplainedValue explained{.section = section.name, .key = value.key};
-  ExplainedSource source{.listKey = std::string(value.listKey)};
+  ExplainedSource source{.listKey = std::string(value.listKey), .isNumber = false};
   if (const auto number = cellNumber(cell, value.listKey)) {
     source.raw = *number;
+    source.isNumber = true;
     explained.text = cellText(value, *number);
   }
   explained.sources.push_back(std::move(source));

@@ -55,7 +55,7 @@ void OndrelLogGenerator2::updateWithData(ByteView message) {
   if (message.size() < kPacketHeaderSize) return;
   const PacketView packet(packetOfMessage(message));
   const std::uint8_t type = logTypeOf(packet);
-  if (type != kBasebandLogType && type != kExtraLogType) {
+  if (!isKnownLogType(type)) {
     platform().systemLog().log(LogPriority::Error, "Invalid log type: {:x}. Dropping.", type);
     return;
   }
@@ -73,6 +73,7 @@ std::span<Base* const> OndrelLogGenerator2::subscribersOf(LogCode code) const {
 void OndrelLogGenerator2::explainMessage(ByteView message, const ExplainVisitor& visit) const {
   if (message.size() < kPacketHeaderSize) return;
   const PacketView packet(packetOfMessage(message));
+  if (!isKnownLogType(logTypeOf(packet))) return;
   const LogCode code = logCodeOf(packet);
   for (const Base* subscriber : subscribersOf(code)) {
     subscriber->explainPacket(packet.bytes(), code, visit);
@@ -83,7 +84,12 @@ void OndrelLogGenerator2::catalogue(const CatalogueVisitor& visit) const {
   if (!_cIndex) return;
   for (const std::string& key : _cIndex->getAllLogCodes()) {
     const LogCode code = codeOfKey(key);
-    for (const Base* subscriber : subscribersOf(code)) visit(subscriber->catalogueCode(code));
+    for (const Base* subscriber : subscribersOf(code)) {
+      CatalogueEntry entry = subscriber->catalogueCode(code);
+      const auto group = sectionGroups().find(entry.section);
+      if (group != sectionGroups().end()) entry.group = group->second;
+      visit(entry);
+    }
   }
 }
 
@@ -145,12 +151,29 @@ void OndrelLogGenerator2::buildDisplay(Dictionary& state) {
 Value OndrelLogGenerator2::templateOfState(Dictionary& state) {
   Value known = state[kStateTemplate];
   if (!known.isNull()) return known;
+  Value loaded = loadTemplate();
+  if (!loaded.isNull()) state.set(kStateTemplate, loaded);
+  return loaded;
+}
+
+Value OndrelLogGenerator2::loadTemplate() const {
   const auto contents = platform().bundle().resource(_pListName, kTemplateExtension);
   if (!contents) return {};
   Result<Value> parsed = platform().propertyListCoding().parse(*contents);
-  if (!parsed || !parsed->isDictionary()) return {};
-  state.set(kStateTemplate, *parsed);
-  return *parsed;
+  return parsed && parsed->isDictionary() ? *parsed : Value();
+}
+
+const OndrelLogGenerator2::SectionGroups& OndrelLogGenerator2::sectionGroups() const {
+  if (_sectionGroups) return *_sectionGroups;
+  _sectionGroups.emplace();
+  for (const auto& [group, sections] : loadTemplate().dictionary()) {
+    if (!group.isText()) continue;
+    for (const auto& [section, value] : sections.dictionary()) {
+      if (decoderOf(section) == nullptr) continue;
+      (*_sectionGroups)[std::string(section.text())] = group.text();
+    }
+  }
+  return *_sectionGroups;
 }
 
 Value OndrelLogGenerator2::processTemplate(const Value& templateObject) {

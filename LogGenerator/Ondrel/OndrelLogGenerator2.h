@@ -3,7 +3,9 @@
 // index which decoders fill it.
 #pragma once
 
+#include <map>
 #include <memory>
+#include <optional>
 #include <string>
 #include <string_view>
 
@@ -49,9 +51,15 @@ class OndrelLogGenerator2 : public OndrelLogGenerator {
   void initWithPListNameCIndexObj(std::string pListName, std::unique_ptr<ClassIndex> index);
 
  private:
+  using SectionGroups = std::map<std::string, std::string, std::less<>>;
+
   [[nodiscard]] Value processDictionary(const Dictionary& dictionary);
   /// The state's template, loaded from the resource on first use; null when that fails.
   [[nodiscard]] Value templateOfState(Dictionary& state);
+  [[nodiscard]] Value loadTemplate() const;
+  /// The outermost groups of the resource's template by the sections in them, whatever template
+  /// the state holds.
+  [[nodiscard]] const SectionGroups& sectionGroups() const;
   [[nodiscard]] std::span<Base* const> subscribersOf(LogCode code) const;
   [[nodiscard]] Base* decoderOf(const Value& key) const;
   void buildDisplay(Dictionary& state);
@@ -61,6 +69,7 @@ class OndrelLogGenerator2 : public OndrelLogGenerator {
   std::string _pListName;
   std::unique_ptr<ClassIndex> _cIndex;
   WeakValue _boundDisplay;  ///< the display whose sections the decoders write into
+  mutable std::optional<SectionGroups> _sectionGroups;  ///< read when first needed
 };
 
 }  // namespace kestro

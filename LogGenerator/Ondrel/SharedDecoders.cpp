@@ -91,7 +91,7 @@ void SimInfo::explainOtherPacket(PacketView packet, LogCode code,
     if (value == nullptr) continue;
     visit({.section = section().name,
            .key = file.key,
-           .sources = {{.listKey = std::string(file.listKey)}},
+           .sources = {{.listKey = std::string(file.listKey), .isNumber = false}},
            .text = *value});
   }
 }
@@ -115,7 +115,7 @@ void PDPContextList::explainOtherPacket(PacketView packet, LogCode /*code*/,
       visit({.section = section().name,
              .row = row,
              .key = key.text(),
-             .sources = {{.listKey = std::string(key.text())}},
+             .sources = {{.listKey = std::string(key.text()), .isNumber = false}},
              .text = value});
     }
     ++row;

@@ -2,39 +2,50 @@
 #include "LogGenerator/Packets/Catalogue.h"
 
 #include <algorithm>
+#include <iterator>
 
 namespace kestro {
 namespace {
 
-void addKey(std::string_view list, std::string_view key, std::vector<CatalogueKey>& keys) {
-  const auto isSame = [&](const CatalogueKey& known) {
-    return known.list == list && known.key == key;
-  };
-  if (std::ranges::none_of(keys, isSame)) keys.push_back({list, key});
-}
-
-void addShownKeys(std::span<const Field> fields, std::string_view list,
-                  std::vector<CatalogueKey>& keys) {
-  for (const Field& field : fields) {
-    const bool isShown =
-        field.text.kind != TextRule::Kind::Hidden && field.text.kind != TextRule::Kind::Removed;
-    if (isShown) addKey(list, field.key, keys);
-  }
+bool isShown(const Field& field) {
+  return field.text.kind != TextRule::Kind::Hidden && field.text.kind != TextRule::Kind::Removed;
 }
 
 }  // namespace
+
+CatalogueKey catalogueKey(std::string_view name, std::span<const Field> fields) {
+  CatalogueKey key{.key = name};
+  for (const Field& field : fields) {
+    if (field.key == name && isShown(field)) key.fields.push_back(&field);
+  }
+  return key;
+}
+
+std::vector<CatalogueKey> catalogueFields(std::span<const Field> fields, std::string_view list,
+                                          const RecordTable* table) {
+  std::vector<CatalogueKey> keys;
+  for (const Field& field : fields) {
+    const bool isKnown = std::ranges::find(keys, field.key, &CatalogueKey::key) != keys.end();
+    if (isKnown || !isShown(field)) continue;
+    CatalogueKey& key = keys.emplace_back(catalogueKey(field.key, fields));
+    key.list = list;
+    key.table = table;
+  }
+  return keys;
+}
 
 CatalogueEntry catalogueReading(const Section& section, const PacketReading& reading) {
   CatalogueEntry entry{.code = reading.code,
                        .packetName = reading.packetName,
                        .minimumLength = reading.minimumLength,
                        .section = section.name,
-                       .kind = section.kind};
-  addShownKeys(reading.fields, {}, entry.keys);
+                       .kind = section.kind,
+                       .keys = catalogueFields(reading.fields)};
   for (const ListReading& list : reading.lists) {
-    if (!list.table.keepsNone && list.use == RowsUse::Shown) {
-      addShownKeys(list.table.fields, list.key, entry.keys);
-    }
+    if (list.use == RowsUse::Noted) entry.isNoted = true;
+    if (list.table.keepsNone || list.use != RowsUse::Shown) continue;
+    std::ranges::copy(catalogueFields(list.table.fields, list.key, &list.table),
+                      std::back_inserter(entry.keys));
   }
   return entry;
 }
@@ -45,8 +56,11 @@ CatalogueEntry cataloguePropertyList(const Section& section) {
                        .packetName = reading.packetName,
                        .minimumLength = kPacketHeaderSize,
                        .section = section.name,
-                       .kind = section.kind};
-  for (const ListedValue& value : reading.values) addKey({}, value.key, entry.keys);
+                       .kind = section.kind,
+                       .propertyList = &reading};
+  for (const ListedValue& value : reading.values) {
+    entry.keys.push_back({.key = value.key, .listed = &value});
+  }
   return entry;
 }
 

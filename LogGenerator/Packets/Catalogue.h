@@ -3,6 +3,7 @@
 #pragma once
 
 #include <functional>
+#include <span>
 #include <string_view>
 #include <vector>
 
@@ -14,19 +15,39 @@ namespace kestro {
 struct CatalogueKey {
   std::string_view list{};  ///< the key of the list that the rows stand under; empty: the section
   std::string_view key;
+  /// The fields that write it, several where conditions choose between them; none for a key that no
+  /// field of a layout writes. They are constants, like what the pointers below point at.
+  std::vector<const Field*> fields{};
+  const RecordTable* table = nullptr;   ///< whose records the fields lie in; null: the packet
+  const ListedValue* listed = nullptr;  ///< the value of a property list; null: none
 };
 
 /// What one section takes from one log code.
 struct CatalogueEntry {
   LogCode code = 0;
-  std::string_view packetName{};  ///< empty when the section reads nothing from the code
+  std::string_view packetName{};  ///< empty when nobody knows what the packet contains
   std::size_t minimumLength = 0;
   std::string_view section{};
   SectionKind kind = SectionKind::Dictionary;
   std::vector<CatalogueKey> keys{};  ///< in the layout's order, each once
+  /// The property list that the section is filled from; null: another kind of packet.
+  const PropertyListReading* propertyList = nullptr;
+  /// Whether the section keeps what the packet says, for what it shows of other packets.
+  bool isNoted = false;
+  /// The display's outermost group that the section stands in, under the template's own key
+  /// ("01;Network"); empty: none. Valid as long as the generator.
+  std::string_view group{};
 };
 
 using CatalogueVisitor = std::function<void(const CatalogueEntry& entry)>;
+
+/// The key `name` with the shown fields that write it.
+[[nodiscard]] CatalogueKey catalogueKey(std::string_view name, std::span<const Field> fields);
+
+/// The keys of the shown fields, each once: the packet's own, or the rows of a table's records.
+[[nodiscard]] std::vector<CatalogueKey> catalogueFields(std::span<const Field> fields,
+                                                        std::string_view list = {},
+                                                        const RecordTable* table = nullptr);
 
 /// The entry of one reading; keys that it takes out of the section are left out.
 [[nodiscard]] CatalogueEntry catalogueReading(const Section& section, const PacketReading& reading);

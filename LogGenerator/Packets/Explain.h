@@ -26,8 +26,9 @@ struct ExplainedSource {
   bool isBigEndian = false;
   bool isPastEnd = false;  ///< whether any of its bytes lies past the packet's end
   std::int64_t raw = 0;
-  std::string
-      listKey{};  ///< for a value of a cell list: its key there; the places above are unused
+  /// For a value of a property list: its key there; the places above are unused.
+  std::string listKey{};
+  bool isNumber = true;  ///< whether `raw` says something; only values of property lists lack it
 };
 
 /// One value of a packet as a section takes it.

@@ -33,6 +33,10 @@ inline constexpr std::size_t kRecordTimeOffset = 5;    ///< 64 bits: µs since 1
   return packet.u8(kLogTypeOffset);
 }
 
+[[nodiscard]] constexpr bool isKnownLogType(std::uint8_t type) noexcept {
+  return type == kBasebandLogType || type == kExtraLogType;
+}
+
 /// The packet's log code, with the offset of extra codes when its type says so.
 [[nodiscard]] inline LogCode logCodeOf(PacketView packet) noexcept {
   const LogCode code = packet.u16(kLogCodeOffset);

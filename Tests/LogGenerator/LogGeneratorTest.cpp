@@ -55,6 +55,11 @@ TEST_F(LogGeneratorTest, KnowsNoGeneratorForAnotherTechnology) {
   EXPECT_FALSE(LogGenerator::generatorFromTechnology(platform, "ifx"));
 }
 
+TEST_F(LogGeneratorTest, NamesTheTechnologiesInTheOrderOfTheSearch) {
+  EXPECT_THAT(LogGenerator::technologies(),
+              ElementsAre("IFX", "Ondrel_GSM", "Ondrel_CDMA", "LTE", "UTRAN2"));
+}
+
 TEST_F(LogGeneratorTest, EveryTechnologyHasItsGenerator) {
   EXPECT_TRUE(makes<GSMLogGenerator>(kTqLogChannelTechnology_IFX));
   EXPECT_TRUE(makes<Ondrel_GSMLogGenerator>(kTqLogChannelTechnology_Ondrel_GSM));

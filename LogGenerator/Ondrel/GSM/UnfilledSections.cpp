@@ -11,7 +11,7 @@ constexpr Section withoutPackets(std::string_view name, std::string_view logLine
 
 /// A packet that the section wants, though nobody has described it.
 constexpr PacketReading undescribed(LogCode code) {
-  return {.code = code, .packetName = "Not described", .minimumLength = 0};
+  return {.code = code, .packetName = {}, .minimumLength = 0};
 }
 
 constexpr PacketReading kGPRSInformationReadings[] = {

@@ -288,20 +288,21 @@ TEST_F(C2KLogGeneratorTest, ListsWhatEachSectionTakesFromEachCode) {
   std::vector<std::string> lines;
   generator->catalogue([&](const CatalogueEntry& entry) {
     std::string line = std::to_string(entry.code) + " " + std::string(entry.packetName) + " " +
-                       std::to_string(entry.minimumLength) + " " + std::string(entry.section);
+                       std::to_string(entry.minimumLength) + " " + std::string(entry.group) + "/" +
+                       std::string(entry.section);
     for (const CatalogueKey& key : entry.keys) line += "," + std::string(key.key);
     lines.push_back(line);
   });
   ASSERT_THAT(lines, SizeIs(10));
-  EXPECT_EQ(lines[0], "4234 EV-DO finger C/I 23 ,Fingers");
-  EXPECT_EQ(lines[1], "4483 EV-DO status 50 Radio,Channel,Tx");
-  EXPECT_EQ(lines[2], "4483 EV-DO status 50 ,State");
+  EXPECT_EQ(lines[0], "4234 EV-DO finger C/I 23 /,PN Offset,Energy");
+  EXPECT_EQ(lines[1], "4483 EV-DO status 50 Radio/Radio,Channel,Tx");
+  EXPECT_EQ(lines[2], "4483 EV-DO status 50 /,State");
   EXPECT_EQ(lines[3],
-            "4483 EV-DO status 50 EV-DO status,kBandClass,kRxAGC0,kRxAGC1,kServingPNOffset,"
+            "4483 EV-DO status 50 /EV-DO status,kBandClass,kRxAGC0,kRxAGC1,kServingPNOffset,"
             "kSessionState,kUATI24,kColorCode");
-  EXPECT_EQ(lines[4], "4498 EV-DO forward throughput 241 EV-DO forward throughput,kFLDataRate");
+  EXPECT_EQ(lines[4], "4498 EV-DO forward throughput 241 /EV-DO forward throughput,kFLDataRate");
   EXPECT_EQ(lines[6],
-            "4508 1x status 17 1x status,k1xDeviceState,k1xRx0BandClass,k1xRx0ChanNum,k1xRxAGC0,"
+            "4508 1x status 17 /1x status,k1xDeviceState,k1xRx0BandClass,k1xRx0ChanNum,k1xRxAGC0,"
             "k1xRx1BandClass,k1xRx1ChanNum,k1xRxAGC1,k1xTxAGC,k1xActiveSetInfo,k1xTrafficFER");
 }
 

@@ -211,11 +211,13 @@ TEST_F(CellListTest, IsExplainedByItsListKeys) {
   EXPECT_EQ(values[1].key, "RSSI");
   ASSERT_THAT(values[1].sources, SizeIs(1));
   EXPECT_EQ(values[1].sources[0].listKey, "kTqCellMonitorRSSI");
+  EXPECT_TRUE(values[1].sources[0].isNumber);
   EXPECT_EQ(values[1].sources[0].raw, -40);
   EXPECT_EQ(values[1].text, Value("-80 dBm"));
   EXPECT_EQ(values[3].row, 1U);
   EXPECT_EQ(values[3].key, "ARFCN");
   EXPECT_TRUE(values[3].text.isNull());
+  EXPECT_FALSE(values[3].sources.at(0).isNumber);
   EXPECT_EQ(values[4].text, Value(""));
 }
 

@@ -68,6 +68,15 @@ class OndrelLogGenerator2Test : public ::testing::Test {
     return packet;
   }
 
+  /// "section.key" of every value.
+  std::vector<std::string> explained(const Bytes& message) const {
+    std::vector<std::string> result;
+    generator->explainMessage(message, [&](const ExplainedValue& value) {
+      result.push_back(std::string(value.section) + "." + std::string(value.key));
+    });
+    return result;
+  }
+
   Dictionary group() { return state["Display"].dictionary()["Group"].dictionary(); }
   Value level() { return group()["Level"].dictionary()["Level"]; }
 
@@ -184,6 +193,23 @@ TEST_F(OndrelLogGenerator2Test, DropsMessagesOfAnotherTypeWithALine) {
   EXPECT_THAT(takeLines(),
               ElementsAre(Line{LogPriority::Error, "Invalid log type: ab. Dropping."}));
   EXPECT_TRUE(level().isNull());
+}
+
+TEST_F(OndrelLogGenerator2Test, ExplainsWhatItDispatches) {
+  EXPECT_THAT(explained(levelPacket({7})),
+              ElementsAre("Level.Level", "Cells.count", "Cells.Cell", "Cells.Cell", "Cells.Cell",
+                          "Cells.Cell", "Cells.Cell", "Cells.Cell", "Cells.Cell"));
+  Bytes dropped = levelPacket({7});
+  dropped[0] = 2;
+  EXPECT_THAT(explained(dropped), IsEmpty());
+  EXPECT_THAT(explained(Bytes(12, 1)), IsEmpty());
+}
+
+TEST_F(OndrelLogGenerator2Test, KnowsNoGroupsWithoutATemplate) {
+  setTemplate("no dictionary");
+  std::vector<std::string_view> groups;
+  generator->catalogue([&](const CatalogueEntry& entry) { groups.push_back(entry.group); });
+  EXPECT_THAT(groups, ElementsAre("", "", "", ""));
 }
 
 TEST_F(OndrelLogGenerator2Test, AddsTheOffsetToExtraCodes) {

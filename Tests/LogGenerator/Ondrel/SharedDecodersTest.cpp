@@ -105,12 +105,19 @@ TEST_F(SimInfoTest, IsExplainedByItsFileKeys) {
   ASSERT_THAT(values, SizeIs(2));
   EXPECT_EQ(values[0].key, "EF-ICCID");
   EXPECT_EQ(values[0].sources.at(0).listKey, "kSimFile_ICCID");
+  EXPECT_FALSE(values[0].sources[0].isNumber);
   EXPECT_EQ(values[0].text, Value("1"));
   EXPECT_EQ(values[1].key, "EF-ADMINISTRATIVE DATA");
 }
 
 TEST_F(SimInfoTest, IsCataloguedWithAllItsKeys) {
-  EXPECT_THAT(decoder.catalogueCode(kSimFilesCode).keys, SizeIs(14));
+  const CatalogueEntry entry = decoder.catalogueCode(kSimFilesCode);
+  ASSERT_THAT(entry.keys, SizeIs(14));
+  EXPECT_EQ(entry.keys[0].key, "EF-ICCID");
+  ASSERT_NE(entry.keys[0].listed, nullptr);
+  EXPECT_EQ(entry.keys[0].listed->listKey, "kSimFile_ICCID");
+  ASSERT_NE(entry.propertyList, nullptr);
+  EXPECT_EQ(entry.propertyList->part, ListedPart::Root);
 }
 
 // --- PDPContextList ------------------------------------------------------------------------------

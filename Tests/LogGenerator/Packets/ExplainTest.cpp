@@ -125,6 +125,37 @@ TEST(CatalogueTest, ListsShownKeysOnce) {
   std::vector<std::string_view> keys;
   for (const CatalogueKey& key : entry.keys) keys.push_back(key.key);
   EXPECT_THAT(keys, ElementsAre("Sum", "Area", "ID", "Odd"));
+  EXPECT_FALSE(entry.isNoted);
+}
+
+TEST(CatalogueTest, SaysWhereEachKeyComesFrom) {
+  const CatalogueEntry entry = catalogueReading(kSection, kReadings[0]);
+  EXPECT_THAT(entry.keys[1].fields, ElementsAre(&kFields[3]));
+  EXPECT_EQ(entry.keys[1].table, nullptr);
+  EXPECT_THAT(entry.keys[2].fields, ElementsAre(&kRecordFields[0]));
+  EXPECT_EQ(entry.keys[2].table, &kLists[0].table);
+}
+
+constexpr Field kChoice[] = {
+    Field("Level", u8(14), decimal()).when(equals(u8(13), 0)),
+    Field("Level", s8(14), decimal()).when(equals(u8(13), 1)),
+    {"Kind", u8(13).shared(), hidden()},
+};
+
+TEST(CatalogueTest, HasEveryFieldThatConditionsChooseBetween) {
+  const std::vector<CatalogueKey> keys = catalogueFields(kChoice);
+  ASSERT_EQ(keys.size(), 1U);
+  EXPECT_EQ(keys[0].key, "Level");
+  EXPECT_THAT(keys[0].fields, ElementsAre(&kChoice[0], &kChoice[1]));
+}
+
+constexpr ListReading kNotedLists[] = {{.table = kLists[0].table, .use = RowsUse::Noted}};
+constexpr PacketReading kNotedReading = {0x1234, "test packet", 16, {}, kNotedLists};
+
+TEST(CatalogueTest, ShowsNoKeysOfRowsThatAreOnlyNoted) {
+  const CatalogueEntry entry = catalogueReading(kSection, kNotedReading);
+  EXPECT_THAT(entry.keys, IsEmpty());
+  EXPECT_TRUE(entry.isNoted);
 }
 
 }  // namespace

@@ -2,6 +2,8 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <map>
+
 #include "LogGenerator/Ondrel/LTE/LTEClassIndex.h"
 #include "LogGenerator/Ondrel/LTE/LTELogGenerator.h"
 #include "Platform/Bundle.h"
@@ -184,6 +186,15 @@ TEST_F(LTELogGeneratorTest, CataloguesEveryCodeOfEverySection) {
                           "B180 Neighbor Cells List 12", "B186 Reselection Candidates 3",
                           "B186 Reselection Candidates List 11", "FF0000 SIM Info 14",
                           "FF0002 PDP Context Info 0"));
+}
+
+TEST_F(LTELogGeneratorTest, CataloguesTheGroupOfEverySection) {
+  std::map<std::string_view, std::string_view> groups;
+  generator->catalogue([&](const CatalogueEntry& entry) { groups[entry.section] = entry.group; });
+  EXPECT_THAT(groups, SizeIs(11));
+  EXPECT_EQ(groups["Serving Cell Info"], "01;Serving Cell");
+  EXPECT_EQ(groups["Neighbor Cells List"], "02;Neighbors");
+  EXPECT_EQ(groups["PDP Context Info"], "05;Packet Data");
 }
 
 }  // namespace
