@@ -93,6 +93,7 @@ void PacketWriter::setCount(const RecordTable& table, std::size_t count) {
 }
 
 PacketWriter::Fields PacketWriter::record(const RecordTable& table, std::size_t index) {
+  if (_isSpoilt) return fields(table.fields);
   return {*this, table.fields, recordAt(table, PacketView(_bytes), index)};
 }
 

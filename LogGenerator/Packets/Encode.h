@@ -62,7 +62,8 @@ class PacketWriter {
   /// Sets how many records a table has. Do it for all tables of a packet before writing records:
   /// their places depend on the counts.
   void setCount(const RecordTable& table, std::size_t count);
-  /// The fields of record `index`, which must be below the count.
+  /// The fields of record `index`, which must be below the count. Of a spoilt packet, whose count
+  /// may not have been set, any.
   [[nodiscard]] Fields record(const RecordTable& table, std::size_t index);
 
   /// Writes a value that no layout names.

@@ -126,6 +126,7 @@ TEST_F(EncodeTest, YieldsNothingForTheWrongNumberOfRawValues) {
 
 TEST_F(EncodeTest, YieldsNothingForATooLargeCount) {
   writer.setCount(kTable, 9);  // 3 bits hold 7, one is added
+  for (std::size_t i = 0; i < 9; ++i) writer.record(kTable, i).raw("Cell", 1);
   EXPECT_FALSE(writer.finish(Moment()));
 }
 
