@@ -10,7 +10,7 @@
 #include "LogGenerator/Ondrel/GSM/LinkQuality.h"
 #include "LogGenerator/Ondrel/GSM/MobilityManagement.h"
 #include "LogGenerator/Ondrel/GSM/RadioResource.h"
-#include "LogGenerator/Packets/Encode.h"
+#include "TelephonyServer/Sources/ReadingWriter.h"
 
 namespace kestro {
 namespace {
@@ -35,27 +35,6 @@ constexpr LogCode kEquivalentNetworksCode = 0x7150;
 
 constexpr std::size_t kUndescribedPayload = 32;
 constexpr unsigned kBlerWindow = 200;
-
-/// A packet being written from one section's reading of it.
-class ReadingWriter {
- public:
-  ReadingWriter(const Section& section, LogCode code)
-      : _reading(*readingOf(section, code)), _writer(code, _reading.minimumLength) {}
-
-  [[nodiscard]] PacketWriter::Fields fields() { return _writer.fields(_reading.fields); }
-  /// A table of the packet, its count set.
-  const RecordTable& table(std::size_t count, std::size_t list = 0) {
-    const RecordTable& records = _reading.lists[list].table;
-    _writer.setCount(records, count);
-    return records;
-  }
-  [[nodiscard]] PacketWriter& writer() { return _writer; }
-  [[nodiscard]] std::optional<Bytes> finish(Moment time) { return _writer.finish(time); }
-
- private:
-  const PacketReading& _reading;
-  PacketWriter _writer;
-};
 
 /// A linear Ec/N0 that is looked up as this many dB, or as near as the table comes.
 std::int64_t linearEnergy(double energyPerChip) {

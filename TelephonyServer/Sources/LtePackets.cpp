@@ -36,6 +36,13 @@ PacketWriter::Fields fieldsOf(PacketWriter& writer, const Section& section, LogC
   return writer.fields(readingOf(section, code)->fields);
 }
 
+/// Which neighbours are looked for: those on the frequency (1), those on others (2), or both.
+std::int64_t measurementRules(const LteServing& serving) {
+  const LteReselectionParameters& reselection = serving.reselection;
+  const int level = reselection.selectionLevel(serving.now.rsrp);
+  return (level < reselection.intraSearch ? 1 : 0) + (level < reselection.nonIntraSearch ? 2 : 0);
+}
+
 void writeNeighbour(PacketWriter::Fields record, const LteNeighbour& neighbour,
                     const LteReselectionParameters& reselection) {
   record.raw("Physical Cell ID", neighbour.physicalCellId)
@@ -45,6 +52,7 @@ void writeNeighbour(PacketWriter::Fields record, const LteNeighbour& neighbour,
       .number("Measured RSRQ", neighbour.now.rsrq)
       .number("Average RSRQ", neighbour.average.rsrq)
       .number("Srxlev", reselection.selectionLevel(neighbour.now.rsrp))
+      .raw("Frequency Offset", neighbour.frequencyOffset)
       .raw("Ant 0 Frame Offset", neighbour.frameOffset)
       .raw("Ant 0 Sample Offset", neighbour.sampleOffset);
 }
@@ -98,7 +106,8 @@ std::optional<Bytes> lteServingCell(const LteServing& serving, Moment time) {
       .raw("Num of Consecutive DRX Cycles of S < 0", serving.consecutiveLowCycles)
       .number("S Intra Search", reselection.intraSearch)
       .number("S Non Intra Search", reselection.nonIntraSearch)
-      .raw("Measurement Rules Updated", serving.rulesUpdated ? 1 : 0);
+      .raw("Measurement Rules Updated", serving.rulesUpdated ? 1 : 0)
+      .raw("Measurement Rules", measurementRules(serving));
   return writer.finish(time);
 }
 

@@ -48,8 +48,9 @@ struct LteNeighbour {
   unsigned physicalCellId = 0;
   LteLevel now;
   LteLevel average;
-  unsigned frameOffset = 0;   ///< frames
-  unsigned sampleOffset = 0;  ///< samples
+  unsigned frameOffset = 0;      ///< frames
+  unsigned sampleOffset = 0;     ///< samples
+  unsigned frequencyOffset = 0;  ///< Hz
 };
 
 struct LteServing {

@@ -127,7 +127,8 @@ LteNeighbour LteCarrier::neighbour(std::size_t index) const {
           .now = levelOf(level.level),
           .average = levelOf(levelOfCell(_averages, index).level),
           .frameOffset = static_cast<unsigned>(index % 2),
-          .sampleOffset = static_cast<unsigned>(level.distance / kMetresPerSample)};
+          .sampleOffset = static_cast<unsigned>(level.distance / kMetresPerSample),
+          .frequencyOffset = static_cast<unsigned>(20 + 37 * index % 90)};
 }
 
 // --- LtePhone ------------------------------------------------------------------------------------

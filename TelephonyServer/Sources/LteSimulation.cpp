@@ -12,7 +12,6 @@ namespace kestro {
 namespace {
 
 // How often what changes rarely is said again, in steps.
-constexpr unsigned kBroadcastSteps = 10;
 constexpr unsigned kListSteps = 4;
 constexpr unsigned kTechnologySteps = 20;
 
@@ -84,7 +83,7 @@ std::vector<Bytes> LteSimulation::step(std::chrono::milliseconds elapsed, Moment
 }
 
 void LteSimulation::addBroadcast(PacketList& packets, Moment now) {
-  if (!_phone.hasNewCell() && _steps % kBroadcastSteps != 0) return;
+  if (!_phone.hasNewCell() && _steps % kListSteps != 0) return;
   const LteCell cell = _phone.serving().cell;
   packets.add(lteSystemInformation(cell, now));
   packets.add(lteAntennas(cell, now));
@@ -117,7 +116,7 @@ void LteSimulation::addLists(PacketList& packets, Moment now) {
     packets.add(extraPacket(kSimFilesCode, simulatedSimFiles(area), _coding, now));
   }
   // What cells broadcast takes the channel out of the section that this list puts it into.
-  if (_phone.hasNewCell() || _steps % kBroadcastSteps == 0 || _steps % kListSteps == 0) {
+  if (_phone.hasNewCell() || _steps % kListSteps == 0) {
     packets.add(extraPacket(kCellMonitorCode, cellMonitorList(_phone), _coding, now));
   }
   if (_steps % kListSteps == 0) {

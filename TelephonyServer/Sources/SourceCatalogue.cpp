@@ -11,6 +11,7 @@
 
 #include "Platform/TelephonyService.h"
 #include "TelephonyServer/Sources/AutoDriveTest.h"
+#include "TelephonyServer/Sources/C2kSimulation.h"
 #include "TelephonyServer/Sources/CaptureSource.h"
 #include "TelephonyServer/Sources/DriveTestSource.h"
 #include "TelephonyServer/Sources/GsmUmtsSimulation.h"
@@ -19,6 +20,7 @@
 #include "TelephonyServer/Sources/LteSimulation.h"
 #include "TelephonyServer/Sources/PacketSimulation.h"
 #include "TelephonyServer/Sources/StreamSource.h"
+#include "TelephonyServer/Sources/UtranSimulation.h"
 
 namespace kestro {
 namespace {
@@ -59,7 +61,9 @@ struct Simulation {
 constexpr std::array kSimulations = {
     Simulation{kTqLogChannelTechnology_IFX, simulation<IfxSimulation>},
     Simulation{kTqLogChannelTechnology_Ondrel_GSM, packetSimulation<GsmUmtsSimulation>},
+    Simulation{kTqLogChannelTechnology_Ondrel_CDMA, packetSimulation<C2kSimulation>},
     Simulation{kTqLogChannelTechnology_Ondrel_LTE, packetSimulation<LteSimulation>},
+    Simulation{kTqLogChannelTechnology_Ondrel_UTRAN2, packetSimulation<UtranSimulation>},
 };
 
 template <class Encoder>
@@ -151,8 +155,8 @@ bool isGiven(std::string_view argument) { return !argument.empty(); }
 constexpr std::array kKinds = {
     SourceKind{"simulation", isTechnologyOrEmpty, "simulation[:TECHNOLOGY]",
                "A made-up drive, the same in every run: cells, path loss, fading,\n"
-               "handovers, data transfers. Technology: LTE (unless given), IFX or\n"
-               "Ondrel_GSM.",
+               "handovers, data transfers. Technology: LTE (unless given), IFX,\n"
+               "Ondrel_GSM, Ondrel_CDMA or UTRAN2.",
                openSimulation},
     SourceKind{"capture", isGiven, "capture:FILE",
                "A recorded capture, with the pauses that it was recorded with. The\n"

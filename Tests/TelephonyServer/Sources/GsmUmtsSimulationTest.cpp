@@ -6,10 +6,9 @@
 #include <string>
 #include <vector>
 
-#include "LogGenerator/Packets/PacketHeader.h"
 #include "Platform/TelephonyService.h"
 #include "TelephonyServer/Sources/GsmUmtsSimulation.h"
-#include "Tests/Support/DisplayReader.h"
+#include "Tests/TelephonyServer/SimulationFixture.h"
 
 namespace kestro {
 namespace {
@@ -20,39 +19,15 @@ using ::testing::IsSupersetOf;
 
 constexpr int kStepsOfTwentyMinutes = 2'400;
 
-class GsmUmtsSimulationTest : public ::testing::Test {
+class GsmUmtsSimulationTest : public testing::SimulationFixture<GsmUmtsSimulation> {
  protected:
-  std::vector<Bytes> step() {
-    const auto packets = _simulation.step(_elapsed, _now);
-    _elapsed = kSimulationStep;
-    _now += kSimulationStep;
-    for (const Bytes& packet : packets) display.receive(packet);
-    return packets;
-  }
-
-  std::set<LogCode> codesOfSteps(int steps) {
-    std::set<LogCode> codes;
-    for (int i = 0; i < steps; ++i) {
-      for (const Bytes& packet : step()) codes.insert(logCodeOf(PacketView(packet)));
-    }
-    return codes;
-  }
-
-  /// What a key showed in the course of a drive.
-  std::set<std::string> shown(std::string_view section, std::string_view key) {
-    std::set<std::string> texts;
-    for (int i = 0; i < kStepsOfTwentyMinutes; ++i) {
-      step();
-      texts.insert(display.text(section, key));
-    }
-    return texts;
-  }
-
-  testing::DisplayReader display{kTqLogChannelTechnology_Ondrel_GSM, "Ondrel_GSM"};
-  GsmUmtsSimulation _simulation{display.coding()};
-  std::chrono::milliseconds _elapsed{0};
-  Moment _now = kSimulationBegin;
+  GsmUmtsSimulationTest() : SimulationFixture(kTqLogChannelTechnology_Ondrel_GSM, "Ondrel_GSM") {}
 };
+
+TEST_F(GsmUmtsSimulationTest, SaysTheSameInEveryRun) {
+  GsmUmtsSimulation again(display.coding());
+  expectSameIn(again, 100);
+}
 
 TEST_F(GsmUmtsSimulationTest, SendsEveryCodeThatTheGeneratorAsksFor) {
   const std::set<LogCode> sent = codesOfSteps(kStepsOfTwentyMinutes);
@@ -74,14 +49,14 @@ TEST_F(GsmUmtsSimulationTest, SaysTheListsSoonAfterTheBeginningAndAgainLater) {
 }
 
 TEST_F(GsmUmtsSimulationTest, MovesThroughMobilityManagement) {
-  EXPECT_THAT(shown("Process CS", "MM State"),
+  EXPECT_THAT(shown("Process CS", "MM State", kStepsOfTwentyMinutes),
               IsSupersetOf({"MM_NULL", "MM_LOCATION_UPDATE_INITIATED", "MM_IDLE",
                             "MM_WAIT_FOR_OUTGOING_MM_CONNECTION", "MM_CONNECTION_ACTIVE",
                             "MM_WAIT_FOR_RR_CONNECTION_LU"}));
 }
 
 TEST_F(GsmUmtsSimulationTest, MovesBetweenUmtsAndGsm) {
-  EXPECT_THAT(shown("GSM RR Info", "RR State"),
+  EXPECT_THAT(shown("GSM RR Info", "RR State", kStepsOfTwentyMinutes),
               IsSupersetOf({"RR_INACTIVE", "RR_W2G_INTERRAT_RESELECTION_PROGRESS", "RR_IDLE",
                             "RR_G2W_INTERRAT_RESELECTION_PROGRESS"}));
 }

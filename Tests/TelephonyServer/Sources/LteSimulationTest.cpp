@@ -2,14 +2,14 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <cstdlib>
 #include <set>
 #include <string>
 #include <vector>
 
-#include "LogGenerator/Packets/PacketHeader.h"
 #include "Platform/TelephonyService.h"
 #include "TelephonyServer/Sources/LteSimulation.h"
-#include "Tests/Support/DisplayReader.h"
+#include "Tests/TelephonyServer/SimulationFixture.h"
 #include "Tests/TelephonyServer/SourceReading.h"
 
 namespace kestro {
@@ -23,44 +23,19 @@ using ::testing::Not;
 
 constexpr int kStepsOfTenMinutes = 1'200;
 
-class LteSimulationTest : public ::testing::Test {
+class LteSimulationTest : public testing::SimulationFixture<LteSimulation> {
  protected:
-  /// The packets of the next step, shown.
-  std::vector<Bytes> step() {
-    const auto packets = _simulation.step(_elapsed, _now);
-    _elapsed = kSimulationStep;
-    _now += kSimulationStep;
-    for (const Bytes& packet : packets) display.receive(packet);
-    return packets;
-  }
-
-  std::set<LogCode> codesOfSteps(int steps) {
-    std::set<LogCode> codes;
-    for (int i = 0; i < steps; ++i) {
-      for (const Bytes& packet : step()) codes.insert(logCodeOf(PacketView(packet)));
-    }
-    return codes;
-  }
+  LteSimulationTest() : SimulationFixture(kTqLogChannelTechnology_Ondrel_LTE, "LTE") {}
 
   std::string serving(std::string_view key) { return display.text("Serving Cell Info", key); }
   std::string measured(std::string_view key) {
     return display.text("Serving Cell Measurements", key);
   }
-
-  testing::DisplayReader display{kTqLogChannelTechnology_Ondrel_LTE, "LTE"};
-  LteSimulation _simulation{display.coding()};
-  std::chrono::milliseconds _elapsed{0};
-  Moment _now = kSimulationBegin;
 };
 
 TEST_F(LteSimulationTest, SaysTheSameInEveryRun) {
   LteSimulation again(display.coding());
-  for (int i = 0; i < 100; ++i) {
-    const Moment now = kSimulationBegin + i * kSimulationStep;
-    const std::chrono::milliseconds elapsed =
-        i == 0 ? std::chrono::milliseconds(0) : kSimulationStep;
-    ASSERT_EQ(_simulation.step(elapsed, now), again.step(elapsed, now)) << "step " << i;
-  }
+  expectSameIn(again, 100);
 }
 
 TEST_F(LteSimulationTest, SendsEveryCodeThatTheGeneratorAsksFor) {
@@ -137,6 +112,20 @@ TEST_F(LteSimulationTest, ShowsSimFilesAndContexts) {
   EXPECT_EQ(display.section("SIM Info").dictionary().size(), 14U);
   EXPECT_EQ(display.row("PDP Context Info", 0)["APN"], Value("internet"));
   EXPECT_EQ(display.row("PDP Context Info", 1)["APN"], Value("ims"));
+}
+
+TEST_F(LteSimulationTest, LooksForTheNeighboursThatItsLevelAsksFor) {
+  std::set<std::string> rules;
+  for (int i = 0; i < kStepsOfTenMinutes; ++i) {
+    step();
+    const auto number = [&](std::string_view key) { return std::atoi(measured(key).c_str()); };
+    const int level = number("Srxlev");
+    const int expected =
+        (level < number("S Intra Search") ? 1 : 0) + (level < number("S Non Intra Search") ? 2 : 0);
+    ASSERT_EQ(number("Measurement Rules"), expected) << "step " << i;
+    rules.insert(measured("Measurement Rules"));
+  }
+  EXPECT_GT(rules.size(), 1U);
 }
 
 TEST_F(LteSimulationTest, SaysTheListsSoonAfterTheBeginningAndAgainLater) {

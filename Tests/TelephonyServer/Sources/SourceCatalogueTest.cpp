@@ -73,11 +73,13 @@ TEST_F(SourceCatalogueTest, simulationsAndDriveTestsSpeakSeveralTechnologies) {
   const auto log = _directory.write("a.csv", std::string_view("Timestamp,NetworkMode,RSRP\n"
                                                               "2020.01.02_03.04.05,EDGE,-90\n"));
   for (const std::string technology : {"LTE", "Ondrel_GSM"}) {
-    EXPECT_EQ((*open("simulation:" + technology))->technology(), technology);
     EXPECT_EQ((*open("drive-test:" + log, technology))->technology(), technology);
   }
-  EXPECT_THAT(open("simulation:UTRAN2").error().message,
-              HasSubstr("cannot make UTRAN2 messages, only IFX, Ondrel_GSM, LTE"));
+  for (const auto technology : technologyNames()) {
+    EXPECT_EQ((*open("simulation:" + std::string(technology)))->technology(), technology);
+  }
+  EXPECT_THAT(open("drive-test:" + log, "UTRAN2").error().message,
+              HasSubstr("cannot make UTRAN2 messages, only IFX, Ondrel_GSM, LTE, auto"));
 }
 
 TEST_F(SourceCatalogueTest, anAutomaticDriveTestBeginsWithItsFirstRow) {

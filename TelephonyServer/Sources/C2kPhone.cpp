@@ -1,0 +1,222 @@
+// SPDX-License-Identifier: MIT
+#include "TelephonyServer/Sources/C2kPhone.h"
+
+#include <algorithm>
+#include <cmath>
+#include <utility>
+
+#include "TelephonyServer/Sources/Noise.h"
+
+namespace kestro {
+namespace {
+
+using std::chrono::milliseconds;
+
+// Thermal noise and the receiver's own; what a receiver that is off reports.
+constexpr double kNoise = -106;
+
+constexpr std::size_t kFingers = 6;
+
+// The forward link's chip rate, and its fastest and slowest rates, bit/s.
+constexpr double kHertz = 1.2288e6;
+constexpr double kFastest = 3.072e6;
+constexpr double kSlowest = 38'400;
+constexpr double kFastestReverse = 1.8432e6;
+
+std::vector<unsigned> allSites() {
+  std::vector<unsigned> sites;
+  for (unsigned site = 0; site < RingRoad::kSites; ++site) sites.push_back(site);
+  return sites;
+}
+
+/// A part of each sector's power is its pilot.
+CdmaCarrier::Parameters oneXParameters(std::uint64_t seed) {
+  return {.radio = {.seed = hashed(seed, 31), .frequency = 881, .power = 44, .sites = allSites()},
+          .channel = {.bandClass = 0, .number = 283},
+          .traffic = 5.5,
+          .hysteresis = 3};
+}
+
+/// Pilots come in bursts of full power.
+CdmaCarrier::Parameters evdoParameters(std::uint64_t seed) {
+  return {.radio = {.seed = hashed(seed, 32), .frequency = 881, .power = 50, .sites = allSites()},
+          .channel = {.bandClass = 0, .number = 201},
+          .traffic = 0,
+          .hysteresis = 2};
+}
+
+/// The masts of another operator.
+bool isPartners(const SimulatedCell& cell) { return cell.site >= 8 && cell.site < 12; }
+
+double linear(double decibels) { return std::pow(10, decibels / 10); }
+
+/// What a phone sends that hears so much.
+double transmitPower(double received) { return std::clamp(-73 - received, -50.0, 23.0); }
+
+}  // namespace
+
+// --- CdmaCarrier ---------------------------------------------------------------------------------
+
+CdmaCarrier::CdmaCarrier(Parameters parameters)
+    : _parameters(std::move(parameters)),
+      _radio(_parameters.radio),
+      _selection(_parameters.hysteresis, milliseconds(500)) {}
+
+bool CdmaCarrier::measure(const Drive& drive, milliseconds time) {
+  _levels = _radio.levels(drive);
+  PowerSum total;
+  total.add(kNoise);
+  for (const CellLevel& level : _levels) total.add(level.level + _parameters.traffic);
+  _total = total.level();
+  _handover.update(_levels);
+  return _selection.update(_levels, time);
+}
+
+const SimulatedCell& CdmaCarrier::servingCell() const {
+  return _radio.cells()[_selection.serving()];
+}
+
+C2kPilot CdmaCarrier::pilot(std::size_t index) const {
+  const auto [site, sector] = _radio.cells()[index];
+  return {.pnOffset = 4 + 8 * site + 168 * sector,
+          .energy = levelOfCell(_levels, index).level - _total};
+}
+
+std::vector<C2kPilot> CdmaCarrier::pilots() const {
+  std::vector<C2kPilot> pilots{pilot(_selection.serving())};
+  for (const CellLevel& level : _levels) {
+    const bool isOther = level.cell != _selection.serving() && _handover.contains(level.cell);
+    if (isOther && pilots.size() < SoftHandoverSet::kMaximumSize) {
+      pilots.push_back(pilot(level.cell));
+    }
+  }
+  return pilots;
+}
+
+double CdmaCarrier::carrierToInterference(const C2kPilot& pilot) const {
+  const double carrier = linear(pilot.energy);
+  return 10 * std::log10(carrier / (1 - carrier));
+}
+
+// --- C2kPhone ------------------------------------------------------------------------------------
+
+C2kPhone::C2kPhone(std::uint64_t seed)
+    : _drive(hashed(seed, 0)),
+      _session(hashed(seed, 4)),
+      _load(hashed(seed, 3), 8),
+      _frameSeed(hashed(seed, 33)),
+      _oneXCarrier(oneXParameters(seed)),
+      _evdoCarrier(evdoParameters(seed)),
+      _oneX(hashed(seed, 34)) {
+  advance(milliseconds(0));
+}
+
+void C2kPhone::advance(milliseconds time) {
+  _drive.advance(time);
+  _session.advance(time);
+  _oneX.advance(time);
+  _evdo.advance(time, _oneX.isIdle(), _session.activity());
+  _hasNewCell = _oneXCarrier.measure(_drive, time);
+  _evdoCarrier.measure(_drive, time);
+  transfer();
+}
+
+void C2kPhone::transfer() {
+  _forwardRate = 0;
+  _reverseRate = 0;
+  const bool isOpen = _evdo.isConnected() && _evdo.session() == EvdoSession::Open;
+  if (!isOpen || _session.activity() != Activity::Transfer) return;
+  const double share = std::clamp(0.6 + 0.15 * _load.at(_drive.seconds()), 0.1, 1.0);
+  const double capacity = kHertz * std::log2(1 + linear(carrierToInterference()));
+  _forwardRate = share * std::clamp(capacity, kSlowest, kFastest);
+  _reverseRate = std::min(20'000 + 0.2 * _forwardRate, kFastestReverse);
+}
+
+double C2kPhone::secondReceivePower(double first) const {
+  return first - 1.5 + _load.at(_drive.seconds() * 4);
+}
+
+// --- 1x
+
+std::vector<C2kPilot> C2kPhone::oneXPilots() const {
+  if (!_oneX.hasPilot()) return {};
+  std::vector<C2kPilot> pilots = _oneXCarrier.pilots();
+  if (!_oneX.isInTraffic()) pilots.resize(1);
+  return pilots;
+}
+
+OneXReport C2kPhone::oneXReport(std::span<const C2kPilot> activeSet) const {
+  const double received = _oneXCarrier.total();
+  // Power control keeps the calls at the base station at one level.
+  const double control = 2 * _load.at(_drive.seconds() * 8);
+  return {.state = oneXStateName(_oneX.state()),
+          .channel = _oneXCarrier.channel(),
+          .receivePower = {received, secondReceivePower(received)},
+          .transmitPower = transmitPower(received) + control,
+          .activeSet = activeSet};
+}
+
+OneXSystem C2kPhone::system() const {
+  const SimulatedCell& cell = _oneXCarrier.servingCell();
+  const bool isRoaming = isPartners(cell);
+  return {.systemId = isRoaming ? 4160U : 4139U,
+          .networkId = isRoaming ? 3U : 1U,
+          .baseStationId = 3'000 + 10 * cell.site + cell.sector,
+          .packetZoneId = 1 + cell.site / 4,
+          .roaming = isRoaming ? "ON [1]" : "OFF [0]"};
+}
+
+bool C2kPhone::receivesBadFrame() {
+  constexpr double kUsualRate = 0.03;
+  constexpr double kUsualEnergy = -9;
+  constexpr double kDecade = 8;  // dB
+  double sum = 0;
+  for (const C2kPilot& pilot : _oneXCarrier.pilots()) sum += linear(pilot.energy);
+  const double energy = 10 * std::log10(sum);
+  const double rate = kUsualRate * std::pow(10, (kUsualEnergy - energy) / kDecade);
+  return hashedFraction(_frameSeed, _frames++) < std::clamp(rate, 0.002, 0.3);
+}
+
+// --- EV-DO
+
+std::vector<C2kPilot> C2kPhone::evdoPilots() const {
+  return _evdo.hasPilot() ? _evdoCarrier.pilots() : std::vector<C2kPilot>();
+}
+
+double C2kPhone::carrierToInterference() const {
+  return _evdoCarrier.carrierToInterference(_evdoCarrier.pilots().front());
+}
+
+std::vector<std::optional<C2kPilot>> C2kPhone::fingers() const {
+  constexpr double kEchoLoss = 7;
+  std::vector<std::optional<C2kPilot>> fingers(kFingers);
+  std::size_t next = 0;
+  for (const C2kPilot& pilot : evdoPilots()) {
+    const double level = _evdoCarrier.carrierToInterference(pilot);
+    fingers[next++] = C2kPilot{pilot.pnOffset, level};
+    // The serving pilot's echo comes and goes; its finger stays reserved for it.
+    if (next != 1) continue;
+    const bool hasEcho = _load.at(_drive.seconds() * 2) > -0.5;
+    if (hasEcho) fingers[next] = C2kPilot{pilot.pnOffset, level - kEchoLoss};
+    ++next;
+  }
+  return fingers;
+}
+
+EvdoReport C2kPhone::evdoReport() const {
+  constexpr std::uint32_t kAddress = 0x2A51C7;
+  const bool isOn = _evdo.state() != EvdoState::Inactive;
+  const bool hasAddress = _evdo.session() != EvdoSession::Closed;
+  const double received = isOn ? _evdoCarrier.total() : kNoise;
+  EvdoReport report{.deviceState = evdoStateName(_evdo.state()),
+                    .sessionState = evdoSessionName(_evdo.session()),
+                    .channel = _evdoCarrier.channel(),
+                    .receivePower = {received, secondReceivePower(received)},
+                    .transmitPower = transmitPower(received),
+                    .address = hasAddress ? kAddress : 0};
+  if (hasAddress) report.colorCode = isPartners(_evdoCarrier.servingCell()) ? 23 : 17;
+  if (_evdo.hasPilot()) report.servingPilot = _evdoCarrier.pilots().front().pnOffset;
+  return report;
+}
+
+}  // namespace kestro
