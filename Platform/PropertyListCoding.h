@@ -21,9 +21,10 @@ struct PropertyListLimits {
 
   /// For what arrives from a port or in a packet.
   [[nodiscard]] static constexpr PropertyListLimits message() noexcept { return {}; }
-  /// For snapshot files, which hold whole histories of displays and raw packets.
+  /// For snapshot files, which hold whole histories of displays and raw packets: ten lists that
+  /// were messages once, and what is around them.
   [[nodiscard]] static constexpr PropertyListLimits snapshotFile() noexcept {
-    return {.bytes = std::size_t{1024} * 1024 * 1024};
+    return {.nodes = 2'100'000, .bytes = std::size_t{1024} * 1024 * 1024};
   }
 };
 

@@ -143,6 +143,15 @@ TEST_F(HostilePropertyListTest, TheNode200001IsRefusedInXml) {
               HasSubstr("too many nodes"));
 }
 
+TEST_F(HostilePropertyListTest, ASnapshotFileMayHoldTenMessages) {
+  const auto limits = PropertyListLimits::snapshotFile();
+  const auto list = [](std::size_t booleans) {
+    return xmlList("<array>" + repeated("<true/>", booleans) + "</array>");
+  };
+  EXPECT_EQ(refusal(list(2'099'999), limits), "(accepted)");
+  EXPECT_THAT(refusal(list(2'100'000), limits), HasSubstr("too many nodes"));
+}
+
 TEST_F(HostilePropertyListTest, XmlKeysAreNodesToo) {
   const std::string row = "<dict>" + repeated("<key>k</key><true/>", 4) + "</dict>";  // 9 nodes
   EXPECT_EQ(xmlRefusal("<array>" + repeated(row, 22'222) + "</array>"), "(accepted)");

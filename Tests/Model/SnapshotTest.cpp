@@ -1,0 +1,218 @@
+// SPDX-License-Identifier: MIT
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+#include "Model/Snapshot.h"
+#include "Platform/Linux/LinuxPlatform.h"
+#include "Platform/Virtual/VirtualPlatform.h"
+
+namespace kestro {
+namespace {
+
+using namespace std::chrono_literals;
+using namespace std::string_view_literals;
+using ::testing::ElementsAre;
+using ::testing::HasSubstr;
+using ::testing::IsEmpty;
+
+/// 2012-03-04 12:05:09 UTC
+constexpr Moment kOpened{std::chrono::seconds(1'330'862'709)};
+constexpr const char* kPathWhenOpened =
+    "/var/mobile/Library/Logs/CrashReporter/KestroSnapshot-1330862709.kestro";
+
+class SnapshotTest : public ::testing::Test {
+ protected:
+  SnapshotTest() {
+    platform.clock().setNow(kOpened);
+    platform.clock().setTimeZone(1h, false);
+  }
+
+  Snapshot open(const Value& saveContents) { return {platform.clock(), saveContents}; }
+
+  std::string fileText(const Value& saveContents, std::string_view description) {
+    const Bytes file = open(saveContents).file(*coding, description).value();
+    return {file.begin(), file.end()};
+  }
+
+  /// The names of the files on the device.
+  std::vector<std::string> paths() {
+    std::vector<std::string> result;
+    for (const auto& [path, contents] : platform.deviceRoot().files()) result.push_back(path);
+    return result;
+  }
+
+  std::unique_ptr<PropertyListCoding> coding = createPropertyListCoding();
+  VirtualPlatform platform{*coding};
+};
+
+TEST_F(SnapshotTest, IsAnXmlListOfTimestampDataAndDescription) {
+  EXPECT_EQ(fileText(Array{Dictionary{{"Description", "Snapshot (x)"}}}, "tunnel"),
+            "<?xml version=\"1.0\" encoding=\"UTF-8\"?>\n"
+            "<plist version=\"1.0\">\n"
+            "<dict>\n"
+            "\t<key>Timestamp</key>\n"
+            "\t<string>2012-03-04 13:05:09 +0100</string>\n"
+            "\t<key>Data</key>\n"
+            "\t<array>\n"
+            "\t\t<dict>\n"
+            "\t\t\t<key>Description</key>\n"
+            "\t\t\t<string>Snapshot (x)</string>\n"
+            "\t\t</dict>\n"
+            "\t</array>\n"
+            "\t<key>Description</key>\n"
+            "\t<string>tunnel</string>\n"
+            "</dict>\n"
+            "</plist>\n");
+}
+
+TEST_F(SnapshotTest, AnEmptyHistoryIsAnEmptyArray) {
+  EXPECT_EQ(
+      Value(open(Array()).dictionary("d")),
+      Value(Dictionary{
+          {"Timestamp", "2012-03-04 13:05:09 +0100"}, {"Data", Array()}, {"Description", "d"}}));
+}
+
+TEST_F(SnapshotTest, AnEmptyDescriptionIsAnEmptyString) {
+  EXPECT_EQ(open(Array()).dictionary("")["Description"], Value(""));
+}
+
+TEST_F(SnapshotTest, WithoutSaveContentsThereIsATimestampOnly) {
+  EXPECT_EQ(Value(open(Value()).dictionary("lost")),
+            Value(Dictionary{{"Timestamp", "2012-03-04 13:05:09 +0100"}}));
+  EXPECT_TRUE(open(Value()).file(*coding, "lost"));
+}
+
+TEST_F(SnapshotTest, TheTimestampIsThatOfTheOpening) {
+  const Snapshot snapshot = open(Array());
+  platform.clock().setNow(kOpened + 40s);
+  EXPECT_EQ(snapshot.dictionary("")["Timestamp"], Value("2012-03-04 13:05:09 +0100"));
+}
+
+TEST_F(SnapshotTest, TheFileNameIsThatOfTheSaving) {
+  const Snapshot snapshot = open(Array());
+  platform.clock().setNow(kOpened + 40'999ms);
+  EXPECT_TRUE(snapshot.save(platform, ""));
+  EXPECT_THAT(
+      paths(),
+      ElementsAre("/var/mobile/Library/Logs/CrashReporter/KestroSnapshot-1330862749.kestro"));
+  EXPECT_THAT(platform.systemLog().lines(), IsEmpty());
+}
+
+TEST_F(SnapshotTest, TimesBefore1970HaveWholeSecondsToo) {
+  EXPECT_EQ(snapshotPath(Moment(-1ms)),
+            "/var/mobile/Library/Logs/CrashReporter/KestroSnapshot--1.kestro");
+}
+
+TEST_F(SnapshotTest, TheLaterOfTwoInOneSecondStays) {
+  ASSERT_TRUE(open(Array()).save(platform, "first"));
+  platform.clock().setNow(kOpened + 999ms);
+  ASSERT_TRUE(open(Array()).save(platform, "second"));
+  ASSERT_THAT(paths(), ElementsAre(kPathWhenOpened));
+  const Bytes& file = platform.deviceRoot().files().begin()->second;
+  EXPECT_THAT(std::string(file.begin(), file.end()), HasSubstr("<string>second</string>"));
+}
+
+TEST_F(SnapshotTest, AFailedWriteHasItsLine) {
+  platform.deviceRoot().setWriteFailure("no such directory");
+  EXPECT_FALSE(open(Array()).save(platform, ""));
+  EXPECT_THAT(
+      platform.systemLog().lines(),
+      ElementsAre(RecordingSystemLog::Line{
+          LogPriority::Error, std::string("Unable to write snapshot to ") + kPathWhenOpened}));
+}
+
+TEST_F(SnapshotTest, WhatCannotBeSerialisedIsAFailedWrite) {
+  const Array outOfRange{Value::date(Moment(std::chrono::hours(1'000'000)))};  // the year 2084
+  EXPECT_FALSE(open(outOfRange).file(*coding, ""));
+  EXPECT_FALSE(open(outOfRange).save(platform, ""));
+  EXPECT_EQ(platform.systemLog().lines().size(), 1U);
+  EXPECT_THAT(paths(), IsEmpty());
+}
+
+TEST_F(SnapshotTest, ABadTextIsReplacedAndTheRestSaved) {
+  const std::string file =
+      fileText(Array{Dictionary{{"Display", Dictionary{{"A", "x\xFF"}, {"B", "good"}}}}}, "\0!"sv);
+  EXPECT_THAT(file, HasSubstr("<string>x\uFFFD</string>"));
+  EXPECT_THAT(file, HasSubstr("<string>good</string>"));
+  EXPECT_THAT(file, HasSubstr("<string>\uFFFD!</string>"));
+}
+
+TEST_F(SnapshotTest, TheDeepestMessageIsSavedAllTheSame) {
+  Array message;
+  for (int level = 1; level < 128; ++level) message = Array{message};
+  EXPECT_TRUE(open(Array{Dictionary{{"DisplayState", message}}}).file(*coding, ""));
+}
+
+TEST_F(SnapshotTest, KeepsACopyOfTheSaveContents) {
+  Array history{"before"};
+  const Snapshot snapshot = open(history);
+  history.append("after");
+  EXPECT_EQ(snapshot.entries().size(), 1U);
+  EXPECT_EQ(snapshot.dictionary("")["Data"], Value(Array{"before"}));
+}
+
+TEST_F(SnapshotTest, ListsItsEntriesByTheirDescriptions) {
+  const Snapshot snapshot =
+      open(Array{Dictionary{{"Description", "Snapshot (x)"}}, Dictionary(), "no entry"});
+  ASSERT_EQ(snapshot.entries().size(), 3U);
+  EXPECT_EQ(entryDescription(snapshot.entries()[0]), "Snapshot (x)");
+  EXPECT_EQ(entryDescription(snapshot.entries()[1]), "");
+  EXPECT_EQ(entryDescription(snapshot.entries()[2]), "");
+  EXPECT_TRUE(open(Value()).entries().empty());
+}
+
+// --- Reading
+
+class SnapshotReadingTest : public SnapshotTest {
+ protected:
+  /// Why a text is no snapshot; "(accepted)" when it is one.
+  std::string refusal(std::string_view text) {
+    const auto snapshot = parseSnapshot(*coding, Bytes(text.begin(), text.end()));
+    return snapshot ? "(accepted)" : snapshot.error().message;
+  }
+};
+
+TEST_F(SnapshotReadingTest, ReadsWhatWasWritten) {
+  const Array history{Dictionary{{"DisplayState", Value::data({1, 2, 3})}}};
+  const auto read = parseSnapshot(*coding, open(history).file(*coding, "d").value());
+  ASSERT_TRUE(read);
+  EXPECT_EQ(Value(*read), Value(open(history).dictionary("d")));
+}
+
+TEST_F(SnapshotReadingTest, RefusesWhatIsNoSnapshot) {
+  EXPECT_THAT(refusal(""), HasSubstr("property list"));
+  EXPECT_THAT(refusal("garbage"), HasSubstr("property list"));
+  EXPECT_EQ(refusal("<plist version=\"1.0\"><array/></plist>"),
+            "no snapshot: the list is no dictionary but of type array");
+  EXPECT_EQ(refusal("<plist version=\"1.0\"><dict/></plist>"),
+            "no snapshot: it has no \"Timestamp\"");
+  EXPECT_EQ(refusal("<plist version=\"1.0\"><dict><key>Timestamp</key><true/></dict></plist>"),
+            "no snapshot: it has no \"Timestamp\"");
+}
+
+TEST_F(SnapshotReadingTest, EveryCutFileIsRefused) {
+  const std::string file = fileText(Array{Dictionary{{"Description", "x"}}}, "d");
+  const std::size_t end = file.rfind("</plist>") + 8;
+  for (std::size_t length = 0; length < end; ++length) {
+    EXPECT_NE(refusal(file.substr(0, length)), "(accepted)") << length;
+  }
+  EXPECT_EQ(refusal(file.substr(0, end)), "(accepted)");
+}
+
+TEST_F(SnapshotReadingTest, FindsTheDlfLog) {
+  const Dictionary dlf{{"Description", "DLF binary (2 bytes)"}, {"DLF", Value::data({7, 8})}};
+  EXPECT_EQ(dlfOfSnapshot({{"Data", Array{Dictionary{{"Display", "x"}}, dlf}}}),
+            Value::data({7, 8}));
+}
+
+TEST_F(SnapshotReadingTest, FindsNoDlfLogWhereThereIsNone) {
+  EXPECT_TRUE(dlfOfSnapshot({}).isNull());
+  EXPECT_TRUE(dlfOfSnapshot({{"Data", "text"}}).isNull());
+  EXPECT_TRUE(dlfOfSnapshot({{"Data", Array{"text", Dictionary{{"DLF", "text"}}}}}).isNull());
+}
+
+}  // namespace
+}  // namespace kestro
