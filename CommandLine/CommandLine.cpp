@@ -11,6 +11,7 @@
 #include "CommandLine/DecodeCommand.h"
 #include "CommandLine/ExitStatus.h"
 #include "CommandLine/RecordCommand.h"
+#include "CommandLine/SnapshotCommand.h"
 #include "CommandLine/WatchCommand.h"
 #include "Platform/Bundle.h"
 #include "Platform/Linux/LinuxPlatform.h"
@@ -19,7 +20,8 @@ namespace kestro {
 namespace {
 
 /// Every command, in the order of the help.
-constexpr std::array kCommands = {addWatchCommand, addDecodeCommand, addRecordCommand};
+constexpr std::array kCommands = {addWatchCommand, addDecodeCommand, addRecordCommand,
+                                  addSnapshotCommand};
 
 constexpr const char* kFooter = R"(Exit status:
   0  done

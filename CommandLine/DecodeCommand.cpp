@@ -1,8 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include "CommandLine/DecodeCommand.h"
 
-#include <fmt/format.h>
-
 #include <CLI/CLI.hpp>
 #include <algorithm>
 #include <memory>
@@ -11,6 +9,7 @@
 #include <vector>
 
 #include "Captures/CaptureReader.h"
+#include "CommandLine/CaptureFeed.h"
 #include "CommandLine/DecodeWriter.h"
 #include "CommandLine/ExitStatus.h"
 #include "CommandLine/OfflinePlatform.h"
@@ -43,24 +42,24 @@ struct DecodeOptions {
 class Decoder {
  public:
   Decoder(const DecodeOptions& options, CaptureReader reader, std::optional<Output> logFile)
-      : _options(options), _reader(std::move(reader)), _platform(std::move(logFile)) {}
+      : _options(options),
+        _feed(options.capture, std::move(reader)),
+        _platform(std::move(logFile)) {}
 
   int run() {
-    const auto generator = LogGenerator::generatorFromTechnology(_platform, _reader.technology());
-    if (!generator) {
-      complain(fmt::format("{}: nothing here decodes the technology {}", _options.capture,
-                           _reader.technology()));
-      return kExitNothingDone;
-    }
+    const auto generator = _feed.makeGenerator(_platform);
+    if (!generator) return kExitNothingDone;
     const std::unique_ptr<DecodeWriter> writer = makeWriter();
     Replay replay(*generator, _platform.clock(),
                   {.refreshInterval = durationOfSeconds(_options.refreshSeconds)},
                   [&](const ReplayRefresh& refresh) { writer->refreshed(refresh); });
     writer->begin();
-    if (!feedMessages(replay)) return kExitNothingDone;
+    while (_output.failureMessage().empty() && _feed.feedNext(replay)) {
+    }
+    if (_feed.status() == kExitNothingDone) return kExitNothingDone;
     replay.finish();
-    writer->finish({.technology = _reader.technology(),
-                    .messages = _reader.messageCount(),
+    writer->finish({.technology = _feed.technology(),
+                    .messages = _feed.messageCount(),
                     .display = replay.display()});
     return finish();
   }
@@ -69,36 +68,6 @@ class Decoder {
   [[nodiscard]] std::unique_ptr<DecodeWriter> makeWriter() {
     const auto& formats = decodeFormats();
     return std::ranges::find(formats, _options.format, &DecodeFormat::name)->makeWriter(_output);
-  }
-
-  /// Feeds the capture up to its end or to where it is damaged; false when that yields nothing.
-  [[nodiscard]] bool feedMessages(Replay& replay) {
-    while (_output.failureMessage().empty()) {
-      const auto next = _reader.next();
-      if (!next) {
-        complain(next.error().message);
-        _status = kExitPartlyDone;
-        return _reader.messageCount() > 0;
-      }
-      if (!*next) return true;
-      feed(replay, **next);
-    }
-    return true;
-  }
-
-  void feed(Replay& replay, const RecordedMessage& message) {
-    if (message.isCut()) {
-      return skip(message, fmt::format("only {} of its {} bytes were recorded",
-                                       message.bytes.size(), message.originalLength));
-    }
-    const auto outcome =
-        replay.feed({.number = message.number, .time = message.time, .bytes = message.bytes});
-    if (!outcome) skip(message, outcome.error().message);
-  }
-
-  void skip(const RecordedMessage& message, const std::string& reason) {
-    complain(fmt::format("{}: message {}: {}", _options.capture, message.number, reason));
-    _status = kExitPartlyDone;
   }
 
   /// Hands the outputs to the system; the exit status.
@@ -112,14 +81,13 @@ class Decoder {
       complain(logged.error().message);
       return kExitNothingDone;
     }
-    return _status;
+    return _feed.status();
   }
 
   const DecodeOptions& _options;
-  CaptureReader _reader;
+  CaptureFeed _feed;
   OfflinePlatform _platform;
   Output _output = Output::standardOutput();
-  ExitStatus _status = kExitDone;
 };
 
 int runDecode(const DecodeOptions& options) {

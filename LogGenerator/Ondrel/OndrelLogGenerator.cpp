@@ -34,6 +34,10 @@ std::uint64_t reportTime(const Clock& clock) {
 
 }  // namespace
 
+ByteView exportedPart(ByteView collected) noexcept {
+  return collected.size() < kSmallestExportedBuffer ? ByteView() : collected.subspan(1);
+}
+
 void OndrelLogGenerator::handOverCollected(Dictionary& state) {
   state.set(kStateDisplayState, Value::data(std::exchange(_binData, {})));
 }
@@ -63,9 +67,8 @@ std::optional<Bytes> OndrelLogGenerator::generateDlfFromState(const Dictionary& 
           "Got wrong class writing history to DLF; aborting writing the DLF file");
       return std::nullopt;
     }
-    const ByteView bytes = packets.bytes();
-    if (bytes.size() < kSmallestExportedBuffer) continue;
-    dlf->insert(dlf->end(), bytes.begin() + 1, bytes.end());
+    const ByteView bytes = exportedPart(packets.bytes());
+    dlf->insert(dlf->end(), bytes.begin(), bytes.end());
   }
   return dlf;
 }

@@ -14,6 +14,10 @@ inline constexpr std::string_view kStateTemplate = "Template";
 /// Keys and texts of the element that save contents gain for the DLF log.
 inline constexpr std::string_view kSaveContentsDlf = "DLF";
 
+/// What a DLF log holds of the packets that were collected between two refreshes: all but the first
+/// byte. Fewer than 2 bytes are not worth an export.
+[[nodiscard]] ByteView exportedPart(ByteView collected) noexcept;
+
 /// Collects the raw packets between two refreshes and exports the history as a DLF log: a version
 /// report, then the packets of every history entry as they were collected.
 class OndrelLogGenerator : public LogGenerator {
