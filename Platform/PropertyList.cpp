@@ -480,6 +480,11 @@ void Dictionary::setValueAt(std::size_t index, Value value) noexcept {
   _object->values[index] = std::move(value);
 }
 
+std::span<Value> Dictionary::valuesToRewrite() noexcept {
+  if (_object == nullptr) return {};
+  return _object->values;
+}
+
 void Dictionary::swapValues(std::vector<Value>& values) noexcept {
   if (_object != nullptr) _object->values.swap(values);
 }

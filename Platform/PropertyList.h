@@ -337,6 +337,8 @@ class Dictionary {
   [[nodiscard]] const Value& keyAt(std::size_t index) const noexcept;
   [[nodiscard]] const Value& valueAt(std::size_t index) const noexcept;
   void setValueAt(std::size_t index, Value value) noexcept;
+  /// The values in the order of their keys, to be written over. Valid until a key comes or goes.
+  [[nodiscard]] std::span<Value> valuesToRewrite() noexcept;
   /// Exchanges all values at once; there must be as many as keys.
   void swapValues(std::vector<Value>& values) noexcept;
   /// Whether this dictionary's keys are the very list `keys` (not merely equal ones).

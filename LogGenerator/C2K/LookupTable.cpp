@@ -7,6 +7,18 @@ namespace {
 constexpr std::string_view kTargetKey = "key";
 constexpr std::string_view kTargetDictionary = "dict";
 
+/// A target's two parts. Targets made here have them in this order; others are searched.
+const Value& keyOf(const Dictionary& target) {
+  static const Value name(kTargetKey);
+  const bool isFirst = target.size() > 0 && target.keyAt(0) == name;
+  return isFirst ? target.valueAt(0) : target[kTargetKey];
+}
+Dictionary displayOf(const Dictionary& target) {
+  static const Value name(kTargetDictionary);
+  const bool isSecond = target.size() > 1 && target.keyAt(1) == name;
+  return (isSecond ? target.valueAt(1) : target[kTargetDictionary]).dictionary();
+}
+
 }  // namespace
 
 void LookupTable::addTarget(const Value& name, const Value& key, const Dictionary& display) {
@@ -19,8 +31,8 @@ void LookupTable::addTarget(const Value& name, const Value& key, const Dictionar
 void LookupTable::store(LookupName& name, const Value& value) const {
   for (const Value& element : targetsOf(name)) {
     const Dictionary target = element.dictionary();
-    Dictionary display = target[kTargetDictionary].dictionary();
-    const Value& key = target[kTargetKey];
+    Dictionary display = displayOf(target);
+    const Value& key = keyOf(target);
     if (display.isNull() || !key.isText()) return;
     name.displayHint = display.set(key, value, name.displayHint);
   }

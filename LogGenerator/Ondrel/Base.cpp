@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "LogGenerator/Ondrel/Base.h"
 
+#include <algorithm>
 #include <array>
 
 #include "LogGenerator/ArrayLock.h"
@@ -51,6 +52,8 @@ std::vector<std::string> CodeDictionary::keys() const {
 
 // --- Base ----------------------------------------------------------------------------------------
 
+Base::Base(Platform& platform) : _platform(platform), _systemLog(platform.systemLog()) {}
+
 void Base::initWithDictCodeDict(ClassDictionary& sections, CodeDictionary& codes) {
   sections.insert_or_assign(std::string(getSectionName()), this);
   updateLogCodeDict(codes);
@@ -69,10 +72,9 @@ void Base::updateLogCodeDict(CodeDictionary& codes) {
 
 std::int16_t Base::lookUpECNO(std::uint32_t linear) noexcept {
   if (linear >= kEcnoCeiling) return 0;
-  for (const EcnoRow& row : kEcnoTable) {
-    if (linear > row.above) return row.decibels;
-  }
-  return 0;
+  const auto row = std::ranges::partition_point(
+      kEcnoTable, [linear](const EcnoRow& candidate) { return linear <= candidate.above; });
+  return row == kEcnoTable.end() ? std::int16_t{0} : row->decibels;
 }
 
 std::vector<Value> Base::takeElementsOfArray(Array& array) {
@@ -84,8 +86,6 @@ void Base::replaceArrayWith(Array& array, std::vector<Value> elements) {
   const ArrayLockScope lock;
   array.assign(std::move(elements));
 }
-
-SystemLog& Base::systemLog() const { return _platform.systemLog(); }
 
 void Base::reportUnknownCode(LogCode code) const {
   systemLog().log(LogPriority::Error, "Received an unknown log message: {}", code);

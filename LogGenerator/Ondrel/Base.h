@@ -84,10 +84,10 @@ class Base {
   static void replaceArrayWith(Array& array, std::vector<Value> elements);
 
  protected:
-  explicit Base(Platform& platform) noexcept : _platform(platform) {}
+  explicit Base(Platform& platform);
 
   [[nodiscard]] Platform& platform() const noexcept { return _platform; }
-  [[nodiscard]] SystemLog& systemLog() const;
+  [[nodiscard]] SystemLog& systemLog() const noexcept { return _systemLog; }
   /// The section as a list or as a dictionary; a null handle before the template was processed, and
   /// when the template has a container of the other kind there.
   [[nodiscard]] Array sectionList() const { return _sectionRef.lock().array(); }
@@ -97,6 +97,7 @@ class Base {
 
  private:
   Platform& _platform;
+  SystemLog& _systemLog;
   WeakValue _sectionRef;
 };
 

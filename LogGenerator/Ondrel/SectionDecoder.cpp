@@ -47,7 +47,7 @@ CatalogueEntry SectionDecoder::catalogueCode(LogCode code) const {
 }
 
 void SectionDecoder::apply(BoundReading& bound, PacketView packet) {
-  Dictionary section = sectionDictionary();
+  Dictionary section = sectionDictionary();  // null for a list
   bound.fields.fill(section, packet);
   for (BoundTable& table : bound.tables) {
     if (table.reading().use == RowsUse::Noted) {
@@ -62,8 +62,9 @@ void SectionDecoder::apply(BoundReading& bound, PacketView packet) {
 }
 
 void SectionDecoder::noteRows(BoundTable& table, PacketView packet) {
-  std::vector<Value> rows = table.rows(packet, {}, this);
+  std::vector<Value> rows = table.rows(packet, std::move(table.spareRows), this);
   willPublish(table.reading(), packet, rows);
+  table.spareRows = std::move(rows);
 }
 
 void SectionDecoder::applyToList(BoundTable& table, PacketView packet) {

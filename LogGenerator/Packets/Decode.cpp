@@ -82,8 +82,30 @@ BoundFields::Presence BoundFields::readValues(PacketView packet, const RecordPos
   return present;
 }
 
+bool BoundFields::rewrite(std::span<Value> values, PacketView packet,
+                          const RecordPosition& position, const FieldSupplier* supplier) const {
+  for (std::size_t i = 0; i < values.size(); ++i) {
+    const BoundField& field = _fields[i];
+    if (const Value* kept = field.keptText(packet, position)) {
+      values[i] = *kept;
+      continue;
+    }
+    Value value = otherValue(field, packet, position, supplier);
+    if (value.isNull()) return false;
+    values[i] = std::move(value);
+  }
+  return true;
+}
+
 void BoundFields::makeRow(Value& row, PacketView packet, const RecordPosition& position,
                           const FieldSupplier* supplier) {
+  if (_allKeys != nullptr && row.isOnlyReference()) {
+    Dictionary earlier = row.dictionary();
+    if (earlier.hasKeyList(*_allKeys) &&
+        rewrite(earlier.valuesToRewrite(), packet, position, supplier)) {
+      return;
+    }
+  }
   const KeyList& keys = keysOf(readValues(packet, position, supplier));
   if (row.isOnlyReference()) {
     Dictionary earlier = row.dictionary();

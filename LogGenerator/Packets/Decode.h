@@ -91,6 +91,10 @@ class BoundFields {
  private:
   using Presence = std::uint64_t;
 
+  /// Writes over the values of a row that shows every field. False when one is not shown this time:
+  /// what the row holds is of no more use then.
+  bool rewrite(std::span<Value> values, PacketView packet, const RecordPosition& position,
+               const FieldSupplier* supplier) const;
   /// Collects the values of the fields that are shown, and says which they are.
   Presence readValues(PacketView packet, const RecordPosition& position,
                       const FieldSupplier* supplier);
@@ -117,6 +121,9 @@ class BoundTable {
   /// earlier packet may be given away for use. Throws ArrayOutOfBoundsException as `recordAt` does.
   [[nodiscard]] std::vector<Value> rows(PacketView packet, std::vector<Value> earlierRows = {},
                                         const FieldSupplier* supplier = nullptr);
+
+  /// Rows that stand in no display, kept for the next packet to write anew.
+  std::vector<Value> spareRows;
 
  private:
   const ListReading* _reading;

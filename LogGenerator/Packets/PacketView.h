@@ -24,13 +24,18 @@ class PacketView {
 
   /// The unsigned little-endian integer of `width` bytes (1 to 4) at `offset`.
   [[nodiscard]] std::uint32_t read(std::size_t offset, unsigned width) const noexcept {
-    if (offset < _bytes.size() && _bytes.size() - offset >= sizeof(std::uint32_t)) {
-      std::uint32_t word;
-      static_assert(std::endian::native == std::endian::little);
-      std::memcpy(&word, _bytes.data() + offset, sizeof(word));
-      return width == sizeof(word) ? word : word & ((1U << (8 * width)) - 1);
+    return word(offset) & (0xFFFFFFFFU >> (32 - 8 * width));
+  }
+
+  /// The four bytes from `offset` on, the first in the low bits.
+  [[nodiscard]] std::uint32_t word(std::size_t offset) const noexcept {
+    static_assert(std::endian::native == std::endian::little);
+    std::uint32_t bytes;
+    if (offset < _bytes.size() && _bytes.size() - offset >= sizeof(bytes)) {
+      std::memcpy(&bytes, _bytes.data() + offset, sizeof(bytes));
+      return bytes;
     }
-    return readNearEnd(offset, width);
+    return wordNearEnd(offset);
   }
 
   [[nodiscard]] std::uint8_t u8(std::size_t offset) const noexcept {
@@ -42,12 +47,11 @@ class PacketView {
   [[nodiscard]] std::uint32_t u32(std::size_t offset) const noexcept { return read(offset, 4); }
 
  private:
-  [[nodiscard]] std::uint32_t readNearEnd(std::size_t offset, unsigned width) const noexcept {
-    std::uint32_t word = 0;
-    for (unsigned i = 0; i < width; ++i) {
-      word |= static_cast<std::uint32_t>(u8(offset + i)) << (8 * i);
-    }
-    return word;
+  [[nodiscard]] std::uint32_t wordNearEnd(std::size_t offset) const noexcept {
+    if (offset >= _bytes.size()) return 0;
+    std::uint32_t bytes = 0;
+    std::memcpy(&bytes, _bytes.data() + offset, _bytes.size() - offset);  // at most three bytes
+    return bytes;
   }
 
   ByteView _bytes;

@@ -37,10 +37,9 @@ struct RecordPosition {
 /// The place's bits as they stand in the packet, without regard to their sign.
 [[nodiscard]] inline std::uint32_t readBits(const Place& place, PacketView packet,
                                             const RecordPosition& position) {
-  std::uint32_t word = packet.read(offsetOf(place, position), place.width);
+  std::uint32_t word = packet.word(offsetOf(place, position));
   if (place.isBigEndian) word = __builtin_bswap32(word) >> (8 * (4 - place.width));
-  word >>= place.firstBit;
-  return place.bitCount == 32 ? word : word & ((1U << place.bitCount) - 1);
+  return word >> place.firstBit & (0xFFFFFFFFU >> (32 - place.bitCount));
 }
 
 /// The bits as a number, signed where the place is.
@@ -93,6 +92,7 @@ template <class Visit>
 void forEachRecord(const RecordTable& table, PacketView packet, Visit&& visit) {
   const std::size_t count = recordCount(table, packet);
   const std::size_t bound = recordBound(table, packet);
+  if (table.keepsNone && count <= bound) return;
   RecordPosition position = firstRecord(table, packet);
   for (std::size_t index = 0; index < count; ++index) {
     if (index >= bound) throw ArrayOutOfBoundsException();

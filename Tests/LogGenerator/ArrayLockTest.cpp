@@ -14,6 +14,7 @@ namespace {
 class ArrayLockTest : public ::testing::Test {
  protected:
   void SetUp() override { ArrayLock::initialize(); }
+  void TearDown() override { ArrayLock::initialize(); }
 
   /// Whether another thread gets the lock within a tenth of a second. Where it does not, that
   /// thread waits for good: by the nesting rule nobody can give a lock back that is held once too

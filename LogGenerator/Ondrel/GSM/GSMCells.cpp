@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "LogGenerator/Ondrel/GSM/GSMCells.h"
 
+#include <algorithm>
+
 #include "LogGenerator/Ondrel/GSM/CellSets.h"
 
 namespace kestro {
@@ -245,18 +247,20 @@ constexpr Section kMobileAllocationSection = {
 void NeighboringCells::willPublish(const ListReading& list, PacketView packet,
                                    std::vector<Value>& rows) {
   if (list.use != RowsUse::Noted) return;
-  _arfcnToBsic.clear();
+  _bsicList.clear();
   for (std::size_t i = 0; i < rows.size(); ++i) {
     const RecordPosition entry = recordAt(list.table, packet, i);
-    _arfcnToBsic.insert_or_assign(readBits(kBSICEntryARFCN, packet, entry),
-                                  rows[i].dictionary()[kBSIC]);
+    _bsicList.push_back({readBits(kBSICEntryARFCN, packet, entry), rows[i].dictionary()[kBSIC]});
   }
 }
 
 Value NeighboringCells::supply(const Field& /*field*/, PacketView packet,
                                const RecordPosition& position) const {
-  const auto known = _arfcnToBsic.find(readBits(kNeighbourARFCN, packet, position));
-  return known == _arfcnToBsic.end() ? Value() : known->second;
+  const std::uint32_t arfcn = readBits(kNeighbourARFCN, packet, position);
+  // Of several entries for one frequency the last counts.
+  const auto known = std::find_if(_bsicList.rbegin(), _bsicList.rend(),
+                                  [arfcn](const NotedCell& cell) { return cell.arfcn == arfcn; });
+  return known == _bsicList.rend() ? Value() : known->bsic;
 }
 
 }  // namespace kestro

@@ -4,7 +4,6 @@
 #pragma once
 
 #include <cstdint>
-#include <unordered_map>
 #include <vector>
 
 #include "LogGenerator/Ondrel/CellMonitor.h"
@@ -48,7 +47,11 @@ class NeighboringCells : public CellMonitorDecoder {
                              const RecordPosition& position) const override;
 
  private:
-  std::unordered_map<std::uint32_t, Value> _arfcnToBsic;  ///< the last list, replaced as a whole
+  struct NotedCell {
+    std::uint32_t arfcn;
+    Value bsic;
+  };
+  std::vector<NotedCell> _bsicList;  ///< the last list, in its order
 };
 
 /// The GSM cells of the idle-mode ranking.
