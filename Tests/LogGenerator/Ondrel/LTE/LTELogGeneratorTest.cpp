@@ -134,6 +134,50 @@ TEST_F(LTELogGeneratorTest, OnePacketUpdatesAllSectionsThatReadIt) {
   EXPECT_THAT(section("02;Neighbors", kSections[3]).array(), SizeIs(1));
 }
 
+TEST_F(LTELogGeneratorTest, AnIntraFrequencyPacketWithoutCellsEmptiesBothLists) {
+  receive(packet(0xB179).u16(17, 1300).u8(27, 1).u8(28, 1).u16(29, 5).u16(35, 6));
+  receive(packet(0xB179).u16(17, 6300).length(29));
+  EXPECT_EQ(section("01;Serving Cell", kSections[1]).dictionary()["E-ARFCN"], Value("6300"));
+  EXPECT_THAT(section("02;Neighbors", kSections[2]).array(), IsEmpty());
+  EXPECT_THAT(section("02;Neighbors", kSections[3]).array(), IsEmpty());
+}
+
+TEST_F(LTELogGeneratorTest, NeighborAndReselectionPacketsUpdateTwoSectionsInOrder) {
+  static_cast<void>(generator->generateLogUsingState(state));
+  static_cast<void>(platform.systemLog().take());
+  receive(packet(0xB180).u8(13, 2).u16(21, 301).length(41));
+  EXPECT_EQ(section("02;Neighbors", kSections[5]).dictionary()["Version"], Value("2"));
+  EXPECT_THAT(section("02;Neighbors", kSections[6]).array(), SizeIs(1));
+  const auto neighborLines = platform.systemLog().take();
+  ASSERT_THAT(neighborLines, SizeIs(9));  // the list's own lines follow: a count, a cell, 5 levels
+  EXPECT_EQ(neighborLines[0], traceLine("Neighbor Measurements"));
+  EXPECT_EQ(neighborLines[1], traceLine("Neighbor Cells List"));
+
+  receive(packet(0xB186).u8(13, 3).u16(19, 1).u16(21, 6).length(29));
+  EXPECT_EQ(section("03;Reselection", kSections[7]).dictionary()["Version"], Value("3"));
+  EXPECT_THAT(section("03;Reselection", kSections[8]).array(), SizeIs(1));
+  EXPECT_THAT(platform.systemLog().take(), ElementsAre(traceLine("Reselection Candidates"),
+                                                       traceLine("Reselection Candidates List")));
+}
+
+TEST_F(LTELogGeneratorTest, CodesOfNoDecoderAreCollectedInSilence) {
+  static_cast<void>(generator->generateLogUsingState(state));
+  static_cast<void>(platform.systemLog().take());
+  receive(packet(0xB178).length(60));
+  EXPECT_THAT(platform.systemLog().take(), IsEmpty());
+  static_cast<void>(generator->generateLogUsingState(state));
+  EXPECT_EQ(state[kStateDisplayState].bytes().size(), 60U);
+}
+
+TEST_F(LTELogGeneratorTest, AnExtraPacketOfCodeTwoCarriesThePacketDataContexts) {
+  Bytes message = {0xFF, 0, 0, 0x02, 0x00, 0, 0, 0, 0, 0, 0, 0, 0};
+  for (const char byte : std::string_view("<plist><array><string>up</string></array></plist>")) {
+    message.push_back(static_cast<std::uint8_t>(byte));
+  }
+  generator->updateStateWithData(state, message);
+  EXPECT_EQ(section("05;Packet Data", kSections[10]), Value(Array{"up"}));
+}
+
 // --- The template --------------------------------------------------------------------------------
 
 struct Placed {

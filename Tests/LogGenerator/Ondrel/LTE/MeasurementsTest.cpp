@@ -186,6 +186,15 @@ TEST_F(DetectedCellsTest, NeedsTwentyNineBytes) {
   EXPECT_THAT(list(), SizeIs(3));
 }
 
+TEST_F(DetectedCellsTest, ReportsOtherCodes) {
+  decode(intraFrequency());
+  takeLines();
+  decode(intraFrequency().bytes(), 0xB17A);
+  EXPECT_THAT(list(), SizeIs(3));
+  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Detected Cells"),
+                                       errorLine("Received an unknown log message: 45434")));
+}
+
 // --- 0xB17F: serving-cell measurement ------------------------------------------------------------
 
 class ServingCellMeasurementTest : public DecoderFixture<ServingCellMeasurement> {

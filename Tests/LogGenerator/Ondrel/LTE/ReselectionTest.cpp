@@ -96,6 +96,27 @@ TEST_F(ReselectionCandidatesListTest, ShowsBothKindsOfCdmaAlike) {
                           Pair("Band", "52"), Pair("Channel", "258"), Pair("Pilot", "772")));
 }
 
+TEST_F(ReselectionCandidatesListTest, ShowsBothKindsOfCdmaInOnePacket) {
+  // The second candidate's header, at byte 25, is where the first one's fields begin.
+  decode(packet(0xB186)
+             .u16(19, 2)
+             .u16(21, 6)
+             .u16(23, 3)
+             .u16(25, 0x0107)
+             .u16(27, 4)
+             .u16(29, 0x0209)
+             .u16(31, 300)
+             .u16(33, 400)
+             .u16(35, 500));
+  ASSERT_THAT(list(), SizeIs(2));
+  EXPECT_THAT(row(0),
+              ElementsAre(Pair("Candidate Priority", "6"), Pair("Candidate RAT Type", "CDMA1XRTT"),
+                          Pair("Band", "7"), Pair("Channel", "521"), Pair("Pilot", "300")));
+  EXPECT_THAT(row(1),
+              ElementsAre(Pair("Candidate Priority", "263"), Pair("Candidate RAT Type", "CDMAHRPD"),
+                          Pair("Band", "9"), Pair("Channel", "400"), Pair("Pilot", "500")));
+}
+
 TEST_F(ReselectionCandidatesListTest, ShowsNoFieldsOfOtherTechnologies) {
   for (const unsigned technology : {5U, 7U, 255U, 256U, 65535U}) {
     decode(candidate(technology));
