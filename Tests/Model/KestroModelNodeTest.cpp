@@ -81,6 +81,12 @@ TEST_F(KestroModelNodeTest, SortsTenBeforeTwoWithoutPadding) {
   EXPECT_THAT(names(), ElementsAre("C", "B"));
 }
 
+TEST_F(KestroModelNodeTest, SortsTenBeforeOneWithoutPadding) {
+  // The digit comes before the semicolon.
+  build(Dictionary{{"_sorted", "_sorted"}, {"1;168", "x"}, {"10;12", "y"}, {"11;4", "z"}});
+  EXPECT_THAT(names(), ElementsAre("12", "4", "168"));
+}
+
 TEST_F(KestroModelNodeTest, SortsByUnsignedBytes) {
   build(Dictionary{{"_sorted", "_sorted"}, {"\xC3\x84", "x"}, {"z", "y"}, {"Z", "w"}});
   EXPECT_THAT(names(), ElementsAre("Z", "z", "\xC3\x84"));

@@ -120,6 +120,14 @@ TEST_F(ForwardThroughputTest, AFallingCountIsANegativeRate) {
   EXPECT_EQ(text("kFLDataRate"), "-6.00 kbps");
 }
 
+TEST_F(ForwardThroughputTest, ACounterThatWrapsIsANegativeRate) {
+  receive(forward(1, 0xFFFFFFFF));
+  receive(forward(2, 1));
+  EXPECT_EQ(text("kFLDataRate"), "-4294967294.00 kbps");
+  receive(forward(3, 0xFFFFFFFF));
+  EXPECT_EQ(text("kFLDataRate"), "4294967294.00 kbps");
+}
+
 TEST_F(ForwardThroughputTest, RoundsToTwoDecimals) {
   receive(forward(0, 0));
   receive(forward(3, 2));
@@ -219,6 +227,14 @@ TEST_F(ReverseThroughputTest, KeepsTheRateWhileTheSequenceStands) {
   receive(reverse(2).u32(18 + 24 * 4, 3));
   receive(reverse(2).u32(18 + 24 * 4, 9));
   EXPECT_EQ(text("kRLDataRate"), "3.00 kbps");
+}
+
+TEST_F(ReverseThroughputTest, SequenceAndCountersMayWrap) {
+  receive(reverse(0xFFFFFFFE).u32(18 + 24 * 4, 0xFFFFFFFF));
+  receive(reverse(2).u32(18 + 24 * 4, 3));
+  EXPECT_EQ(text("kRLDataRate"), "-1073741823.00 kbps");  // -4294967292 counts in 4 steps
+  EXPECT_EQ(state["RLDataSeqNum"], Value::integer(2));
+  EXPECT_EQ(extraInfo()["RLDataSeqNum2"], Value::integer(0xFFFFFFFE));
 }
 
 TEST_F(ReverseThroughputTest, LeavesTheForwardLinkAlone) {

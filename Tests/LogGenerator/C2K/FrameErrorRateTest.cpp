@@ -59,6 +59,14 @@ TEST_F(FrameErrorRateTest, IsKeptInSinglePrecision) {
   EXPECT_EQ(state["TrafficFER"], Value::real(0.2953125238418579));
 }
 
+TEST_F(FrameErrorRateTest, IsShownInSinglePrecision) {
+  // 0.08 as a float is 0.0799999982; 0.984375 of it is 0.0787499994, and 100 times that, rounded to
+  // a float, is 7.875 exactly. A double would be 7.87499994 and show 7.87.
+  state.set("TrafficFER", Value::real(0.08));
+  receive(goodFrame());
+  EXPECT_EQ(text("k1xTrafficFER"), "7.88%");
+}
+
 TEST_F(FrameErrorRateTest, ForgetsAValueThatIsNoNumber) {
   for (const Value& other : {Value("1"), Value(Dictionary()), Value::boolean(true)}) {
     state.set("TrafficFER", other);

@@ -102,10 +102,28 @@ TEST_F(OneXStatusTest, NamesEveryState) {
   EXPECT_EQ(text("k1xDeviceState"), "[Bad Value 255]");
 }
 
-TEST_F(OneXStatusTest, NamesBandClassesOfBothReceivers) {
-  receive(status(stateOf(kTraffic), radio().u8(4, 12).u8(5, 13), activeSet(0, 12)));
-  EXPECT_EQ(text("k1xRx0BandClass"), "800 MHz European PAMR band [12]");
-  EXPECT_EQ(text("k1xRx1BandClass"), "[Bad Value 13]");
+TEST_F(OneXStatusTest, NamesEveryBandClassOfBothReceivers) {
+  const char* const names[] = {"800 MHz cellular band [0]",
+                               "1.8 to 2.0GHz PCS band [1]",
+                               "872 to 960MHz TACS band [2]",
+                               "832 to 925MHz JTACS band [3]",
+                               "1.75 to 1.87GHz Korean PCS band [4]",
+                               "450MHz band [5]",
+                               "2GHz band [6]",
+                               "700MHz band [7]",
+                               "1800 MHz band [8]",
+                               "900 MHzband [9]",
+                               "Secondary 800 MHz band [10]",
+                               "400 MHz European PAMR band [11]",
+                               "800 MHz European PAMR band [12]",
+                               "[Bad Value 13]"};
+  constexpr unsigned kCount = std::size(names);
+  for (unsigned value = 0; value < kCount; ++value) {
+    const unsigned other = kCount - 1 - value;
+    receive(status(stateOf(kTraffic), radio().u8(4, value).u8(5, other), activeSet(0, 12)));
+    EXPECT_EQ(text("k1xRx0BandClass"), names[value]);
+    EXPECT_EQ(text("k1xRx1BandClass"), names[other]);
+  }
   receive(status(stateOf(kTraffic), radio().u8(4, 255).u8(5, 9), activeSet(0, 12)));
   EXPECT_EQ(text("k1xRx0BandClass"), "[Bad Value 255]");
   EXPECT_EQ(text("k1xRx1BandClass"), "900 MHzband [9]");
@@ -260,6 +278,23 @@ TEST_F(OneXStatusTest, ReportsABadSizeOnlyWhereTheSearchGetsToIt) {
                   warningLine("Log code 0x119c: missing subpacket (ss=1,rf=1,ai=0,fi=0).")));
 }
 
+TEST_F(OneXStatusTest, GetsNoFurtherThanASubPacketOfSizeZero) {
+  const char* const found[] = {"ss=1,rf=0,ai=0,fi=0", "ss=1,rf=1,ai=0,fi=0", "ss=1,rf=1,ai=1,fi=0"};
+  const std::size_t starts[] = {17, 17 + 6, 17 + 6 + 14};
+  for (std::size_t i = 0; i < std::size(starts); ++i) {
+    // Each time the count is the highest that a packet can have.
+    receive(status(kTraffic).u16(starts[i] + 2, 0).u8(14, 255));
+    EXPECT_THAT(takeLines(), ElementsAre(warningLine(std::string("Log code 0x119c: missing "
+                                                                 "subpacket (") +
+                                                     found[i] + ").")));
+  }
+  EXPECT_THAT(shownNames(), IsEmpty());
+  // Behind the last one nothing is looked for.
+  receive(status(kTraffic).u16(17 + 6 + 14 + 12 + 2, 0).u8(14, 255));
+  EXPECT_EQ(text("k1xDeviceState"), "Traffic [8]");
+  EXPECT_THAT(takeLines(), IsEmpty());
+}
+
 TEST_F(OneXStatusTest, AcceptsALastSubPacketThatOverrunsByFewerThanSeventeenBytes) {
   const PacketBytes whole = status(kTraffic);
   const std::size_t lastSize = 17 + 6 + 14 + 12 + 2;
@@ -272,6 +307,25 @@ TEST_F(OneXStatusTest, AcceptsALastSubPacketThatOverrunsByFewerThanSeventeenByte
   EXPECT_THAT(takeLines(), ElementsAre(errorLine("Log code error in subpkt#3: bad size (25)."),
                                        warningLine("Log code 0x119c: missing subpacket "
                                                    "(ss=1,rf=1,ai=1,fi=0).")));
+}
+
+TEST_F(OneXStatusTest, AnyLastSubPacketMayOverrunBySixteenBytesAndByNoMore) {
+  const SubPacketBytes parts[] = {stateOf(kTraffic), radio(), activeSet(0, 12), fingers()};
+  for (std::size_t last = 0; last < std::size(parts); ++last) {
+    std::vector<SubPacketBytes> arranged;
+    for (std::size_t i = 1; i <= std::size(parts); ++i) {
+      arranged.push_back(parts[(last + i) % std::size(parts)]);
+    }
+    const PacketBytes whole = packetOf(0x119C, arranged);
+    const std::size_t size = parts[last].bytes().size();
+    const std::size_t start = whole.bytes().size() - size;
+    for (unsigned overrun = 0; overrun <= 20; ++overrun) {
+      state.remove(kStateDisplay);
+      PacketBytes packet = whole;
+      receive(packet.u16(start + 2, static_cast<unsigned>(size) + overrun));
+      EXPECT_EQ(shownNames().empty(), overrun >= 17) << last << " " << overrun;
+    }
+  }
 }
 
 TEST_F(OneXStatusTest, FieldsPastTheEndReadAsZero) {
@@ -302,6 +356,14 @@ TEST_F(OneXStatusTest, ShowsTheErrorRateOnceMoreAfterTraffic) {
   display().set("k1xTrafficFER", "untouched");
   receive(status(kPaging));
   EXPECT_EQ(text("k1xTrafficFER"), "untouched");
+}
+
+TEST_F(OneXStatusTest, ShowsTheOldErrorRateInSinglePrecision) {
+  // 0.00275 as a float is 0.002749999985, and 100 times that, rounded to a float, 0.27500001. A
+  // double would be 0.2749999985 and show 0.27.
+  state.set("TrafficFER", Value::real(0.00275));
+  receive(status(kPaging));
+  EXPECT_EQ(text("k1xTrafficFER"), "0.28% (old)");
 }
 
 TEST_F(OneXStatusTest, KeepsAnErrorRateThatIsNoNumber) {

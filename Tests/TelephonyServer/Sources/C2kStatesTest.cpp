@@ -66,34 +66,34 @@ TEST(OneXCallProcessingTest, IsCalledAfterAWhileAndLooksForTheSystemAgainBehindT
 class EvdoConnectionTest : public ::testing::Test {
  protected:
   EvdoState advance(bool hasReceiver, Activity activity = Activity::Idle) {
-    _evdo.advance(kStep, hasReceiver, activity);
-    return _evdo.state();
+    evdo.advance(kStep, hasReceiver, activity);
+    return evdo.state();
   }
   void openSession() {
     for (int i = 0; i < 20; ++i) advance(true);
-    ASSERT_EQ(_evdo.session(), EvdoSession::Open);
+    ASSERT_EQ(evdo.session(), EvdoSession::Open);
   }
 
-  EvdoConnection _evdo;
+  EvdoConnection evdo;
 };
 
 TEST_F(EvdoConnectionTest, IsInactiveWithoutTheReceiver) {
   for (int i = 0; i < 10; ++i) EXPECT_EQ(advance(false), EvdoState::Inactive);
-  EXPECT_EQ(_evdo.session(), EvdoSession::Closed);
-  EXPECT_FALSE(_evdo.hasPilot());
+  EXPECT_EQ(evdo.session(), EvdoSession::Closed);
+  EXPECT_FALSE(evdo.hasPilot());
 }
 
 TEST_F(EvdoConnectionTest, SetsASessionUpOnceAndThenRests) {
   const auto states = statesIn(20, [&] { return advance(true); });
   EXPECT_THAT(states, ElementsAre(EvdoState::Acquisition, EvdoState::Sync, EvdoState::Idle,
                                   EvdoState::Access, EvdoState::Connected, EvdoState::Idle));
-  EXPECT_EQ(_evdo.session(), EvdoSession::Open);
+  EXPECT_EQ(evdo.session(), EvdoSession::Open);
 }
 
 TEST_F(EvdoConnectionTest, NegotiatesTheSessionStepByStep) {
   const auto sessions = statesIn(20, [&] {
     advance(true);
-    return _evdo.session();
+    return evdo.session();
   });
   EXPECT_THAT(sessions,
               ElementsAre(EvdoSession::Closed, EvdoSession::Setup, EvdoSession::Negotiation,
@@ -111,7 +111,7 @@ TEST_F(EvdoConnectionTest, ConnectsForDataAndStaysForAWhile) {
 TEST_F(EvdoConnectionTest, KeepsTheSessionThroughACall) {
   openSession();
   EXPECT_EQ(advance(false, Activity::Transfer), EvdoState::Inactive);
-  EXPECT_EQ(_evdo.session(), EvdoSession::Open);
+  EXPECT_EQ(evdo.session(), EvdoSession::Open);
   const auto states = statesIn(5, [&] { return advance(true, Activity::Transfer); });
   EXPECT_THAT(states, ElementsAre(EvdoState::Acquisition, EvdoState::Sync, EvdoState::Idle,
                                   EvdoState::Access, EvdoState::Connected));
