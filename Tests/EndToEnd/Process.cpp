@@ -49,7 +49,9 @@ void readInto(int& descriptor, std::string& text) {
 }  // namespace
 
 Process::Process(std::vector<std::string> arguments, const Options& options) {
-  arguments[0] = std::string(KESTRO_PROGRAM_DIRECTORY "/") + arguments[0];
+  if (!arguments[0].starts_with('/')) {
+    arguments[0] = std::string(KESTRO_PROGRAM_DIRECTORY "/") + arguments[0];
+  }
   if (options.terminal == Terminal::Own) {
     startOnTerminal(arguments, options);
   } else {

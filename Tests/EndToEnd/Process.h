@@ -24,7 +24,8 @@ class Process {
     Terminal terminal = Terminal::None;  ///< Own: all three streams are one, 100 x 40
   };
 
-  /// Starts `arguments[0]` of our programs. Without a terminal, standard input is /dev/null.
+  /// Starts `arguments[0]`, one of our programs or an absolute path. Without a terminal, standard
+  /// input is /dev/null.
   explicit Process(std::vector<std::string> arguments) : Process(std::move(arguments), Options()) {}
   Process(std::vector<std::string> arguments, const Options& options);
   /// Kills the process if it still runs.

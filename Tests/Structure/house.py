@@ -7,7 +7,7 @@ import re
 
 # Headers from outside the project, by what they bring in. The first pattern that matches decides.
 KINDS = (
-    ("qt", r"Q[A-Z]\w*|Qt\w*/.*"),
+    ("qt", r"Q[A-Z]\w*|Qt\w*/.*|ui_\w+\.h"),
     ("property lists", r"plist/.*"),
     ("system log", r"syslog\.h"),
     ("sockets", r"sys/(socket|un)\.h|netinet/.*|arpa/.*|netdb\.h|linux/.*"),
@@ -61,7 +61,8 @@ ROOMS = {
         _COMMAND_LINE, HOSTED | {"command lines", "json", "unicode"}, (LINUX_DOOR,)
     ),
     "App": Room(_APP, CORE | {"qt"}),
-    "App/main.cpp": Room(("App", *_APP), HOSTED | {"qt", "command lines"}, (LINUX_DOOR,)),
+    "App/Options.cpp": Room(("App", *_APP), CORE | {"qt", "command lines"}),
+    "App/Program.cpp": Room(("App", *_APP), HOSTED | {"qt"}, (LINUX_DOOR,)),
 }
 
 

@@ -1,0 +1,218 @@
+// SPDX-License-Identifier: MIT
+#include "App/KestroApp.h"
+
+#include <QAccessible>
+#include <QIcon>
+#include <QPixmap>
+#include <QScreen>
+#include <utility>
+
+#include "Platform/Bundle.h"
+#include "Platform/Clock.h"
+#include "Platform/DeviceRoot.h"
+#include "Platform/Preferences.h"
+
+namespace kestro {
+namespace {
+
+constexpr std::size_t kRoot = 0;
+constexpr std::string_view kRootPath = "/";
+
+QString connecting() { return QStringLiteral("Connecting..."); }
+
+QIcon iconOf(const Bundle& bundle) {
+  const auto contents = bundle.resource("org.kestro.Kestro", "png");
+  QPixmap picture;
+  if (contents) picture.loadFromData(contents->data(), static_cast<uint>(contents->size()));
+  return QIcon(picture);
+}
+
+}  // namespace
+
+KestroApp::KestroApp(int& argumentCount, char** arguments)
+    : QApplication(argumentCount, arguments) {
+  setApplicationName(QStringLiteral("kestro"));
+  setApplicationDisplayName(QStringLiteral("Kestro"));
+  setDesktopFileName(QStringLiteral("org.kestro.Kestro"));
+  connect(this, &QCoreApplication::aboutToQuit, this, [this] { applicationWillTerminate(); });
+}
+
+KestroApp::~KestroApp() { applicationWillTerminate(); }
+
+bool KestroApp::notify(QObject* receiver, QEvent* event) noexcept {
+  return QApplication::notify(receiver, event);
+}
+
+// --- Launch and exit -----------------------------------------------------------------------------
+
+void KestroApp::applicationDidFinishLaunching(Platform& platform, const LaunchOptions& options) {
+  _platform = &platform;
+  _isPlain = options.plain;
+  getRSSIPref();
+  getSaveButtonPref();
+  _model = KestroModel::create(platform, [this] { updateViewControllerFromModel(); });
+  _wasConnected = false;
+  _updateMessage = connecting();
+  createWindow(options);
+  _connectionTimer = platform.mainQueue().scheduleRepeating(kConnectionCheckInterval,
+                                                            [this] { checkConnection(); });
+  if (options.connectsAtLaunch) connectAfterFirstFrame();
+}
+
+void KestroApp::createWindow(const LaunchOptions& options) {
+  PaneHost& host = *this;
+  auto root = std::make_unique<KestroPaneController>(host, nullptr, std::string(kRootPath));
+  root->setStatus(QStringLiteral("Connecting"), true);
+  auto navController = std::make_unique<NavigationController>(std::move(root));
+  navController->setWillShow([this](ViewController& pane, bool animated) {
+    navigationControllerWillShowViewController(pane, animated);
+  });
+  _navController = navController.get();
+  _window = std::make_unique<MainWindow>(std::move(navController));
+  _window->setWindowTitle(QStringLiteral("Kestro"));
+  _window->setWindowIcon(iconOf(_platform->bundle()));
+  placeWindow(options.windowSize);
+  _window->show();
+  _window->setFocus();
+  // The event loop is entered by the platform, which knows of no accessibility.
+  QAccessible::setRootObject(this);
+}
+
+void KestroApp::placeWindow(const std::optional<QSize>& size) {
+  const QRect available = primaryScreen()->availableGeometry();
+  if (!size) {
+    _window->setGeometry(available);
+    _window->setWindowState(Qt::WindowMaximized);
+    return;
+  }
+  QRect frame(QPoint(), *size);
+  frame.moveCenter(available.center());
+  _window->setGeometry(frame);
+}
+
+/// An attempt to connect may take seconds, in which nothing is painted.
+void KestroApp::connectAfterFirstFrame() {
+  const auto once = [this, isDone = std::make_shared<bool>(false)] {
+    if (!std::exchange(*isDone, true)) restartMonitor();
+  };
+  _window->setFirstFrameHandler(once);
+  _platform->mainQueue().postAfter(kFirstFramePatience, once);
+}
+
+void KestroApp::restartMonitor() {
+  if (!_platform) return;
+  _platform->mainQueue().post([this] {
+    if (_model) _model->restartMonitor();
+  });
+}
+
+void KestroApp::applicationWillTerminate() {
+  if (!_platform) return;
+  if (std::exchange(_unsetRSSI, false)) _setGSMRSSI(false);
+  _updateMessage.clear();
+  _connectionTimer.reset();
+  _saveViewController = nullptr;
+  _navController = nullptr;
+  _window->hide();
+  _window.reset();
+  _model.reset();
+  _platform = nullptr;
+}
+
+// --- Preferences ---------------------------------------------------------------------------------
+
+void KestroApp::getRSSIPref() {
+  const auto shown = _platform->preferences().boolean(kKestroPreferencesDomain, kShowGsmRssi);
+  if (shown.value_or(false)) return;
+  _unsetRSSI = true;
+  _setGSMRSSI(true);
+}
+
+void KestroApp::getSaveButtonPref() {
+  _allowSaveButton = _platform->deviceRoot().exists(kSaveButtonPath);
+}
+
+void KestroApp::_setGSMRSSI(bool shown) {
+  Preferences& preferences = _platform->preferences();
+  preferences.setBoolean(kShellPreferencesDomain, kShowGsmRssi, shown);
+  preferences.synchronize(kShellPreferencesDomain);
+  preferences.notifyChanged(kShellPreferencesDomain, kShowGsmRssi);
+}
+
+// --- Panes ---------------------------------------------------------------------------------------
+
+KestroPaneController& KestroApp::paneAt(std::size_t index) const {
+  return static_cast<KestroPaneController&>(*_navController->viewControllers()[index]);
+}
+
+void KestroApp::pushPane(std::unique_ptr<ViewController> pane) {
+  _navController->pushViewController(std::move(pane), true);
+}
+
+void KestroApp::navigationControllerWillShowViewController(ViewController& pane, bool) {
+  updateStatusForViewController(static_cast<KestroPaneController&>(pane));
+}
+
+void KestroApp::updateStatusForViewController(KestroPaneController& pane) {
+  const bool isConnected = _model->isConnected();
+  pane.setStatus(isConnected ? _updateMessage : connecting(), !isConnected);
+}
+
+void KestroApp::updateViewControllerFromModel() {
+  if (!_model) return;  // a redraw that was queued before the exit
+  reloadPanes();
+  if (_model->isConnected()) {
+    const Clock& clock = _platform->clock();
+    _updateMessage = QString::fromStdString(updatedText(clock, clock.now()));
+  }
+  updateStatusForViewController(paneAt(_navController->viewControllers().size() - 1));
+}
+
+void KestroApp::reloadPanes() {
+  paneAt(kRoot).reloadWithNode(_model->topLevelNodes());
+  for (std::size_t i = kRoot + 1; i < _navController->viewControllers().size(); ++i) {
+    NodePointer node = _model->nodeAtPath(paneAt(i).path());
+    if (!node) {
+      _navController->popToIndex(i - 1, true);
+      return;
+    }
+    paneAt(i).reloadWithNode(std::move(node));
+  }
+}
+
+void KestroApp::checkConnection() {
+  const bool isConnected = _model->isConnected();
+  if (std::exchange(_wasConnected, isConnected) == isConnected) return;
+  updateStatusForViewController(paneAt(_navController->viewControllers().size() - 1));
+}
+
+// --- Saving --------------------------------------------------------------------------------------
+
+void KestroApp::showSaveView() {
+  if (_saveViewController) return;
+  auto screen = std::make_unique<KestroSaveViewController>(
+      *_platform, _model->getSaveContents(),
+      KestroSaveViewController::Handlers{.close = [this] { closeSaveView(); },
+                                         .writeFailed = [this] { showFileError(); }});
+  _saveViewController = screen.get();
+  _navController->present(std::move(screen), true);
+}
+
+void KestroApp::closeSaveView() {
+  if (!_saveViewController) return;
+  _saveViewController = nullptr;
+  _navController->dismiss(true);
+}
+
+void KestroApp::showFileError() {
+  _alert = new AlertView(tr("File Error"), tr("Unable to write file to disk"), tr("Close"),
+                         _window.get());
+  _alert->open();
+}
+
+bool KestroApp::saveHistory(std::string_view description) {
+  if (!_model) return false;
+  return Snapshot(_platform->clock(), _model->getSaveContents()).save(*_platform, description);
+}
+
+}  // namespace kestro

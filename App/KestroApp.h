@@ -1,0 +1,121 @@
+// SPDX-License-Identifier: MIT
+// The application object: the window with its stack of panes, the model behind it, and what happens
+// at launch and at exit.
+#pragma once
+
+#include <QApplication>
+#include <QPointer>
+#include <QSize>
+#include <chrono>
+#include <memory>
+#include <optional>
+#include <string_view>
+
+#include "App/AlertView.h"
+#include "App/KestroPaneController.h"
+#include "App/KestroSaveViewController.h"
+#include "App/MainWindow.h"
+#include "App/NavigationController.h"
+#include "Model/KestroModel.h"
+#include "Platform/MainQueue.h"
+#include "Platform/Platform.h"
+
+namespace kestro {
+
+/// Where the device has what makes saving worth offering.
+inline constexpr std::string_view kSaveButtonPath =
+    "/NorrowInternal/Library/PreferenceBundles/Carrier Settings.bundle";
+/// The preference for the signal strength as a number.
+inline constexpr std::string_view kShowGsmRssi = "LumoShowGSMRSSI";
+
+/// How often it is looked whether the model is still connected: no new data tells so.
+inline constexpr std::chrono::milliseconds kConnectionCheckInterval{500};
+/// How long the first frame is waited for before connecting begins all the same.
+inline constexpr std::chrono::seconds kFirstFramePatience{1};
+
+struct LaunchOptions {
+  /// The window's size; without one it covers the main screen's available area.
+  std::optional<QSize> windowSize;
+  /// No marks at values that have changed.
+  bool plain = false;
+  /// Whether connecting begins by itself, once the first frame is shown; else `restartMonitor` does
+  /// it.
+  bool connectsAtLaunch = true;
+};
+
+/// Exceptions end the process where they are thrown: none unwinds through the toolkit.
+class KestroApp : public QApplication, private PaneHost {
+  Q_OBJECT
+
+ public:
+  KestroApp(int& argumentCount, char** arguments);
+  ~KestroApp() override;
+  KestroApp(const KestroApp&) = delete;
+  KestroApp& operator=(const KestroApp&) = delete;
+
+  /// Shows the window, with nothing connected yet. The platform must live until
+  /// `applicationWillTerminate`.
+  void applicationDidFinishLaunching(Platform& platform, const LaunchOptions& options = {});
+  /// Puts back what launching changed, and lets go of window and model. Runs by itself when the
+  /// event loop ends; a second call does nothing.
+  void applicationWillTerminate();
+
+  /// Connects, or connects anew, in a later turn of the main queue.
+  void restartMonitor();
+
+  void getRSSIPref();
+  void getSaveButtonPref();
+  // NOLINTNEXTLINE(readability-identifier-naming)
+  void _setGSMRSSI(bool shown);
+
+  void showSaveView() override;
+  void closeSaveView();
+  void updateStatusForViewController(KestroPaneController& pane);
+  void updateViewControllerFromModel();
+  void navigationControllerWillShowViewController(ViewController& pane, bool animated);
+
+  /// Saves the history without asking; for who ends the process. False when it could not be saved.
+  bool saveHistory(std::string_view description);
+
+  [[nodiscard]] MainWindow* window() const noexcept { return _window.get(); }
+  [[nodiscard]] NavigationController* navController() const noexcept { return _navController; }
+  [[nodiscard]] KestroSaveViewController* saveViewController() const noexcept {
+    return _saveViewController;
+  }
+  /// The message that a failed write left on the screen, until it is closed.
+  [[nodiscard]] AlertView* alert() const noexcept { return _alert; }
+  [[nodiscard]] const QString& updateMessage() const noexcept { return _updateMessage; }
+  void setUpdateMessage(const QString& message) { _updateMessage = message; }
+  [[nodiscard]] bool allowSaveButton() const override { return _allowSaveButton; }
+  void setAllowSaveButton(bool allow) noexcept { _allowSaveButton = allow; }
+
+  bool notify(QObject* receiver, QEvent* event) noexcept override;
+
+ private:
+  [[nodiscard]] bool marksChanges() const override { return !_isPlain; }
+  void pushPane(std::unique_ptr<ViewController> pane) override;
+
+  void createWindow(const LaunchOptions& options);
+  void placeWindow(const std::optional<QSize>& size);
+  void connectAfterFirstFrame();
+  void reloadPanes();
+  void checkConnection();
+  void showFileError();
+  [[nodiscard]] KestroPaneController& paneAt(std::size_t index) const;
+
+  Platform* _platform = nullptr;  ///< null before launch and after exit
+  std::unique_ptr<MainWindow> _window;
+  NavigationController* _navController = nullptr;           ///< the window's
+  KestroSaveViewController* _saveViewController = nullptr;  ///< the stack's, while it is shown
+  std::shared_ptr<KestroModel> _model;
+  bool _unsetRSSI = false;
+  bool _allowSaveButton = false;
+  QString _updateMessage;
+
+  QPointer<AlertView> _alert;
+  std::unique_ptr<Timer> _connectionTimer;
+  bool _wasConnected = false;
+  bool _isPlain = false;
+};
+
+}  // namespace kestro

@@ -1,0 +1,32 @@
+// SPDX-License-Identifier: MIT
+// The program's window.
+#pragma once
+
+#include <QWidget>
+#include <functional>
+#include <memory>
+
+#include "App/NavigationController.h"
+
+namespace kestro {
+
+/// Is filled by a navigation stack, which it owns.
+class MainWindow : public QWidget {
+  Q_OBJECT
+
+ public:
+  explicit MainWindow(std::unique_ptr<NavigationController> navController);
+
+  /// Called once, while the window is painted for the first time.
+  void setFirstFrameHandler(std::function<void()> handler) { _firstFrame = std::move(handler); }
+
+ protected:
+  void paintEvent(QPaintEvent* event) override;
+  void resizeEvent(QResizeEvent* event) override;
+
+ private:
+  NavigationController* _navController;
+  std::function<void()> _firstFrame;
+};
+
+}  // namespace kestro
