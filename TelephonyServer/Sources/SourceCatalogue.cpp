@@ -95,6 +95,7 @@ template <class Rows>
 tl::unexpected<Error> notMade(const SourceRequest& request, std::string_view technology,
                               const Rows& rows) {
   std::vector<std::string_view> made;
+  made.reserve(rows.size());
   for (const auto& row : rows) made.push_back(row.technology);
   return failure(fmt::format("the source \"{}\" cannot make {} messages, only {}", request.kind,
                              technology, fmt::join(made, ", ")));

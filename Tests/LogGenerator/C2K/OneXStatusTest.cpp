@@ -231,6 +231,7 @@ TEST_F(OneXStatusTest, TakesSubPacketsInEveryOrder) {
   std::vector<int> order = {0, 1, 2, 3, 4};
   do {
     std::vector<SubPacketBytes> arranged;
+    arranged.reserve(order.size());
     for (const int part : order) arranged.push_back(parts[static_cast<std::size_t>(part)]);
     state.remove(kStateDisplay);
     receive(packetOf(0x119C, arranged));

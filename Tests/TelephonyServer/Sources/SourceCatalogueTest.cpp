@@ -22,13 +22,13 @@ class SourceCatalogueTest : public ::testing::Test {
   Result<std::unique_ptr<LogSource>> open(std::string_view text, std::string_view technology = "") {
     const auto request = parseSource(text, technology);
     EXPECT_TRUE(request.has_value()) << request.error().message;
-    return openSource(*request, _platform, _report);
+    return openSource(*request, platform, report);
   }
 
-  TemporaryDirectory _directory;
-  std::unique_ptr<PropertyListCoding> _coding = createPropertyListCoding();
-  VirtualPlatform _platform{*_coding};
-  SourceReporter _report = [](std::string_view) {};
+  TemporaryDirectory directory;
+  std::unique_ptr<PropertyListCoding> coding = createPropertyListCoding();
+  VirtualPlatform platform{*coding};
+  SourceReporter report = [](std::string_view) {};
 };
 
 TEST_F(SourceCatalogueTest, theKindEndsAtTheFirstColon) {
@@ -51,9 +51,9 @@ TEST_F(SourceCatalogueTest, unknownKindsAndMissingArgumentsAreWrongUsage) {
 }
 
 TEST_F(SourceCatalogueTest, opensEveryKind) {
-  const auto capture = _directory.write("a.pcap", captureHeader(151));
-  const auto log = _directory.write("a.csv", std::string_view("Timestamp,NetworkMode,RSRP\n"));
-  _platform.inputStreams().allow("pipe");
+  const auto capture = directory.write("a.pcap", captureHeader(151));
+  const auto log = directory.write("a.csv", std::string_view("Timestamp,NetworkMode,RSRP\n"));
+  platform.inputStreams().allow("pipe");
   EXPECT_EQ((*open("simulation"))->technology(), "LTE");
   EXPECT_EQ((*open("simulation:IFX"))->technology(), "IFX");
   EXPECT_EQ((*open("capture:" + capture))->technology(), "UTRAN2");
@@ -62,16 +62,16 @@ TEST_F(SourceCatalogueTest, opensEveryKind) {
 }
 
 TEST_F(SourceCatalogueTest, theTechnologyAskedForWins) {
-  const auto capture = _directory.write("a.pcap", captureHeader(151));
-  _platform.inputStreams().allow("pipe");
+  const auto capture = directory.write("a.pcap", captureHeader(151));
+  platform.inputStreams().allow("pipe");
   EXPECT_EQ((*open("capture:" + capture, "LTE"))->technology(), "LTE");
   EXPECT_EQ((*open("stream:pipe", "Ondrel_GSM"))->technology(), "Ondrel_GSM");
   EXPECT_EQ((*open("simulation:LTE", "IFX"))->technology(), "IFX");
 }
 
 TEST_F(SourceCatalogueTest, simulationsAndDriveTestsSpeakSeveralTechnologies) {
-  const auto log = _directory.write("a.csv", std::string_view("Timestamp,NetworkMode,RSRP\n"
-                                                              "2020.01.02_03.04.05,EDGE,-90\n"));
+  const auto log = directory.write("a.csv", std::string_view("Timestamp,NetworkMode,RSRP\n"
+                                                             "2020.01.02_03.04.05,EDGE,-90\n"));
   for (const std::string technology : {"LTE", "Ondrel_GSM"}) {
     EXPECT_EQ((*open("drive-test:" + log, technology))->technology(), technology);
   }
@@ -83,17 +83,17 @@ TEST_F(SourceCatalogueTest, simulationsAndDriveTestsSpeakSeveralTechnologies) {
 }
 
 TEST_F(SourceCatalogueTest, anAutomaticDriveTestBeginsWithItsFirstRow) {
-  const auto gsm = _directory.write("a.csv", std::string_view("Timestamp,NetworkMode,RSRP\n"
-                                                              "2020.01.02_03.04.05,EDGE,-90\n"));
-  const auto lte = _directory.write("b.csv", std::string_view("Timestamp,NetworkMode,RSRP\n"
-                                                              "2020.01.02_03.04.05,5G,-90\n"));
+  const auto gsm = directory.write("a.csv", std::string_view("Timestamp,NetworkMode,RSRP\n"
+                                                             "2020.01.02_03.04.05,EDGE,-90\n"));
+  const auto lte = directory.write("b.csv", std::string_view("Timestamp,NetworkMode,RSRP\n"
+                                                             "2020.01.02_03.04.05,5G,-90\n"));
   EXPECT_EQ((*open("drive-test:" + gsm, kAutomaticTechnology))->technology(), "Ondrel_GSM");
   EXPECT_EQ((*open("drive-test:" + lte, kAutomaticTechnology))->technology(), "LTE");
 }
 
 TEST_F(SourceCatalogueTest, automaticMeansWhatASourceSaysItself) {
-  const auto capture = _directory.write("a.pcap", captureHeader(151));
-  _platform.inputStreams().allow("pipe");
+  const auto capture = directory.write("a.pcap", captureHeader(151));
+  platform.inputStreams().allow("pipe");
   EXPECT_EQ((*open("capture:" + capture, kAutomaticTechnology))->technology(), "UTRAN2");
   EXPECT_FALSE(open("stream:pipe", kAutomaticTechnology).has_value());
   EXPECT_FALSE(open("simulation", kAutomaticTechnology).has_value());
