@@ -7,9 +7,11 @@
 #include <string>
 #include <vector>
 
+#include "CommandLine/CodesCommand.h"
 #include "CommandLine/Command.h"
 #include "CommandLine/DecodeCommand.h"
 #include "CommandLine/ExitStatus.h"
+#include "CommandLine/ExplainCommand.h"
 #include "CommandLine/RecordCommand.h"
 #include "CommandLine/SnapshotCommand.h"
 #include "CommandLine/WatchCommand.h"
@@ -20,8 +22,8 @@ namespace kestro {
 namespace {
 
 /// Every command, in the order of the help.
-constexpr std::array kCommands = {addWatchCommand, addDecodeCommand, addRecordCommand,
-                                  addSnapshotCommand};
+constexpr std::array kCommands = {addWatchCommand,   addDecodeCommand, addRecordCommand,
+                                  addExplainCommand, addCodesCommand,  addSnapshotCommand};
 
 constexpr const char* kFooter = R"(Exit status:
   0  done

@@ -51,9 +51,13 @@ void JsonWriter::text(std::string_view value) {
   appendQuoted(value);
 }
 
-void JsonWriter::number(std::uint64_t value) {
+void JsonWriter::number(std::uint64_t value) { word(fmt::format_int(value).c_str()); }
+void JsonWriter::integer(std::int64_t value) { word(fmt::format_int(value).c_str()); }
+void JsonWriter::boolean(bool value) { word(value ? "true" : "false"); }
+
+void JsonWriter::word(std::string_view text) {
   separate();
-  fmt::format_to(std::back_inserter(_output), "{}", value);
+  _output += text;
 }
 
 void JsonWriter::begin(char bracket) {

@@ -9,6 +9,7 @@
 namespace kestro {
 
 /// Appends one JSON value to a text, in the order of the calls; every key is followed by its value.
+/// After a whole value the next one may follow.
 /// Texts are escaped as JSON wants it, and bytes in them that are no UTF-8 become U+FFFD.
 class JsonWriter {
  public:
@@ -29,10 +30,15 @@ class JsonWriter {
   void key(std::string_view name);
   void text(std::string_view value);
   void number(std::uint64_t value);
+  /// A number that may be negative.
+  void integer(std::int64_t value);
+  void boolean(bool value);
 
  private:
   void begin(char bracket);
   void end(char bracket);
+  /// A number or a name, which stands without quotes.
+  void word(std::string_view text);
   void separate();
   void breakLine();
   void appendQuoted(std::string_view value);

@@ -37,6 +37,29 @@ TEST(JsonWriter, CompactFormIsOneLine) {
   EXPECT_EQ(output, R"({"a":"x","b":[1,{}],"c":[]})");
 }
 
+TEST(JsonWriter, WritesNumbersAndNames) {
+  std::string output;
+  JsonWriter writer(output);
+  writer.beginArray();
+  writer.number(18446744073709551615U);
+  writer.integer(-9223372036854775807 - 1);
+  writer.boolean(true);
+  writer.boolean(false);
+  writer.endArray();
+  EXPECT_EQ(output, "[18446744073709551615,-9223372036854775808,true,false]");
+}
+
+TEST(JsonWriter, WritesOneValueAfterTheOther) {
+  std::string output;
+  JsonWriter writer(output);
+  writeSample(writer);
+  output += '\n';
+  writeSample(writer);
+  EXPECT_EQ(output, R"({"a":"x","b":[1,{}],"c":[]})"
+                    "\n"
+                    R"({"a":"x","b":[1,{}],"c":[]})");
+}
+
 TEST(JsonWriter, IndentedFormHasALineForEachMember) {
   std::string output;
   JsonWriter writer(output, JsonWriter::Form::Indented);

@@ -1,12 +1,16 @@
 // SPDX-License-Identifier: MIT
+#include <fmt/format.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include <filesystem>
 #include <fstream>
 #include <nlohmann/json.hpp>
+#include <regex>
+#include <sstream>
 
 #include "Tests/EndToEnd/IfxMessages.h"
+#include "Tests/EndToEnd/PacketMessages.h"
 #include "Tests/EndToEnd/Process.h"
 #include "Tests/Support/TemporaryFile.h"
 
@@ -147,6 +151,60 @@ TEST_F(DecodeTest, LogJsonHasTheSystemLogLines) {
                            "\n"));
 }
 
+/// A line of the log with the addresses taken out.
+std::string withoutAddresses(const std::string& line) {
+  static const std::regex kAddress("0x[0-9a-f]+");
+  return std::regex_replace(line, kAddress, "0x");
+}
+
+std::string logLine(int priority, const std::string& message) {
+  return fmt::format(R"({{"priority":{},"message":"{}"}})", priority, message);
+}
+
+/// 0xB180 with one record, all 0; then 0xB0C2, which is too short; then a type that is dropped.
+TEST_F(DecodeTest, LogJsonHasEveryLineInOrderWithItsPriority) {
+  writeCapture(capture.path(),
+               {messageOf(packet(0xB180).length(41)), messageOf(packet(0xB0C2).length(14)),
+                messageOf(packet(0xB17F).u8(0, 2))},
+               800ms, "LTE");
+  const TemporaryFile log;
+  EXPECT_EQ(decode({"--log-json=" + log.path()}).status, 0);
+  std::istringstream stream(log.contents());
+  std::vector<std::string> lines;
+  for (std::string line; std::getline(stream, line);) lines.push_back(withoutAddresses(line));
+  std::vector<std::string> expected = {logLine(3, "Creating LTELogGenerator object")};
+  // One line a decoder: how many codes it subscribes to.
+  for (const int count : {3, 1, 1, 1, 1, 1, 1, 1, 1, 1, 1}) {
+    expected.push_back(logLine(4, fmt::format("Array Count: {}", count)));
+  }
+  expected.push_back(logLine(3, "Creating OndrelLogGenerator2 object with 0x"));
+  expected.push_back(logLine(4, "Creating Log object: 0x"));
+  expected.push_back(logLine(3, "Class Index: 1"));
+  // The first message builds the display.
+  expected.push_back(logLine(4, "Initialized class index: 0x, Self: 0x"));
+  expected.push_back(logLine(4, "Dictionary = 1"));
+  expected.push_back(logLine(4, "String = 0"));
+  for (const char* section :
+       {"Serving Cell Info", "Serving Cell Measurements",
+        "Connected mode LTE Intra-frequency Measurement", "Measured Neighbor Cells",
+        "Detected Cells", "Neighbor Measurements", "Neighbor Cells List", "Reselection Candidates",
+        "Reselection Candidates List", "SIM Info", "PDP Context Info"}) {
+    expected.push_back(logLine(4, section));
+  }
+  expected.push_back(logLine(4, "Neighbor Measurements"));
+  expected.push_back(logLine(4, "Neighbor Cells List"));
+  expected.push_back(logLine(4, "Number of neighboring cells being reported: 1\\n"));
+  expected.push_back(logLine(4, "Physical Cell ID: 0\\n"));
+  for (const char* level : {"-140", "-140", "-140", "-30", "-30"}) {
+    expected.push_back(logLine(4, fmt::format("Measured RSSI: {}.000000\\n", level)));
+  }
+  expected.push_back(logLine(4, "LTE Serving Cell Info"));
+  expected.push_back(logLine(3, "Invalid log type: 2. Dropping."));
+  expected.push_back(logLine(4, "LTELogGenerator is destructed 0x"));
+  expected.push_back(logLine(4, "Ondrel_GSMLogGenerator is destructed 0x"));
+  EXPECT_EQ(lines, expected);
+}
+
 TEST_F(DecodeTest, OutputThatCannotBeWrittenIsAFailure) {
   write({ifxMessage("1")});
   const Outcome outcome = decode({"--log-json=/dev/full"});
@@ -166,6 +224,13 @@ TEST(Usage, WrongUsageIsTwo) {
       {"kestro-cli", "watch", "--server=a/b"},
       {"kestro-cli", "watch", "--server=A", "--demo"},
       {"kestro-cli", "record"},
+      {"kestro-cli", "explain"},
+      {"kestro-cli", "explain", "x.pcap", "--message=0"},
+      {"kestro-cli", "explain", "x.pcap", "--code=here"},
+      {"kestro-cli", "explain", "x.pcap", "--code=0x1000000"},
+      {"kestro-cli", "explain", "x.pcap", "--format=csv"},
+      {"kestro-cli", "codes", "--technology=CDMA"},
+      {"kestro-cli", "codes", "--format=html"},
   };
   for (const auto& arguments : wrong) {
     const Outcome outcome = run(arguments);
@@ -176,7 +241,7 @@ TEST(Usage, WrongUsageIsTwo) {
 }
 
 TEST(Usage, HelpIsAnAnswer) {
-  for (const char* command : {"watch", "decode", "record"}) {
+  for (const char* command : {"watch", "decode", "record", "explain", "codes"}) {
     const Outcome outcome = run({"kestro-cli", command, "--help"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_THAT(outcome.output, HasSubstr("Examples:"));

@@ -1,0 +1,25 @@
+// SPDX-License-Identifier: MIT
+#include "CommandLine/ExplainWriter.h"
+
+#include "CommandLine/ExplainJson.h"
+#include "CommandLine/ExplainTable.h"
+
+namespace kestro {
+namespace {
+
+template <class Writer>
+std::unique_ptr<ExplainWriter> makeWriter(Output& output) {
+  return std::make_unique<Writer>(output);
+}
+
+}  // namespace
+
+const std::vector<ExplainFormat>& explainFormats() {
+  static const std::vector<ExplainFormat> kFormats = {
+      {"table", makeWriter<ExplainTable>},
+      {"json", makeWriter<ExplainJson>},
+  };
+  return kFormats;
+}
+
+}  // namespace kestro
