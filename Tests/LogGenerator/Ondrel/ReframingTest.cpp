@@ -28,7 +28,7 @@ Bytes joined(std::initializer_list<Bytes> parts) {
 
 Value entry(const Bytes& collected) { return Dictionary{{"DisplayState", Value::data(collected)}}; }
 
-const Bytes kReport(161, 0xEE);  // NOLINT(bugprone-throwing-static-initialization)
+const Bytes kReport(161, 0xEE);
 
 TEST(AppendRecords, LeavesOutTheTypeByteOfEveryMessage) {
   Bytes dlf{0xEE};
