@@ -202,6 +202,16 @@ TEST_F(SnapshotReadingTest, EveryCutFileIsRefused) {
   EXPECT_EQ(refusal(file.substr(0, end)), "(accepted)");
 }
 
+TEST_F(SnapshotReadingTest, ReadsWhatIsTooLargeForAMessage) {
+  Array message;
+  for (int i = 0; i < 199'999; ++i) message.append(Value::boolean(true));
+  Array history;
+  for (int i = 0; i < 5; ++i) {
+    history.append(Dictionary{{"DisplayState", message}, {"Display", message}});
+  }
+  EXPECT_TRUE(parseSnapshot(*coding, open(history).file(*coding, "").value()));
+}
+
 TEST_F(SnapshotReadingTest, FindsTheDlfLog) {
   const Dictionary dlf{{"Description", "DLF binary (2 bytes)"}, {"DLF", Value::data({7, 8})}};
   EXPECT_EQ(dlfOfSnapshot({{"Data", Array{Dictionary{{"Display", "x"}}, dlf}}}),
