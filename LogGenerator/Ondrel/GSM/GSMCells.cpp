@@ -247,10 +247,10 @@ constexpr Section kMobileAllocationSection = {
 void NeighboringCells::willPublish(const ListReading& list, PacketView packet,
                                    std::vector<Value>& rows) {
   if (list.use != RowsUse::Noted) return;
-  _bsicList.clear();
+  _arfcnToBsic.clear();
   for (std::size_t i = 0; i < rows.size(); ++i) {
     const RecordPosition entry = recordAt(list.table, packet, i);
-    _bsicList.push_back({readBits(kBSICEntryARFCN, packet, entry), rows[i].dictionary()[kBSIC]});
+    _arfcnToBsic.push_back({readBits(kBSICEntryARFCN, packet, entry), rows[i].dictionary()[kBSIC]});
   }
 }
 
@@ -258,9 +258,9 @@ Value NeighboringCells::supply(const Field& /*field*/, PacketView packet,
                                const RecordPosition& position) const {
   const std::uint32_t arfcn = readBits(kNeighbourARFCN, packet, position);
   // Of several entries for one frequency the last counts.
-  const auto known = std::find_if(_bsicList.rbegin(), _bsicList.rend(),
+  const auto known = std::find_if(_arfcnToBsic.rbegin(), _arfcnToBsic.rend(),
                                   [arfcn](const NotedCell& cell) { return cell.arfcn == arfcn; });
-  return known == _bsicList.rend() ? Value() : known->bsic;
+  return known == _arfcnToBsic.rend() ? Value() : known->bsic;
 }
 
 }  // namespace kestro

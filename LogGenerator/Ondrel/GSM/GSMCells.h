@@ -51,7 +51,7 @@ class NeighboringCells : public CellMonitorDecoder {
     std::uint32_t arfcn;
     Value bsic;
   };
-  std::vector<NotedCell> _bsicList;  ///< the last list, in its order
+  std::vector<NotedCell> _arfcnToBsic;  ///< the last list, in its order
 };
 
 /// The GSM cells of the idle-mode ranking.

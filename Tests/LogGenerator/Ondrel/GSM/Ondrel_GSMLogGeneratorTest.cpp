@@ -191,9 +191,12 @@ TEST_F(Ondrel_GSMLogGeneratorTest, AsksForTheCodesOfAllDecoders) {
 }
 
 TEST_F(Ondrel_GSMLogGeneratorTest, OnePacketFillsEverySectionThatWantsIt) {
+  receive(packet(0x5137).u8(28, 1).u16(29, 77).length(43));
+  EXPECT_THAT(section("Neighboring Cells").array(), SizeIs(1));
+  lines();
   receive(packet(0x5137).u8(15, 0x3F).u32(16, 0x10001).u32(20, 2).u8(28, 0));
-  EXPECT_THAT(lines(), ::testing::IsSupersetOf(
-                           {"GPRSInformation", "GSMServingCell", "NeighboringCells", "GSMRRInfo"}));
+  EXPECT_THAT(lines(),
+              ElementsAre("GPRSInformation", "GSMServingCell", "NeighboringCells", "GSMRRInfo"));
   EXPECT_EQ(entries("GSM Serving Cell"),
             (Entries{{"RSSI", "63 dBm"}, {"C1 Value", "1"}, {"C2 Value", "2"}}));
   EXPECT_EQ(
@@ -201,6 +204,18 @@ TEST_F(Ondrel_GSMLogGeneratorTest, OnePacketFillsEverySectionThatWantsIt) {
       (Entries{{"Serving Rx Level", "63"}, {"Rx Quality Full", "65537"}, {"Rx Quality Sub", "2"}}));
   EXPECT_THAT(section("Neighboring Cells").array(), IsEmpty());
   EXPECT_THAT(entries("GPRS Information"), IsEmpty());
+}
+
+TEST_F(Ondrel_GSMLogGeneratorTest, OnePacketWithoutCellsEmptiesFourSets) {
+  receive(packet(0x417A).u8(15, 1).length(75));
+  EXPECT_THAT(section("Active Set").array(), SizeIs(1));
+  lines();
+  receive(packet(0x417A).length(16));
+  for (const char* name : {"Active Set", "Detected Set", "Monitored Set", "Virtual Active Set"}) {
+    EXPECT_TRUE(section(name).isArray()) << name;
+    EXPECT_THAT(section(name).array(), IsEmpty()) << name;
+  }
+  EXPECT_THAT(lines(), ElementsAre("ActiveSet", "DetectedSet", "MonitoredSet", "VirtualActiveSet"));
 }
 
 TEST_F(Ondrel_GSMLogGeneratorTest, OneRegistrationPacketFillsFourSections) {
