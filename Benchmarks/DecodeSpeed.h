@@ -20,7 +20,7 @@
 #include "LogGenerator/Ondrel/OndrelLogGenerator2.h"
 #include "Platform/Bundle.h"
 #include "Platform/Linux/LinuxPlatform.h"
-#include "Platform/Virtual/VirtualPlatform.h"
+#include "Platform/Virtual/QuietPlatform.h"
 
 namespace kestro::benchmarks {
 
@@ -90,20 +90,6 @@ class PlainFormatting {
 
   std::vector<FormattedValue> _values;
   std::string _buffer;
-};
-
-/// The virtual platform with a console that forgets its lines.
-class QuietPlatform : public VirtualPlatform {
- public:
-  using VirtualPlatform::VirtualPlatform;
-  [[nodiscard]] RecordingTextSink& consoleLog() override { return _console; }
-
- private:
-  class ForgetfulTextSink : public RecordingTextSink {
-   public:
-    void writeLine(std::string_view) override {}
-  };
-  ForgetfulTextSink _console;
 };
 
 /// A generator with its display, fed without collecting what it is fed with.

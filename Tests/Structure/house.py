@@ -78,7 +78,16 @@ def _with_tests(rooms):
     all_rooms = dict(rooms)
     all_rooms["Tests"] = everything
     all_rooms["Fuzz"] = everything
+    all_rooms["Fuzz/PortFrameFuzz.cpp"] = dataclasses.replace(
+        everything,
+        rooms=("Fuzz", *everything.rooms),
+        doors=(LINUX_DOOR, "Platform/Linux/PortFrameReader.h"),
+    )
+    all_rooms["Tests/Soak"] = dataclasses.replace(everything, kinds=kinds | {"command lines"})
     all_rooms["Benchmarks"] = dataclasses.replace(everything, kinds=kinds | {"benchmarks"})
+    all_rooms["Benchmarks/WindowBenchmark.cpp"] = Room(
+        ("App", "Model", "Platform", "Tests", "Tests/App"), kinds | {"benchmarks", "qt"}
+    )
     for name, room in rooms.items():
         if "." in name:
             continue

@@ -1,0 +1,48 @@
+// SPDX-License-Identifier: MIT
+// Bytes as a drive-test log, played as each technology, its messages decoded.
+#include <memory>
+#include <variant>
+
+#include "Fuzz/GeneratorChannel.h"
+#include "Fuzz/MemoryFile.h"
+#include "TelephonyServer/Sources/SourceCatalogue.h"
+
+namespace kestro::fuzz {
+namespace {
+
+/// Plays the source to its end into a channel of whatever technology its messages have.
+void play(LogSource& source) {
+  std::unique_ptr<GeneratorChannel> channel;
+  std::string_view technology;
+  for (;;) {
+    const auto step = source.next();
+    if (!step) return;
+    const auto* event = std::get_if<SourceEvent>(&*step);
+    if (event == nullptr) return;
+    if (event->technology != technology) {
+      technology = event->technology;
+      channel = std::make_unique<GeneratorChannel>(technology);
+      channel->addTemplates();
+      channel->start();
+      channel->refresh();
+    }
+    if (!event->message.empty()) channel->receive(event->message);
+  }
+}
+
+}  // namespace
+}  // namespace kestro::fuzz
+
+extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+  using namespace kestro;
+  fuzz::Input input(data, size);
+  const auto choices = technologyChoices();
+  const std::string_view technology = choices[input.byte() % choices.size()];
+  const fuzz::MemoryFile file(input.rest());
+  VirtualPlatform platform(fuzz::propertyListCoding());
+  const SourceReporter ignore = [](std::string_view) {};
+  const auto source = openSource(
+      {.kind = "drive-test", .argument = file.path(), .technology = technology}, platform, ignore);
+  if (source) fuzz::play(**source);
+  return 0;
+}

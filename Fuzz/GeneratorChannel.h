@@ -1,0 +1,86 @@
+// SPDX-License-Identifier: MIT
+// A generator as the model uses it, without the model: its state, its failures, its tree.
+#pragma once
+
+#include <fmt/format.h>
+
+#include <memory>
+#include <string_view>
+
+#include "Fuzz/Harness.h"
+#include "LogGenerator/InternalConsistencyFailure.h"
+#include "LogGenerator/LogGenerator.h"
+#include "LogGenerator/Ondrel/Base.h"
+#include "LogGenerator/Ondrel/SharedDecoders.h"
+#include "Model/KestroModelNode.h"
+#include "Platform/Linux/LinuxPlatform.h"
+#include "Platform/Virtual/QuietPlatform.h"
+
+namespace kestro::fuzz {
+
+inline const PropertyListCoding& propertyListCoding() {
+  static const std::unique_ptr<PropertyListCoding> coding = createPropertyListCoding();
+  return *coding;
+}
+
+class GeneratorChannel {
+ public:
+  explicit GeneratorChannel(std::string_view technology) : _technology(technology) {
+    _platform.systemLog().setThreshold(LogPriority::Error);
+  }
+
+  /// Gives the generator the program's own templates.
+  void addTemplates() {
+    static const std::unique_ptr<Bundle> bundle = createBundle();
+    for (const std::string& path : bundle->resourcesOfType("plist")) {
+      const auto contents = bundle->resource(path.substr(0, path.rfind('.')), "plist");
+      if (contents) _platform.bundle().setResource(path, *contents);
+    }
+  }
+
+  /// A generator that goes on with the state, as after a reconnection.
+  void start() { _generator = LogGenerator::generatorFromTechnology(_platform, _technology); }
+
+  /// Hands a message over. It may raise what messages are known to raise, and nothing else.
+  void receive(ByteView message) {
+    try {
+      _generator->updateStateWithData(_state, message);
+    } catch (const ArrayOutOfBoundsException&) {
+    } catch (const LogCode_0xFF0000::UnknownDataException&) {
+    } catch (const InternalConsistencyFailure&) {
+    }
+    static_cast<void>(_platform.systemLog().take());
+  }
+
+  /// Looks at every value that a message yields.
+  void explain(ByteView message) const {
+    std::size_t count = 0;
+    _generator->explainMessage(message, [&](const auto&...) { ++count; });
+  }
+
+  /// Refreshes and builds the tree.
+  void refresh() {
+    NodesByPath nodes;
+    const Value display = _generator->generateLogUsingState(_state);
+    static_cast<void>(KestroModelNode::makeTreeFromObjectWithPathDictionary(display, nodes));
+    const Array history = _state[kStateHistory].array();
+    require(history.size() <= kMaximumHistoryEntries, "a history keeps at most five entries");
+    static_cast<void>(_platform.systemLog().take());
+  }
+
+  void save() {
+    const Array contents = _generator->getSaveContentsFromState(_state);
+    static_cast<void>(propertyListCoding().binary(contents));
+  }
+
+  [[nodiscard]] VirtualPlatform& platform() noexcept { return _platform; }
+  [[nodiscard]] Dictionary& state() noexcept { return _state; }
+
+ private:
+  std::string_view _technology;
+  QuietPlatform _platform{propertyListCoding()};
+  std::unique_ptr<LogGenerator> _generator;
+  Dictionary _state;
+};
+
+}  // namespace kestro::fuzz

@@ -1,0 +1,43 @@
+// SPDX-License-Identifier: MIT
+// Messages, refreshes, saves and reconnections of one technology, in any order, with and without
+// its template.
+#include "Fuzz/GeneratorChannel.h"
+
+namespace kestro::fuzz {
+namespace {
+
+enum class Step : std::uint8_t { Refresh = 12, Save, Reconnect, Last };
+
+/// Takes one step: mostly messages, whose header the input need not spell out in full.
+void takeStep(Input& input, GeneratorChannel& channel) {
+  const unsigned choice = input.byte() % static_cast<unsigned>(Step::Last);
+  switch (static_cast<Step>(choice)) {
+    case Step::Refresh:
+      return channel.refresh();
+    case Step::Save:
+      return channel.save();
+    case Step::Reconnect:
+      return channel.start();
+    default:
+      break;
+  }
+  const ByteView message = input.bytes(input.number16() % 2048);
+  channel.receive(message);
+  channel.explain(message);
+}
+
+}  // namespace
+}  // namespace kestro::fuzz
+
+extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+  using namespace kestro::fuzz;
+  Input input(data, size);
+  GeneratorChannel channel(KESTRO_FUZZ_TECHNOLOGY);
+  const unsigned beginning = input.byte();
+  if ((beginning & 1) == 0) channel.addTemplates();
+  channel.start();
+  if ((beginning & 2) == 0) channel.refresh();
+  while (!input.isAtEnd()) takeStep(input, channel);
+  channel.refresh();
+  return 0;
+}

@@ -1,0 +1,34 @@
+// SPDX-License-Identifier: MIT
+// Bytes as a property list: what parses can be written in both forms and reads back the same.
+#include "Fuzz/Harness.h"
+#include "Platform/Linux/LinuxPlatform.h"
+#include "Platform/PropertyList.h"
+#include "Platform/PropertyListCoding.h"
+#include "Platform/PropertyListDescription.h"
+
+namespace kestro::fuzz {
+namespace {
+
+void checkForms(const PropertyListCoding& coding, const Value& value) {
+  const auto binary = coding.binary(value);
+  if (!binary) return;  // for instance a date outside the years that can be written
+  const auto again = coding.parse(*binary);
+  require(again.has_value(), "what was written as binary parses");
+  require(coding.binary(*again) == binary, "a second writing yields the same bytes");
+  const auto xml = coding.xml(value);
+  require(xml.has_value(), "what can be written as binary can be written as XML");
+  require(coding.parse(*xml).has_value(), "what was written as XML parses");
+}
+
+}  // namespace
+}  // namespace kestro::fuzz
+
+extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+  using namespace kestro;
+  static const auto coding = createPropertyListCoding();
+  const auto value = coding->parse({data, size});
+  if (!value) return 0;
+  fuzz::checkForms(*coding, *value);
+  static_cast<void>(value->deepCopy());
+  return 0;
+}

@@ -1,0 +1,29 @@
+// SPDX-License-Identifier: MIT
+// Any property list as a technology's template, then messages into what became of it.
+#include "Fuzz/GeneratorChannel.h"
+
+namespace kestro::fuzz {
+namespace {
+
+void addTemplate(GeneratorChannel& channel, ByteView contents) {
+  for (const char* name : {"LTE.plist", "Ondrel_GSM.plist", "UTRAN.plist", "C2KTemplate.plist"}) {
+    channel.platform().bundle().setResource(name, {contents.begin(), contents.end()});
+  }
+}
+
+}  // namespace
+}  // namespace kestro::fuzz
+
+extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+  using namespace kestro::fuzz;
+  Input input(data, size);
+  GeneratorChannel channel(KESTRO_FUZZ_TECHNOLOGY);
+  addTemplate(channel, input.bytes(input.number16()));
+  channel.start();
+  channel.refresh();
+  while (!input.isAtEnd()) channel.receive(input.bytes(input.number16() % 512));
+  channel.refresh();
+  channel.start();
+  channel.refresh();
+  return 0;
+}
