@@ -47,8 +47,15 @@ class Decoder {
         _platform(std::move(logFile)) {}
 
   int run() {
+    // The generator is gone before the log is finished: it leaves lines when it goes.
+    return decode() ? finish() : kExitNothingDone;
+  }
+
+ private:
+  /// Writes the capture's displays; false when nothing could be done.
+  [[nodiscard]] bool decode() {
     const auto generator = _feed.makeGenerator(_platform);
-    if (!generator) return kExitNothingDone;
+    if (!generator) return false;
     const std::unique_ptr<DecodeWriter> writer = makeWriter();
     Replay replay(*generator, _platform.clock(),
                   {.refreshInterval = durationOfSeconds(_options.refreshSeconds)},
@@ -56,15 +63,14 @@ class Decoder {
     writer->begin();
     while (_output.failureMessage().empty() && _feed.feedNext(replay)) {
     }
-    if (_feed.status() == kExitNothingDone) return kExitNothingDone;
+    if (_feed.status() == kExitNothingDone) return false;
     replay.finish();
     writer->finish({.technology = _feed.technology(),
                     .messages = _feed.messageCount(),
                     .display = replay.display()});
-    return finish();
+    return true;
   }
 
- private:
   [[nodiscard]] std::unique_ptr<DecodeWriter> makeWriter() {
     const auto& formats = decodeFormats();
     return std::ranges::find(formats, _options.format, &DecodeFormat::name)->makeWriter(_output);
