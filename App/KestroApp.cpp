@@ -7,6 +7,7 @@
 #include <QScreen>
 #include <utility>
 
+#include "App/Accessibility.h"
 #include "Platform/Bundle.h"
 #include "Platform/Clock.h"
 #include "Platform/DeviceRoot.h"
@@ -34,6 +35,7 @@ KestroApp::KestroApp(int& argumentCount, char** arguments)
   setApplicationName(QStringLiteral("kestro"));
   setApplicationDisplayName(QStringLiteral("Kestro"));
   setDesktopFileName(QStringLiteral("org.kestro.Kestro"));
+  installAccessibility();
   connect(this, &QCoreApplication::aboutToQuit, this, [this] { applicationWillTerminate(); });
 }
 
@@ -53,6 +55,7 @@ void KestroApp::applicationDidFinishLaunching(Platform& platform, const LaunchOp
   _model = KestroModel::create(platform, [this] { updateViewControllerFromModel(); });
   _wasConnected = false;
   _updateMessage = connecting();
+  _systemColours = std::make_unique<SystemColours>();
   createWindow(options);
   _connectionTimer = platform.mainQueue().scheduleRepeating(kConnectionCheckInterval,
                                                             [this] { checkConnection(); });
@@ -116,6 +119,7 @@ void KestroApp::applicationWillTerminate() {
   _window->hide();
   _window.reset();
   _model.reset();
+  _systemColours.reset();
   _platform = nullptr;
 }
 

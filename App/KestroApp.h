@@ -16,6 +16,7 @@
 #include "App/KestroSaveViewController.h"
 #include "App/MainWindow.h"
 #include "App/NavigationController.h"
+#include "App/SystemColours.h"
 #include "Model/KestroModel.h"
 #include "Platform/MainQueue.h"
 #include "Platform/Platform.h"
@@ -112,6 +113,7 @@ class KestroApp : public QApplication, private PaneHost {
   bool _allowSaveButton = false;
   QString _updateMessage;
 
+  std::unique_ptr<SystemColours> _systemColours;
   QPointer<AlertView> _alert;
   std::unique_ptr<Timer> _connectionTimer;
   bool _wasConnected = false;

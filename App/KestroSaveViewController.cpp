@@ -21,6 +21,7 @@ constexpr int kCellPoints = 13;
 constexpr int kTitlePoints = 17;
 constexpr int kCaptionPoints = 13;
 constexpr int kFieldPoints = 15;
+constexpr int kFieldMargin = 6;
 constexpr qreal kTextIndent = 10;
 constexpr int kMargin = 16;
 
@@ -77,6 +78,7 @@ void KestroSaveViewController::viewDidLoad() {
   const Colours colours = coloursOf(palette());
   _ui->titleLabel->setFont(systemTextStyle(kTitlePoints, QFont::Bold).font());
   _ui->saveDescription->setFont(systemTextStyle(kFieldPoints).font());
+  _ui->saveDescription->setTextMargins(kFieldMargin, 0, kFieldMargin, 0);
   for (QLabel* caption : {_ui->descriptionCaption, _ui->contentCaption}) {
     caption->setFont(systemTextStyle(kCaptionPoints).font());
     setTextColour(*caption, colours.faintText);

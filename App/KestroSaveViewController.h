@@ -11,7 +11,7 @@
 #include "Model/Snapshot.h"
 #include "Platform/Platform.h"
 
-namespace Ui {
+namespace Ui {  // NOLINT(readability-identifier-naming): made of the interface file
 class KestroSaveViewController;
 }  // namespace Ui
 

@@ -36,9 +36,11 @@ void setUpScrolling(QWidget* viewport) {
 
 }  // namespace
 
-TableView::TableView(QWidget* parent) : QAbstractScrollArea(parent) {
+TableView::TableView(QWidget* parent)
+    : QAbstractScrollArea(parent), _scrollBar(new ThinScrollBar(this)) {
   setFrameShape(QFrame::NoFrame);
   setHorizontalScrollBarPolicy(Qt::ScrollBarAlwaysOff);
+  setVerticalScrollBar(_scrollBar);
   setFocusPolicy(Qt::StrongFocus);
   viewport()->setAutoFillBackground(false);
   verticalScrollBar()->setSingleStep(kRowHeight);
@@ -145,6 +147,7 @@ void TableView::paintEvent(QPaintEvent*) {
   const Colours colours = coloursOf(palette());
   const Column column = columnIn(viewport()->width());
   QPainter painter(viewport());
+  _scrollBar->setGround(column.left > 0 ? colours.ground : colours.row);
   painter.fillRect(viewport()->rect(), colours.ground);
   painter.fillRect(QRect(column.left, 0, column.width, viewport()->height()), colours.row);
   if (column.left > 0) {

@@ -9,6 +9,7 @@
 #include <memory>
 
 #include "App/TableCell.h"
+#include "App/ThinScrollBar.h"
 
 namespace kestro {
 
@@ -92,6 +93,7 @@ class TableView : public QAbstractScrollArea {
   void pan(const QPointF& position);
   void announceFocus() const;
 
+  ThinScrollBar* _scrollBar;
   DataSource _source;
   Cells _cells;     ///< of the rows on the screen
   Cells _reusable;  ///< of rows near it, and of those being reloaded

@@ -24,21 +24,15 @@ constexpr int kSpacing = 8;
 constexpr int kLabelPoints = 14;
 
 /// A text sized to fit, on one line, with figures of equal width.
-class BarLabel : public QWidget {
+class BarLabel : public QLabel {
  public:
-  explicit BarLabel(QWidget* parent) : QWidget(parent) {
+  explicit BarLabel(QWidget* parent) : QLabel(parent) {
+    setTextFormat(Qt::PlainText);
     setSizePolicy(QSizePolicy::Preferred, QSizePolicy::Fixed);
   }
 
-  void setText(const QString& text) {
-    if (_text == text) return;
-    _text = text;
-    setAccessibleName(text);
-    updateGeometry();
-    update();
-  }
   [[nodiscard]] QSize sizeHint() const override {
-    return systemTextStyle(kLabelPoints).size(_text).toSize() + QSize(1, 0);
+    return systemTextStyle(kLabelPoints).size(text()).toSize() + QSize(1, 0);
   }
   [[nodiscard]] QSize minimumSizeHint() const override { return {0, sizeHint().height()}; }
 
@@ -47,11 +41,8 @@ class BarLabel : public QWidget {
     QPainter painter(this);
     painter.setPen(coloursOf(palette()).text);
     const TextStyle& style = systemTextStyle(kLabelPoints);
-    style.draw(painter, rect(), style.elided(_text, width()));
+    style.draw(painter, rect(), style.elided(text(), width()));
   }
-
- private:
-  QString _text;
 };
 
 void fadeIn(QWidget& widget) {
@@ -78,11 +69,11 @@ ToolbarItem ToolbarItem::label(QString text) {
 
 ToolbarItem ToolbarItem::flexibleSpace() { return {.kind = Kind::FlexibleSpace}; }
 
-ToolbarItem ToolbarItem::button(QString title, QKeySequence shortcut,
+ToolbarItem ToolbarItem::button(QString title, const QKeySequence& shortcut,
                                 std::function<void()> action) {
   return {.kind = Kind::Button,
           .text = std::move(title),
-          .shortcut = std::move(shortcut),
+          .shortcut = shortcut,
           .action = std::move(action)};
 }
 
@@ -98,6 +89,7 @@ void Toolbar::setItems(std::vector<ToolbarItem> items, bool animated) {
   _items = std::move(items);
   if (!sameKinds) rebuild(animated);
   for (std::size_t i = 0; i < _items.size(); ++i) fill(i);
+  _layout->activate();  // the same frame shows texts and their room
 }
 
 void Toolbar::rebuild(bool animated) {

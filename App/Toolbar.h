@@ -20,7 +20,7 @@ struct ToolbarItem {
   [[nodiscard]] static ToolbarItem label(QString text);
   [[nodiscard]] static ToolbarItem flexibleSpace();
   /// `shortcut` presses it too, while the screen is on top.
-  [[nodiscard]] static ToolbarItem button(QString title, QKeySequence shortcut,
+  [[nodiscard]] static ToolbarItem button(QString title, const QKeySequence& shortcut,
                                           std::function<void()> action);
 
   Kind kind = Kind::FlexibleSpace;

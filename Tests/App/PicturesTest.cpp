@@ -3,25 +3,15 @@
 // which is how the pictures in the documentation are taken.
 #include <gmock/gmock.h>
 
-#include <QPalette>
+#include <algorithm>
 #include <cstdlib>
+#include <set>
 
+#include "App/SystemColours.h"
 #include "Tests/App/WindowFixture.h"
 
 namespace kestro::testing {
 namespace {
-
-/// The colours that desktops call dark.
-QPalette darkPalette() {
-  QPalette palette(QColor(0x30, 0x30, 0x30));
-  palette.setColor(QPalette::Window, QColor(0x24, 0x24, 0x24));
-  palette.setColor(QPalette::WindowText, QColor(0xf2, 0xf2, 0xf2));
-  palette.setColor(QPalette::Base, QColor(0x1b, 0x1b, 0x1d));
-  palette.setColor(QPalette::Text, QColor(0xf2, 0xf2, 0xf2));
-  palette.setColor(QPalette::PlaceholderText, QColor(0x8e, 0x8e, 0x93));
-  palette.setColor(QPalette::Highlight, QColor(0x35, 0x84, 0xe4));
-  return palette;
-}
 
 class PicturesTest : public WindowTest, public ::testing::WithParamInterface<const char*> {
  protected:
@@ -51,6 +41,10 @@ class PicturesTest : public WindowTest, public ::testing::WithParamInterface<con
     EXPECT_EQ(title(), name);
   }
 
+  static void waitUntilUnmarked() {
+    EXPECT_TRUE(waitFor([] { return !top().tableView().cellAtRow(0)->isMarkedChanged(); }));
+  }
+
   QPalette paletteBefore;
 };
 
@@ -61,16 +55,31 @@ TEST_P(PicturesTest, TheRootPane) {
 
 TEST_P(PicturesTest, ASection) {
   open("Serving Cell");
+  open("Serving Cell Measurements");
+  ASSERT_TRUE(waitFor([] { return rows().size() >= 10; }));
+  waitUntilUnmarked();
   takePicture("section");
 }
 
 TEST_P(PicturesTest, AListOfCellsAndOneOfThem) {
   open("Neighbors");
-  takePicture("lists");
+  open("Neighbor Cells List");
+  ASSERT_TRUE(waitFor([] { return rows().size() >= 3; }));
+  takePicture("cells");
+  open("0");
+  EXPECT_GE(rows().size(), 10);
+  // With the values that have just changed marked.
+  ASSERT_TRUE(waitFor([] { return top().tableView().cellAtRow(1)->isMarkedChanged(); }));
+  takePicture("cell");
 }
 
 TEST_P(PicturesTest, TheSaveScreenAndTheFileError) {
-  ASSERT_TRUE(waitFor([] { return status().starts_with("Updated"); }));
+  // A history of some entries makes a better list.
+  std::set<std::string> updates;
+  ASSERT_TRUE(waitFor([&] {
+    updates.insert(status());
+    return updates.size() >= 3;
+  }));
   key(Qt::Key_S, Qt::ControlModifier);
   ASSERT_NE(app().saveViewController(), nullptr);
   QTest::keyClicks(&app().saveViewController()->saveDescription(), "Handover near the river");

@@ -1,0 +1,36 @@
+// SPDX-License-Identifier: MIT
+// The desktop's wish for light or dark colours, where the toolkit does not know it itself.
+#pragma once
+
+#include <QDBusVariant>
+#include <QObject>
+#include <QPalette>
+#include <QString>
+
+namespace kestro {
+
+/// Dark colours for everything.
+[[nodiscard]] QPalette darkPalette();
+
+/// Asks the desktop's settings portal on the session bus, and follows it while this lives: the
+/// application has dark colours while the desktop prefers them, else those that it had before. A
+/// toolkit that has found dark colours by itself is left alone, and without a bus or a portal
+/// nothing happens. Nothing here waits for the bus.
+class SystemColours : public QObject {
+  Q_OBJECT
+
+ public:
+  SystemColours();
+  ~SystemColours() override;
+
+ private Q_SLOTS:
+  void settingChanged(const QString& group, const QString& key, const QDBusVariant& value);
+
+ private:
+  void follow();
+  void apply(const QVariant& value);
+
+  QPalette _usualPalette;
+};
+
+}  // namespace kestro
