@@ -103,7 +103,7 @@ class WindowTest : public ::testing::Test {
   static std::string title() { return stack().navigationBar().title().toStdString(); }
   static void click(QWidget* widget) { QTest::mouseClick(widget, Qt::LeftButton); }
   static void key(Qt::Key key, Qt::KeyboardModifiers modifiers = {}) {
-    QTest::keyClick(QApplication::focusWidget(), key, modifiers);
+    QTest::keyClick(app().window()->focusWidget(), key, modifiers);
   }
   /// Taps a row of the top pane, and waits until its pane is there.
   static void tap(int row) {
