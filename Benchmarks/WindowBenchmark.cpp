@@ -82,6 +82,7 @@ void firstFrame(benchmark::State& state) {
   const std::string picture = (folder / "picture.png").string();
   std::vector<std::string> texts{program, "--size=390x780", "--screenshot=" + picture, "--after=0"};
   std::vector<char*> arguments;
+  arguments.reserve(texts.size() + 1);
   for (std::string& text : texts) arguments.push_back(text.data());
   arguments.push_back(nullptr);
   const auto run = [&] {

@@ -14,11 +14,13 @@
 namespace kestro::testing {
 
 class AppFixture : public ModelFixture {
+ public:
+  ~AppFixture() override { app().applicationWillTerminate(); }
+
  protected:
   AppFixture() {
     platform.clock().setNow(Moment(1'330'866'000s));  // 2012-03-04 13:00:00 UTC
   }
-  ~AppFixture() override { app().applicationWillTerminate(); }
 
   static KestroApp& app() { return *static_cast<KestroApp*>(QCoreApplication::instance()); }
 

@@ -234,6 +234,18 @@ TEST_F(KestroAppTest, TheEndOfTheEventLoopIsTheExit) {
   EXPECT_EQ(platform.preferences().events().size(), 6);
 }
 
+TEST_F(KestroAppTest, TheSessionsEndIsTheExit) {
+  launch();
+  // What the toolkit makes of a session manager that ends the session.
+  QTimer::singleShot(0, [] {
+    QEvent quit(QEvent::Quit);
+    QCoreApplication::sendEvent(&app(), &quit);
+  });
+  QCoreApplication::exec();
+  EXPECT_EQ(app().window(), nullptr);
+  EXPECT_EQ(platform.preferences().events().size(), 6);
+}
+
 // --- Marks ---------------------------------------------------------------------------------------
 
 bool isMarked(int row, const TableView& table) { return table.cellAtRow(row)->isMarkedChanged(); }

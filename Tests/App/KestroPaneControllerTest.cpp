@@ -167,6 +167,7 @@ TEST_F(KestroPaneControllerTest, OnlyTheRowThatChangedItsKindKeepsTheOtherCell) 
 
 std::vector<NodePointer> numberedLeaves(int count) {
   std::vector<NodePointer> result;
+  result.reserve(static_cast<std::size_t>(count));
   for (int i = 0; i < count; ++i) result.push_back(leaf("n" + std::to_string(i), "v"));
   return result;
 }

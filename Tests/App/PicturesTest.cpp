@@ -14,6 +14,9 @@ namespace kestro::testing {
 namespace {
 
 class PicturesTest : public WindowTest, public ::testing::WithParamInterface<const char*> {
+ public:
+  ~PicturesTest() override { QApplication::setPalette(paletteBefore); }
+
  protected:
   PicturesTest() : paletteBefore(QApplication::palette()) {
     if (isDark()) QApplication::setPalette(darkPalette());
@@ -21,7 +24,6 @@ class PicturesTest : public WindowTest, public ::testing::WithParamInterface<con
     launch();
     EXPECT_TRUE(waitFor([] { return status().starts_with("Updated"); }));
   }
-  ~PicturesTest() override { QApplication::setPalette(paletteBefore); }
 
   static bool isDark() { return std::string(GetParam()) == "dark"; }
 

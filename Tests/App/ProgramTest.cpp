@@ -1,7 +1,10 @@
 // SPDX-License-Identifier: MIT
 // The program as a process: its options, its signals and its ends.
+#include <fcntl.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <sys/stat.h>
+#include <unistd.h>
 
 #include <QImage>
 #include <csignal>
@@ -38,6 +41,15 @@ class ProgramTest : public LiveTest {
     all.insert(all.end(), more.begin(), more.end());
     return std::make_unique<Process>(
         arguments, Process::Options{.environment = all, .terminal = Process::Terminal::None});
+  }
+
+  /// Writes three seconds of displays, then what no display can be made of; the file's path.
+  [[nodiscard]] std::string writeEndingCapture() const {
+    std::vector<std::string> messages(30, ifxMessage("1"));
+    messages.insert(messages.end(), 10, "garbage");
+    const std::string capture = folder("ending.pcap");
+    writeCapture(capture, messages, std::chrono::milliseconds(100));
+    return capture;
   }
 
   [[nodiscard]] std::string contentsOf(const std::string& path) const {
@@ -137,12 +149,7 @@ TEST_F(ProgramTest, WithoutADisplayItSaysSo) {
 }
 
 TEST_F(ProgramTest, AFailureThatNothingCatchesIsNamedAndTheHistorySaved) {
-  // Three seconds of displays, then what no display can be made of.
-  std::vector<std::string> messages(30, ifxMessage("1"));
-  messages.insert(messages.end(), 10, "garbage");
-  const std::string capture = folder("ending.pcap");
-  writeCapture(capture, messages, std::chrono::milliseconds(100));
-  const auto kestro = startKestro({"--demo=capture:" + capture});
+  const auto kestro = startKestro({"--demo=capture:" + writeEndingCapture()});
   EXPECT_EQ(kestro->wait(), -SIGABRT);
   EXPECT_THAT(kestro->errors(),
               HasSubstr("kestro: ended by a failure: Could not deserialize the object "
@@ -152,6 +159,21 @@ TEST_F(ProgramTest, AFailureThatNothingCatchesIsNamedAndTheHistorySaved) {
   const std::string saved = contentsOf(snapshots()[0]);
   EXPECT_THAT(saved, HasSubstr("<string>Unexpected end</string>"));
   EXPECT_THAT(saved, HasSubstr("<key>DisplayState</key>"));
+}
+
+TEST_F(ProgramTest, LastWordsThatNobodyTakesDoNotHoldUpTheEnd) {
+  // Standard error is a pipe that is full.
+  const std::string pipe = folder("pipe");
+  ASSERT_EQ(::mkfifo(pipe.c_str(), 0600), 0);
+  const int end = ::open(pipe.c_str(), O_RDWR | O_NONBLOCK | O_CLOEXEC);
+  const std::string filling(4096, 'x');
+  while (::write(end, filling.data(), filling.size()) > 0) continue;
+  Process kestro({"/bin/sh", "-c",
+                  "exec " KESTRO_PROGRAM_DIRECTORY "/kestro --demo=capture:'" +
+                      writeEndingCapture() + "' 2>'" + pipe + "'"},
+                 {.environment = environment(), .terminal = Process::Terminal::None});
+  EXPECT_EQ(kestro.wait(), -SIGABRT);
+  ::close(end);
 }
 
 TEST_F(ProgramTest, TheShellIsToldOnTheSessionBus) {

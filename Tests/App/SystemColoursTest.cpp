@@ -35,6 +35,13 @@ class Portal : public QDBusVirtualObject {
 
 /// A session bus of the test's own, with a portal on it.
 class SystemColoursTest : public ::testing::Test {
+ public:
+  ~SystemColoursTest() override {
+    QDBusConnection::disconnectFromBus("portal");
+    qunsetenv("DBUS_SESSION_BUS_ADDRESS");
+    QApplication::setPalette(before);
+  }
+
  protected:
   SystemColoursTest() {
     EXPECT_TRUE(testing::eventually([&] { return std::filesystem::exists(socket.path()); }));
@@ -42,11 +49,6 @@ class SystemColoursTest : public ::testing::Test {
     bus = QDBusConnection::connectToBus(QString::fromStdString(address), "portal");
     EXPECT_TRUE(bus.registerService("org.freedesktop.portal.Desktop"));
     EXPECT_TRUE(bus.registerVirtualObject(kPath, &portal));
-  }
-  ~SystemColoursTest() override {
-    QDBusConnection::disconnectFromBus("portal");
-    qunsetenv("DBUS_SESSION_BUS_ADDRESS");
-    QApplication::setPalette(before);
   }
 
   void change(const char* group, const char* key, uint scheme) {

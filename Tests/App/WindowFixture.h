@@ -24,6 +24,12 @@
 namespace kestro::testing {
 
 class WindowTest : public ::testing::Test {
+ public:
+  ~WindowTest() override {
+    app().applicationWillTerminate();
+    ::close(feed);
+  }
+
  protected:
   WindowTest() {
     ::setenv("KESTRO_DEVICE_ROOT", deviceRoot().c_str(), 1);
@@ -36,10 +42,6 @@ class WindowTest : public ::testing::Test {
     EXPECT_EQ(::mkfifo(pipe.path().c_str(), 0600), 0);
     feed = ::open(pipe.path().c_str(), O_RDWR | O_CLOEXEC);
     EXPECT_GE(feed, 0);
-  }
-  ~WindowTest() override {
-    app().applicationWillTerminate();
-    ::close(feed);
   }
 
   static KestroApp& app() { return *static_cast<KestroApp*>(QCoreApplication::instance()); }
