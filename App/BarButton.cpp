@@ -62,29 +62,35 @@ void BarButton::paintEvent(QPaintEvent*) {
   const Colours colours = coloursOf(palette());
   QPainter painter(this);
   painter.setRenderHint(QPainter::Antialiasing);
+  paintFrame(painter, colours.accent);
   const bool isFilled = _shape == Shape::Filled;
-  QColor fill = colours.accent;
-  const qreal lit = isDown() ? 0.2 : underMouse() ? 0.1 : 0.0;
-  fill.setAlphaF(static_cast<float>(isFilled ? 1 - lit : lit));
-  const QRectF frame = QRectF(rect()).adjusted(1, 1, -1, -1);
-  painter.setPen(hasFocus() ? QPen(colours.accent, 2) : QPen(Qt::NoPen));
-  painter.setBrush(fill);
-  painter.drawRoundedRect(frame, kRadius, kRadius);
-
   const QColor ink = isFilled ? readable(colours.row, colours.accent) : colours.accent;
   painter.setOpacity(isEnabled() ? 1 : 0.4);
   painter.setPen(QPen(ink, 2.4, Qt::SolidLine, Qt::RoundCap, Qt::RoundJoin));
+  paintContent(painter);
+}
+
+void BarButton::paintFrame(QPainter& painter, QColor fill) const {
+  const qreal lit = isDown() ? 0.2 : underMouse() ? 0.1 : 0.0;
+  painter.setPen(hasFocus() ? QPen(fill, 2) : QPen(Qt::NoPen));
+  fill.setAlphaF(static_cast<float>(_shape == Shape::Filled ? 1 - lit : lit));
+  painter.setBrush(fill);
+  painter.drawRoundedRect(QRectF(rect()).adjusted(1, 1, -1, -1), kRadius, kRadius);
+}
+
+void BarButton::paintContent(QPainter& painter) const {
+  const TextStyle& style = systemTextStyle(kPoints, _isStrong ? QFont::Bold : QFont::Normal);
+  const qreal room = width() - textIndent() - kPadding / 2.0;
+  const QString shown = style.elided(text(), room);
+  QRectF frame(textIndent(), 0, room, height());
   if (_shape == Shape::Back) {
     painter.translate(0, height() * 0.5);
     painter.drawPolyline(kArrow.data(), static_cast<int>(kArrow.size()));
     painter.translate(0, height() * -0.5);
+  } else {
+    frame.moveLeft((width() - style.size(shown).width()) * 0.5);
   }
-  const TextStyle& style = systemTextStyle(kPoints, _isStrong ? QFont::Bold : QFont::Normal);
-  const qreal room = width() - textIndent() - kPadding / 2.0;
-  const QString shown = style.elided(text(), room);
-  const qreal slack =
-      _shape == Shape::Back ? 0 : (room - style.size(shown).width()) * 0.5 - kPadding / 4.0;
-  style.draw(painter, QRectF(textIndent() + slack, 0, room, height()), shown);
+  style.draw(painter, frame, shown);
 }
 
 }  // namespace kestro

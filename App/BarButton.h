@@ -30,6 +30,8 @@ class BarButton : public QAbstractButton {
 
  private:
   [[nodiscard]] qreal textIndent() const;
+  void paintFrame(QPainter& painter, QColor fill) const;
+  void paintContent(QPainter& painter) const;
 
   Shape _shape = Shape::Plain;
   bool _isStrong = false;

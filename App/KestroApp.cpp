@@ -52,17 +52,25 @@ void KestroApp::applicationDidFinishLaunching(Platform& platform, const LaunchOp
   _isPlain = options.plain;
   getRSSIPref();
   getSaveButtonPref();
+  _systemColours = std::make_unique<SystemColours>();
+  createWindow(options.windowSize);
   _model = KestroModel::create(platform, [this] { updateViewControllerFromModel(); });
   _wasConnected = false;
   _updateMessage = connecting();
-  _systemColours = std::make_unique<SystemColours>();
-  createWindow(options);
+  showRootPane();
   _connectionTimer = platform.mainQueue().scheduleRepeating(kConnectionCheckInterval,
                                                             [this] { checkConnection(); });
   if (options.connectsAtLaunch) connectAfterFirstFrame();
 }
 
-void KestroApp::createWindow(const LaunchOptions& options) {
+void KestroApp::createWindow(const std::optional<QSize>& size) {
+  _window = std::make_unique<MainWindow>();
+  _window->setWindowTitle(QStringLiteral("Kestro"));
+  _window->setWindowIcon(iconOf(_platform->bundle()));
+  placeWindow(size);
+}
+
+void KestroApp::showRootPane() {
   PaneHost& host = *this;
   auto root = std::make_unique<KestroPaneController>(host, nullptr, std::string(kRootPath));
   root->setStatus(QStringLiteral("Connecting"), true);
@@ -71,10 +79,7 @@ void KestroApp::createWindow(const LaunchOptions& options) {
     navigationControllerWillShowViewController(pane, animated);
   });
   _navController = navController.get();
-  _window = std::make_unique<MainWindow>(std::move(navController));
-  _window->setWindowTitle(QStringLiteral("Kestro"));
-  _window->setWindowIcon(iconOf(_platform->bundle()));
-  placeWindow(options.windowSize);
+  _window->setNavController(std::move(navController));
   _window->show();
   _window->setFocus();
   // The event loop is entered by the platform, which knows of no accessibility.

@@ -96,8 +96,9 @@ class KestroApp : public QApplication, private PaneHost {
   [[nodiscard]] bool marksChanges() const override { return !_isPlain; }
   void pushPane(std::unique_ptr<ViewController> pane) override;
 
-  void createWindow(const LaunchOptions& options);
+  void createWindow(const std::optional<QSize>& size);
   void placeWindow(const std::optional<QSize>& size);
+  void showRootPane();
   void connectAfterFirstFrame();
   void reloadPanes();
   void checkConnection();

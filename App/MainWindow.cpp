@@ -5,17 +5,21 @@
 
 namespace kestro {
 
-MainWindow::MainWindow(std::unique_ptr<NavigationController> navController)
-    : _navController(navController.release()) {
+MainWindow::MainWindow() { setMinimumSize(240, 240); }
+
+void MainWindow::setNavController(std::unique_ptr<NavigationController> navController) {
+  delete std::exchange(_navController, navController.release());
   _navController->setParent(this);
+  _navController->setGeometry(rect());
   setFocusProxy(_navController);
-  setMinimumSize(240, 240);
 }
 
 void MainWindow::paintEvent(QPaintEvent*) {
   if (const auto handler = std::exchange(_firstFrame, nullptr)) handler();
 }
 
-void MainWindow::resizeEvent(QResizeEvent*) { _navController->setGeometry(rect()); }
+void MainWindow::resizeEvent(QResizeEvent*) {
+  if (_navController != nullptr) _navController->setGeometry(rect());
+}
 
 }  // namespace kestro

@@ -10,12 +10,14 @@
 
 namespace kestro {
 
-/// Is filled by a navigation stack, which it owns.
+/// Is filled by a navigation stack, which it owns; empty at first.
 class MainWindow : public QWidget {
   Q_OBJECT
 
  public:
-  explicit MainWindow(std::unique_ptr<NavigationController> navController);
+  MainWindow();
+
+  void setNavController(std::unique_ptr<NavigationController> navController);
 
   /// Called once, while the window is painted for the first time.
   void setFirstFrameHandler(std::function<void()> handler) { _firstFrame = std::move(handler); }
@@ -25,7 +27,7 @@ class MainWindow : public QWidget {
   void resizeEvent(QResizeEvent* event) override;
 
  private:
-  NavigationController* _navController;
+  NavigationController* _navController = nullptr;
   std::function<void()> _firstFrame;
 };
 

@@ -221,36 +221,34 @@ void TableView::announceFocus() const {
 // --- Keys ----------------------------------------------------------------------------------------
 
 void TableView::keyPressEvent(QKeyEvent* event) {
-  event->setAccepted(moveFocus(*event) || actOnFocus(*event));
+  if (const auto row = rowAfter(*event)) {
+    focusByKey(*row);
+  } else {
+    event->setAccepted(actOnFocus(*event));
+  }
 }
 
-bool TableView::moveFocus(const QKeyEvent& event) {
-  if ((event.modifiers() & ~Qt::KeypadModifier) != Qt::NoModifier) return false;
+std::optional<int> TableView::rowAfter(const QKeyEvent& event) const {
+  if ((event.modifiers() & ~Qt::KeypadModifier) != Qt::NoModifier) return std::nullopt;
   const int page = std::max(1, viewport()->height() / kRowHeight - 1);
   // The first arrow shows where the focus is, or takes it to the first row.
   const int step = _focusedRow >= 0 ? 1 : 0;
   const int from = std::max(0, _focusedRow);
   switch (event.key()) {
     case Qt::Key_Up:
-      focusByKey(from - step);
-      return true;
+      return from - step;
     case Qt::Key_Down:
-      focusByKey(from + step);
-      return true;
+      return from + step;
     case Qt::Key_PageUp:
-      focusByKey(from - page);
-      return true;
+      return from - page;
     case Qt::Key_PageDown:
-      focusByKey(from + page);
-      return true;
+      return from + page;
     case Qt::Key_Home:
-      focusByKey(0);
-      return true;
+      return 0;
     case Qt::Key_End:
-      focusByKey(_rowCount - 1);
-      return true;
+      return _rowCount - 1;
     default:
-      return false;
+      return std::nullopt;
   }
 }
 

@@ -7,6 +7,7 @@
 #include <functional>
 #include <map>
 #include <memory>
+#include <optional>
 
 #include "App/TableCell.h"
 #include "App/ThinScrollBar.h"
@@ -86,7 +87,8 @@ class TableView : public QAbstractScrollArea {
   void retireCells(int first, int last);
   void updateStates();
   void select(int row);
-  [[nodiscard]] bool moveFocus(const QKeyEvent& event);
+  /// The row that a key moves the focus to; absent for keys that do not move it.
+  [[nodiscard]] std::optional<int> rowAfter(const QKeyEvent& event) const;
   [[nodiscard]] bool actOnFocus(const QKeyEvent& event);
   void focusByKey(int row);
   void press(int row);
