@@ -9,6 +9,7 @@
 #include <QPainter>
 #include <QScrollBar>
 #include <QScroller>
+#include <QTouchEvent>
 #include <QWheelEvent>
 #include <algorithm>
 #include <cmath>
@@ -25,7 +26,7 @@ constexpr int kHairlineIndent = 16;
 constexpr qreal kSidewaysStep = 60;
 
 void setUpScrolling(QWidget* viewport) {
-  QScroller::grabGesture(viewport, QScroller::TouchGesture);
+  viewport->setAttribute(Qt::WA_AcceptTouchEvents);
   QScrollerProperties properties = QScroller::scroller(viewport)->scrollerProperties();
   properties.setScrollMetric(QScrollerProperties::HorizontalOvershootPolicy,
                              QScrollerProperties::OvershootAlwaysOff);
@@ -45,6 +46,7 @@ TableView::TableView(QWidget* parent)
   viewport()->setAutoFillBackground(false);
   verticalScrollBar()->setSingleStep(kRowHeight);
   setUpScrolling(viewport());
+  _touchClock.start();
 }
 
 TableView::~TableView() = default;
@@ -126,7 +128,8 @@ void TableView::showRow(int row) {
 void TableView::updateStates() {
   for (const auto& [row, cell] : _cells) {
     cell->setFocusShown(_showsFocus && hasFocus() && row == _focusedRow);
-    cell->setPressed(row == _pressedRow || row == _selectedRow);
+    const bool isPressed = _movement == Movement::Pressed && row == _pressedRow;
+    cell->setPressed(isPressed || row == _selectedRow);
   }
 }
 
@@ -288,39 +291,81 @@ void TableView::press(int row) {
   updateStates();
 }
 
-void TableView::mousePressEvent(QMouseEvent* event) {
-  event->setAccepted(event->button() == Qt::LeftButton);
-  if (!event->isAccepted()) return;
+void TableView::pressAt(const QPointF& position) {
   _showsFocus = false;
   _movement = Movement::Pressed;
-  _pressPosition = _lastPosition = event->position();
-  press(rowAt(event->position().toPoint()));
+  _pressPosition = _lastPosition = position;
+  press(rowAt(position.toPoint()));
 }
 
-void TableView::mouseMoveEvent(QMouseEvent* event) {
+void TableView::moveTo(const QPointF& position) {
   if (_movement == Movement::Pressed) {
-    const QPointF moved = event->position() - _pressPosition;
+    const QPointF moved = position - _pressPosition;
     if (moved.manhattanLength() < QApplication::startDragDistance()) return;
     const bool isSideways = std::abs(moved.x()) > std::abs(moved.y());
     _movement = isSideways ? Movement::Sideways : Movement::Elsewhere;
     updateStates();
-    if (TableCell* cell = cellAtRow(_pressedRow)) cell->setPressed(false);
   }
-  if (_movement == Movement::Sideways) pan(event->position());
+  if (_movement == Movement::Sideways) pan(position);
+}
+
+void TableView::releaseAt(const QPointF& position) {
+  const Movement movement = std::exchange(_movement, Movement::None);
+  const int row = std::exchange(_pressedRow, -1);
+  updateStates();
+  if (movement == Movement::Pressed && row >= 0 && row == rowAt(position.toPoint())) select(row);
+}
+
+void TableView::mousePressEvent(QMouseEvent* event) {
+  event->setAccepted(event->button() == Qt::LeftButton);
+  if (event->isAccepted()) pressAt(event->position());
+}
+
+void TableView::mouseMoveEvent(QMouseEvent* event) { moveTo(event->position()); }
+
+void TableView::mouseReleaseEvent(QMouseEvent* event) {
+  if (event->button() == Qt::LeftButton) releaseAt(event->position());
+}
+
+bool TableView::viewportEvent(QEvent* event) {
+  switch (event->type()) {
+    case QEvent::TouchBegin:
+    case QEvent::TouchUpdate:
+    case QEvent::TouchEnd:
+    case QEvent::TouchCancel:
+      touch(static_cast<QTouchEvent&>(*event));
+      event->accept();
+      return true;
+    default:
+      return QAbstractScrollArea::viewportEvent(event);
+  }
+}
+
+/// One finger presses, moves content sideways, or scrolls; it stops rows that coast, too.
+void TableView::touch(const QTouchEvent& event) {
+  QScroller* scroller = QScroller::scroller(viewport());
+  const QPointF position = event.points().first().position();
+  const auto scroll = [&](QScroller::Input input) {
+    scroller->handleInput(input, position, _touchClock.elapsed());
+  };
+  if (event.type() == QEvent::TouchBegin) {
+    const bool coasts = scroller->state() == QScroller::Scrolling;
+    pressAt(position);
+    if (coasts) _movement = Movement::Elsewhere;
+    scroll(QScroller::InputPress);
+  } else if (event.type() == QEvent::TouchUpdate) {
+    moveTo(position);
+    if (_movement != Movement::Sideways) scroll(QScroller::InputMove);
+  } else {
+    if (event.type() == QEvent::TouchCancel) _movement = Movement::Elsewhere;
+    scroll(QScroller::InputRelease);
+    releaseAt(position);
+  }
 }
 
 void TableView::pan(const QPointF& position) {
   const qreal distance = std::exchange(_lastPosition, position).x() - position.x();
   if (TableCell* cell = cellAtRow(_pressedRow)) cell->scrollContentBy(distance);
-}
-
-void TableView::mouseReleaseEvent(QMouseEvent* event) {
-  const Movement movement = std::exchange(_movement, Movement::None);
-  const int row = std::exchange(_pressedRow, -1);
-  updateStates();
-  if (movement == Movement::Pressed && row >= 0 && row == rowAt(event->position().toPoint())) {
-    select(row);
-  }
 }
 
 void TableView::wheelEvent(QWheelEvent* event) {

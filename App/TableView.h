@@ -3,6 +3,7 @@
 #pragma once
 
 #include <QAbstractScrollArea>
+#include <QElapsedTimer>
 #include <QPointF>
 #include <functional>
 #include <map>
@@ -11,6 +12,8 @@
 
 #include "App/TableCell.h"
 #include "App/ThinScrollBar.h"
+
+class QTouchEvent;
 
 namespace kestro {
 
@@ -70,6 +73,7 @@ class TableView : public QAbstractScrollArea {
   void mouseMoveEvent(QMouseEvent* event) override;
   void mouseReleaseEvent(QMouseEvent* event) override;
   void wheelEvent(QWheelEvent* event) override;
+  bool viewportEvent(QEvent* event) override;
   void resizeEvent(QResizeEvent* event) override;
   void paintEvent(QPaintEvent* event) override;
   void focusInEvent(QFocusEvent* event) override;
@@ -92,6 +96,10 @@ class TableView : public QAbstractScrollArea {
   [[nodiscard]] bool actOnFocus(const QKeyEvent& event);
   void focusByKey(int row);
   void press(int row);
+  void pressAt(const QPointF& position);
+  void moveTo(const QPointF& position);
+  void releaseAt(const QPointF& position);
+  void touch(const QTouchEvent& event);
   void pan(const QPointF& position);
   void announceFocus() const;
 
@@ -109,6 +117,7 @@ class TableView : public QAbstractScrollArea {
   int _pressedRow = -1;
   QPointF _pressPosition;
   QPointF _lastPosition;
+  QElapsedTimer _touchClock;
 };
 
 }  // namespace kestro

@@ -47,7 +47,7 @@ class ProgramTest : public LiveTest {
   [[nodiscard]] std::string writeEndingCapture() const {
     std::vector<std::string> messages(30, ifxMessage("1"));
     messages.insert(messages.end(), 10, "garbage");
-    const std::string capture = folder("ending.pcap");
+    std::string capture = folder("ending.pcap");
     writeCapture(capture, messages, std::chrono::milliseconds(100));
     return capture;
   }

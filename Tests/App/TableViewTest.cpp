@@ -193,23 +193,38 @@ TEST_F(TableViewTest, RightAndLeftMoveTheFocusedRowsContent) {
 }
 
 TEST_F(TableViewTest, ATapSelectsItsRow) {
-  QPointingDevice* device = QTest::createTouchDevice();
+  const std::unique_ptr<QPointingDevice> device(QTest::createTouchDevice());
   const QPoint place = table.viewport()->mapTo(&table, middleOf(3));
-  QTest::touchEvent(&table, device).press(0, place, &table);
-  QTest::touchEvent(&table, device).release(0, place, &table);
+  QTest::touchEvent(&table, device.get()).press(0, place, &table);
+  QTest::touchEvent(&table, device.get()).release(0, place, &table);
   EXPECT_THAT(selected, ElementsAre(3));
 }
 
 TEST_F(TableViewTest, AFingerThatMovesScrollsAndSelectsNothing) {
-  QPointingDevice* device = QTest::createTouchDevice();
-  QTest::touchEvent(&table, device).press(0, QPoint(200, 400), &table);
+  const std::unique_ptr<QPointingDevice> device(QTest::createTouchDevice());
+  QTest::touchEvent(&table, device.get()).press(0, QPoint(200, 400), &table);
   for (int y = 390; y >= 100; y -= 10) {
     QTest::qWait(2);
-    QTest::touchEvent(&table, device).move(0, QPoint(200, y), &table);
+    QTest::touchEvent(&table, device.get()).move(0, QPoint(200, y), &table);
   }
-  QTest::touchEvent(&table, device).release(0, QPoint(200, 100), &table);
+  QTest::touchEvent(&table, device.get()).release(0, QPoint(200, 100), &table);
   EXPECT_THAT(selected, IsEmpty());
   EXPECT_GT(table.verticalScrollBar()->value(), 100);
+}
+
+TEST_F(TableViewTest, AFingerThatStopsCoastingRowsSelectsNone) {
+  const std::unique_ptr<QPointingDevice> device(QTest::createTouchDevice());
+  QTest::touchEvent(&table, device.get()).press(0, QPoint(200, 400), &table);
+  for (int y = 380; y >= 100; y -= 40) {
+    QTest::qWait(5);
+    QTest::touchEvent(&table, device.get()).move(0, QPoint(200, y), &table);
+  }
+  QTest::touchEvent(&table, device.get()).release(0, QPoint(200, 100), &table);
+  const int released = table.verticalScrollBar()->value();
+  ASSERT_TRUE(QTest::qWaitFor([&] { return table.verticalScrollBar()->value() > released; }));
+  QTest::touchEvent(&table, device.get()).press(0, QPoint(200, 200), &table);
+  QTest::touchEvent(&table, device.get()).release(0, QPoint(200, 200), &table);
+  EXPECT_THAT(selected, IsEmpty());
 }
 
 TEST_F(TableViewTest, AWideTableKeepsItsRowsInAColumnInTheMiddle) {
