@@ -7,36 +7,29 @@
 namespace kestro {
 namespace {
 
-struct LockState {
-  // Replaced mutexes stay: destroying one that a thread holds is not allowed, and by the nesting
-  // rule the main thread usually holds it.
-  std::list<std::recursive_mutex> mutexes{1};
-  std::uint8_t nesting = 0;
-};
-
-LockState& lockState() {
-  static LockState state;
-  return state;
-}
+constinit std::recursive_mutex firstMutex;
+constinit std::recursive_mutex* currentMutex = &firstMutex;
+constinit std::uint8_t currentNesting = 0;
 
 }  // namespace
 
 void ArrayLock::initialize() {
-  lockState().mutexes.emplace_back();
-  lockState().nesting = 0;
+  // Replaced mutexes stay: destroying one that a thread holds is not allowed, and by the nesting
+  // rule the main thread usually holds it.
+  static std::list<std::recursive_mutex> mutexes;
+  currentMutex = &mutexes.emplace_back();
+  currentNesting = 0;
 }
 
 void ArrayLock::lockArray() {
-  LockState& state = lockState();
-  state.mutexes.back().lock();
-  ++state.nesting;
+  currentMutex->lock();
+  ++currentNesting;
 }
 
 void ArrayLock::unlockArray() {
-  LockState& state = lockState();
-  if (--state.nesting == 0) state.mutexes.back().unlock();
+  if (--currentNesting == 0) currentMutex->unlock();
 }
 
-std::uint8_t ArrayLock::nesting() noexcept { return lockState().nesting; }
+std::uint8_t ArrayLock::nesting() noexcept { return currentNesting; }
 
 }  // namespace kestro

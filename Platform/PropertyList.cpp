@@ -148,9 +148,26 @@ const Value kNullValue;
 
 // --- Value ---------------------------------------------------------------------------------------
 
+namespace {
+
+/// Copies up to 15 bytes, in two pieces that may overlap: a call for so few would cost more.
+void copyShort(unsigned char* to, const char* from, std::size_t count) noexcept {
+  if (count >= 8) {
+    std::memcpy(to, from, 8);
+    std::memcpy(to + count - 8, from + count - 8, 8);
+  } else if (count >= 4) {
+    std::memcpy(to, from, 4);
+    std::memcpy(to + count - 4, from + count - 4, 4);
+  } else {
+    for (std::size_t i = 0; i < count; ++i) to[i] = static_cast<unsigned char>(from[i]);
+  }
+}
+
+}  // namespace
+
 Value::Value(std::string_view text) {
   if (text.size() <= kInlineCapacity) {
-    if (!text.empty()) std::memcpy(_bytes, text.data(), text.size());
+    copyShort(_bytes, text.data(), text.size());
     _tag = static_cast<std::uint8_t>(text.size());
     return;
   }

@@ -44,6 +44,11 @@ struct NumberFormat {
 
   bool operator==(const NumberFormat&) const = default;
 
+  /// Whether this is "%d", the most frequent of all.
+  [[nodiscard]] constexpr bool isPlainDecimal() const noexcept {
+    return conversion == 'd' && width == 0 && !plus && prefix.empty() && suffix.empty();
+  }
+
  private:
   static constexpr bool isDigit(char c) { return c >= '0' && c <= '9'; }
   static constexpr std::uint8_t appendDigit(std::uint8_t number, char digit) {

@@ -2,6 +2,7 @@
 #include "LogGenerator/Packets/Texts.h"
 
 #include <algorithm>
+#include <charconv>
 #include <deque>
 #include <optional>
 
@@ -52,6 +53,14 @@ struct KnownCache {
   TextCache cache;
 };
 
+/// "%d" of the number's low 32 bits, without a detour through a buffer for longer texts.
+Value plainDecimal(std::int64_t number) {
+  char digits[16];
+  const auto end = std::to_chars(digits, digits + sizeof(digits),
+                                 static_cast<std::int32_t>(static_cast<std::uint32_t>(number)));
+  return std::string_view(digits, static_cast<std::size_t>(end.ptr - digits));
+}
+
 }  // namespace
 
 void writeText(const TextRule& rule, std::int64_t raw, TextBuffer& text) {
@@ -82,6 +91,10 @@ void writeText(const TextRule& rule, std::int64_t raw, TextBuffer& text) {
 }
 
 Value makeText(const TextRule& rule, std::span<const std::int64_t> raw) {
+  if (rule.kind == TextRule::Kind::Integer && rule.format.isPlainDecimal() &&
+      !rule.hasAbsentValue && rule.number == nullptr) {
+    return plainDecimal(raw[0] * rule.multiplier + rule.addend);
+  }
   TextBuffer text;
   if (rule.number != nullptr) {
     writeText(rule, rule.number(raw), text);

@@ -161,7 +161,8 @@ TEST(ValueTest, KnowsWhetherItAloneRefersToItsContainer) {
     EXPECT_FALSE(value.isOnlyReference());
   }
   EXPECT_TRUE(value.isOnlyReference());
-  EXPECT_TRUE(Value(Dictionary()).isOnlyReference());
+  const Value dictionary = Dictionary();
+  EXPECT_TRUE(dictionary.isOnlyReference());
   EXPECT_FALSE(Value("a text of more than fifteen bytes").isOnlyReference());
   EXPECT_FALSE(Value().isOnlyReference());
 }
