@@ -86,12 +86,14 @@ class Reader {
     return std::string_view(characters, length);
   }
 
-  // The library truncates towards zero and gives the fraction without its sign.
+  // The library gives the fraction without its sign, cut to whole microseconds of a double that
+  // need not reach the one that was written. Ten microseconds come back as they went.
   [[nodiscard]] static Value date(plist_t node) {
     std::int32_t seconds = 0;
     std::int32_t fraction = 0;
     plist_get_date_val(node, &seconds, &fraction);
-    const std::chrono::microseconds microseconds(seconds < 0 ? -fraction : fraction);
+    const std::int32_t rounded = (fraction + 5) / 10 * 10;
+    const std::chrono::microseconds microseconds(seconds < 0 ? -rounded : rounded);
     return Value::date(kPropertyListEpoch + std::chrono::seconds(seconds) + microseconds);
   }
 

@@ -8,6 +8,7 @@
 #include <memory>
 
 #include "Platform/Linux/LinuxPlatform.h"
+#include "Platform/Linux/PropertyListDates.h"
 #include "Platform/PropertyListCoding.h"
 #include "Tests/Platform/Linux/PropertyListBytes.h"
 
@@ -207,6 +208,17 @@ TEST_F(PropertyListCodingTest, ReadsBinaryIntegersOfEveryWidth) {
 TEST_F(PropertyListCodingTest, ReadsBinaryRealsOfBothWidths) {
   EXPECT_EQ(parsedObject(bytesOf("\x22\x3F\x80\0\0")), Value::real(1));
   EXPECT_EQ(parsedObject(bytesOf("\x23\xBF\xF8\0\0\0\0\0\0")), Value::real(-1.5));
+}
+
+TEST_F(PropertyListCodingTest, BinaryDatesStayAsTheyAreHoweverOftenTheyAreWritten) {
+  // 352512000.74609375 s: three quarters of a microsecond are cut off.
+  const Bytes fractional = bytesOf("\x33\x41\xB5\x02\xE8\x00\xBF\x00\x00");
+  const Value date = parsedObject(fractional);
+  EXPECT_EQ(date, Value::date(kPropertyListEpoch + std::chrono::seconds(352512000) +
+                              std::chrono::microseconds(746090)));
+  const auto written = coding->binary(date);
+  ASSERT_TRUE(written);
+  EXPECT_EQ(*coding->parse(*written), date);
 }
 
 TEST_F(PropertyListCodingTest, ReadsBinaryDates) {
