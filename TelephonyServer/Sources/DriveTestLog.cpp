@@ -103,6 +103,10 @@ bool isUsable(std::string_view text, Content content) {
   return std::ranges::all_of(text, isPrintable);
 }
 
+/// Years in which there were logs, or may be.
+constexpr int kFirstYear = 1970;
+constexpr int kLastYear = 2099;
+
 /// "2019.11.21_15.38.36"
 std::optional<std::chrono::sys_seconds> parsedTime(std::string_view text) {
   constexpr std::string_view kForm = "0000.00.00_00.00.00";
@@ -122,7 +126,8 @@ std::optional<std::chrono::sys_seconds> parsedTime(std::string_view text) {
   const unsigned hours = number(11, 2);
   const unsigned minutes = number(14, 2);
   const unsigned seconds = number(17, 2);
-  if (!date.ok() || hours > 23 || minutes > 59 || seconds > 60) return std::nullopt;
+  const bool isYear = int(date.year()) >= kFirstYear && int(date.year()) <= kLastYear;
+  if (!isYear || !date.ok() || hours > 23 || minutes > 59 || seconds > 60) return std::nullopt;
   return std::chrono::sys_days(date) + std::chrono::hours(hours) + std::chrono::minutes(minutes) +
          std::chrono::seconds(seconds);
 }

@@ -126,6 +126,20 @@ TEST_F(DriveTestLogTest, anUnknownModeKeepsTheLastOnlyWhenItWasNotMeasured) {
   EXPECT_EQ(_problems.first, "line 2: \"-\" is no network mode");
 }
 
+TEST_F(DriveTestLogTest, aTimeBeyondTheYearsOfLogsIsNone) {
+  const auto rows = rowsOf(
+      "Timestamp,NetworkMode,RSRP\n"
+      "1969.12.31_23.59.59,LTE,-1\n"
+      "1970.01.01_00.00.00,LTE,-2\n"
+      "2099.12.31_23.59.59,LTE,-3\n"
+      "2100.01.01_00.00.00,LTE,-4\n"
+      "9999.01.01_00.00.00,LTE,-5\n");
+  ASSERT_EQ(rows.size(), 2U);
+  EXPECT_EQ(rows[0].text(Column::Level), "-2");
+  EXPECT_EQ(rows[1].text(Column::Level), "-3");
+  EXPECT_EQ(_problems.rows, 3U);
+}
+
 TEST_F(DriveTestLogTest, networkModesBelongToTheirFamilies) {
   EXPECT_EQ(familyOfNetworkMode("EDGE"), DriveTestFamily::Gsm);
   EXPECT_EQ(familyOfNetworkMode("GPRS"), DriveTestFamily::Gsm);
