@@ -72,6 +72,8 @@ SystemColours::~SystemColours() { QDBusConnection::disconnectFromBus(connectionN
 
 void SystemColours::follow() {
   QDBusConnection bus(connectionName());
+  // The bus library finds the types of a slot by their names, and knows only names that were used.
+  qRegisterMetaType<QDBusVariant>();
   bus.connect(kService, kPath, kInterface, QStringLiteral("SettingChanged"), this,
               SLOT(settingChanged(QString, QString, QDBusVariant)));
   QDBusMessage question =
