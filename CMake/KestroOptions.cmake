@@ -29,6 +29,12 @@ if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
   target_compile_options(KestroOptions INTERFACE
     -Wno-array-bounds -Wno-stringop-overflow -Wno-stringop-overread)
 endif()
+if(NOT KESTRO_SANITIZERS)
+  # Hardening: what a mistake in a parser could reach is checked, guarded or not writable.
+  target_compile_options(KestroOptions INTERFACE
+    -fstack-protector-strong -fstack-clash-protection -fcf-protection)
+  target_link_options(KestroOptions INTERFACE -Wl,-z,relro,-z,now,-z,noexecstack)
+endif()
 if(KESTRO_SANITIZERS)
   target_compile_options(KestroOptions INTERFACE
     -fsanitize=${KESTRO_SANITIZERS} -fno-sanitize-recover=all -fno-omit-frame-pointer)
