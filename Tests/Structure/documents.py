@@ -7,6 +7,8 @@ import re
 LINK = re.compile(r"\[[^\]]*\]\(([^)\s]+)\)")
 FENCE = re.compile(r"^\s*(```|~~~)")
 ELSEWHERE = re.compile(r"[a-z][a-z0-9+.-]*:|#")
+TEST_NAME = re.compile(r"`([A-Z]\w*\.\w+)`")
+TEST_MACRO = re.compile(r"\bTEST(?:_F|_P)?\(\s*(\w+),\s*(\w+)\s*\)")
 FOLDER_LINE = re.compile(r"^([A-Z][A-Za-z]*)/\s")
 SOURCE_SUFFIXES = (".cpp", ".h", ".md", ".py")
 
@@ -42,6 +44,17 @@ def broken_links(root):
             if not (document.parent / target.partition("#")[0]).exists():
                 broken.append(f"{document.relative_to(root).as_posix()}: {target}")
     return broken
+
+
+def unknown_tests(root, document):
+    """The tests that a document names, `Suite.Name` in the last cell of a table's row, and that no
+    source under Tests/ has."""
+    root = pathlib.Path(root)
+    sources = (path.read_text("utf-8") for path in sorted((root / "Tests").rglob("*.cpp")))
+    known = {".".join(names) for source in sources for names in TEST_MACRO.findall(source)}
+    rows = (line for line in (root / document).read_text("utf-8").splitlines() if line[:1] == "|")
+    named = [name for row in rows for name in TEST_NAME.findall(row.split("|")[-2])]
+    return [name for name in named if name not in known]
 
 
 def mapped_folders(readme):

@@ -18,6 +18,9 @@ class Tree(unittest.TestCase):
         readme = (ROOT / "README.md").read_text(encoding="utf-8")
         self.assertEqual(documents.mapped_folders(readme), documents.existing_folders(ROOT))
 
+    def test_every_promise_of_security_has_its_test(self):
+        self.assertEqual(documents.unknown_tests(ROOT, "Documentation/security.md"), [])
+
     def test_no_property_list_carries_a_doctype(self):
         self.assertEqual(documents.lists_with_doctype(ROOT), [])
 
@@ -51,6 +54,11 @@ class Check(unittest.TestCase):
     def test_links_elsewhere_and_in_code_are_not_followed(self):
         self.write("README.md", "[a](https://example.org) [b](#c)\n```\n[d](e)\n```\n")
         self.assertEqual(documents.broken_links(self.root), [])
+
+    def test_a_test_that_is_none_is_found(self):
+        self.write("Tests/A.cpp", "TEST_F(Ports, AreClosed) {}\nTEST(Names,\n     AreKept) {}\n")
+        self.write("a.md", "| x | `Ports.AreClosed`, `Names.AreKept` |\n| y | `Ports.AreOpen` |\n")
+        self.assertEqual(documents.unknown_tests(self.root, "a.md"), ["Ports.AreOpen"])
 
     def test_the_map_is_read_from_fenced_lines(self):
         self.assertEqual(
