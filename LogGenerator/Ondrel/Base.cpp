@@ -78,6 +78,7 @@ std::int16_t Base::lookUpECNO(std::uint32_t linear) noexcept {
 }
 
 std::vector<Value> Base::takeElementsOfArray(Array& array) {
+  if (array.empty()) return {};  // who walks an empty array sees no change
   const ArrayLockScope lock;
   return array.take();
 }

@@ -44,9 +44,9 @@ struct NumberFormat {
 
   bool operator==(const NumberFormat&) const = default;
 
-  /// Whether this is "%d", the most frequent of all.
+  /// Whether this is "%d" or "%u", the most frequent of all.
   [[nodiscard]] constexpr bool isPlainDecimal() const noexcept {
-    return conversion == 'd' && width == 0 && !plus && prefix.empty() && suffix.empty();
+    return (conversion == 'd' || conversion == 'u') && width == 0 && !plus && prefix.empty() && suffix.empty();
   }
 
  private:

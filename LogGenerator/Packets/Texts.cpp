@@ -53,11 +53,13 @@ struct KnownCache {
   TextCache cache;
 };
 
-/// "%d" of the number's low 32 bits, without a detour through a buffer for longer texts.
-Value plainDecimal(std::int64_t number) {
+/// "%d" or "%u" of the number's low 32 bits, without a detour through a buffer for longer texts.
+Value plainDecimal(const NumberFormat& format, std::int64_t number) {
+  const auto word = static_cast<std::uint32_t>(number);
+  const std::int64_t shown =
+      format.conversion == 'd' ? std::int64_t{static_cast<std::int32_t>(word)} : std::int64_t{word};
   char digits[16];
-  const auto end = std::to_chars(digits, digits + sizeof(digits),
-                                 static_cast<std::int32_t>(static_cast<std::uint32_t>(number)));
+  const auto end = std::to_chars(digits, digits + sizeof(digits), shown);
   return std::string_view(digits, static_cast<std::size_t>(end.ptr - digits));
 }
 
@@ -93,7 +95,7 @@ void writeText(const TextRule& rule, std::int64_t raw, TextBuffer& text) {
 Value makeText(const TextRule& rule, std::span<const std::int64_t> raw) {
   if (rule.kind == TextRule::Kind::Integer && rule.format.isPlainDecimal() &&
       !rule.hasAbsentValue && rule.number == nullptr) {
-    return plainDecimal(raw[0] * rule.multiplier + rule.addend);
+    return plainDecimal(rule.format, raw[0] * rule.multiplier + rule.addend);
   }
   TextBuffer text;
   if (rule.number != nullptr) {
