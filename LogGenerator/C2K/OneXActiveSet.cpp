@@ -41,9 +41,10 @@ constexpr double kWeakestEnergy = 0.00001;
 constinit const std::span<const Field> kOneXActiveSetFields = kFields;
 
 OneXActiveSet::OneXActiveSet(PacketView packet, std::size_t start)
-    : _packet(packet), _position{.here = start} {
+    : _packet(packet),
+      _position{.here = start},
+      _pilotCount(readBits(kPilotCount, packet, _position)) {
   const std::size_t values = readBits(kPerPilotCount, packet, _position);
-  _pilotCount = readBits(kPilotCount, packet, _position);
   _variableSize = kEnergyOffsetPerValue * values;
   const std::size_t size = kFixedPilotSize + kSizePerValue * values;
   _stride = (size + kPilotAlignment - 1) / kPilotAlignment * kPilotAlignment;

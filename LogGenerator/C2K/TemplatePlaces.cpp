@@ -18,7 +18,9 @@ void TemplatePlaces::add(const Dictionary& section, const std::string& path) {
     if (!key.isText()) continue;
     const std::string name(isSorted ? nameInSortedDictionary(key.text()) : key.text());
     if (value.isDictionary()) {
-      add(value.dictionary(), path.empty() ? name : path + '/' + name);
+      std::string inner = path;
+      if (!inner.empty()) inner += '/';
+      add(value.dictionary(), inner.append(name));
     } else if (value.isText() && value.text() != kSortedMarker) {
       _places[std::string(value.text())].push_back({path, name});
     }

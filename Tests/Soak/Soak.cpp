@@ -28,6 +28,11 @@ struct Options {
 
 /// What a client that stopped may leave behind: its queue alone holds up to 4 MiB.
 constexpr std::size_t kAllowedGrowth = std::size_t{8} * 1024 * 1024;
+#ifdef __SANITIZE_ADDRESS__
+constexpr bool kMeasuresMemory = false;  // freed memory is kept, to catch who still uses it
+#else
+constexpr bool kMeasuresMemory = true;
+#endif
 /// A model is connected again this many ticks after the server is back: a tick to see that it was
 /// gone, and 5 s until the next attempt.
 constexpr int kTicksToReconnect = 4;
@@ -100,7 +105,8 @@ void run(const Options& options) {
       options.technology, system.messagesSent(), options.faults, system.redraws(),
       static_cast<double>(system.messagesSent()) / time.count(),
       static_cast<double>(early) / 1048576, static_cast<double>(late) / 1048576);
-  require(late <= early + kAllowedGrowth, "memory does not grow with the messages");
+  require(!kMeasuresMemory || late <= early + kAllowedGrowth,
+          "memory does not grow with the messages");
 }
 
 }  // namespace
