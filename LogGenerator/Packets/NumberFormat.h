@@ -46,7 +46,8 @@ struct NumberFormat {
 
   /// Whether this is "%d" or "%u", the most frequent of all.
   [[nodiscard]] constexpr bool isPlainDecimal() const noexcept {
-    return (conversion == 'd' || conversion == 'u') && width == 0 && !plus && prefix.empty() && suffix.empty();
+    return (conversion == 'd' || conversion == 'u') && width == 0 && !plus && prefix.empty() &&
+           suffix.empty();
   }
 
  private:
