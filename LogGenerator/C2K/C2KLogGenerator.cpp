@@ -119,8 +119,7 @@ std::span<const std::string_view> C2KLogGenerator::stateKeys() const {
   return kKeys;
 }
 
-// --- Packets
-// ---------------------------------------------------------------------------------------
+// --- Packets -------------------------------------------------------------------------------------
 
 C2KParser* C2KLogGenerator::parserOf(LogCode code) const noexcept {
   const auto parser = std::ranges::find(
@@ -165,8 +164,7 @@ void C2KLogGenerator::catalogue(const CatalogueVisitor& visit) const {
   }
 }
 
-// --- Display
-// ---------------------------------------------------------------------------------------
+// --- Display -------------------------------------------------------------------------------------
 
 Value C2KLogGenerator::generateLogUsingState(Dictionary& state) {
   Value display = getDisplayFromState(state);

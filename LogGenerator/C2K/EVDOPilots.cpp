@@ -12,8 +12,7 @@ void writeEnergy(std::span<const std::int64_t> raw, TextBuffer& text) {
   text.append("%+.2f dB", 10 * std::log10(static_cast<double>(raw[0]) / 512));
 }
 
-// --- 0x12B6: active set, records of 12 bytes from byte 25
-// ------------------------------------------
+// --- 0x12B6: active set, records of 12 bytes from byte 25 ----------------------------------------
 
 constexpr Field kActivePilot[] = {
     {kPilotPNOffset, u16(0), decimal()},
@@ -25,8 +24,7 @@ constexpr ListReading kActivePilots[] = {
     {.table = {.name = "pilot", .count = u8(15), .base = 25, .stride = 12, .fields = kActivePilot},
      .key = "kActiveSetPilots"}};
 
-// --- 0x108A: fingers, records of 14 bytes from byte 23
-// ---------------------------------------------
+// --- 0x108A: fingers, records of 14 bytes from byte 23 -------------------------------------------
 
 constexpr Place kFingerPN = u16(0);
 constexpr std::int64_t kUnusedFinger = 0xFFFF;
@@ -52,8 +50,7 @@ constinit const PacketReading kEVDOActiveSetReading = {
 constinit const PacketReading kEVDOFingersReading = {
     .code = 0x108A, .packetName = "EV-DO finger C/I", .minimumLength = 23, .lists = kFingers};
 
-// --- EVDOPilots
-// ------------------------------------------------------------------------------------
+// --- EVDOPilots ----------------------------------------------------------------------------------
 
 EVDOPilots::EVDOPilots(const PacketReading& pilotsReading)
     : C2KParser(pilotsReading),
@@ -87,8 +84,7 @@ void EVDOPilots::explain(PacketView packet, const ExplainVisitor& visit) const {
   Explainer(reading().packetName, packet, visit).reading(reading());
 }
 
-// --- The two lists
-// ---------------------------------------------------------------------------------
+// --- The two lists -------------------------------------------------------------------------------
 
 bool EVDOActiveSet::hasRightLength(PacketView packet) const {
   return packet.size() >= lengthWithRecords(packet);

@@ -10,8 +10,7 @@
 namespace kestro {
 namespace {
 
-// --- 0x1192: forward link, at least 241 bytes: 56 counters in a row
-// --------------------------------
+// --- 0x1192: forward link, at least 241 bytes: 56 counters in a row ------------------------------
 
 constexpr std::uint16_t kForwardBits[] = {
     128,  256,  512, 1024, 0,    128,  256,  512,  1024, 0,    128,  256,  512,  1024,
@@ -30,8 +29,7 @@ constexpr auto forwardCounters() {
 constexpr auto kForwardCounters = forwardCounters();
 static_assert(kForwardCounters.size() == 56);
 
-// --- 0x127E: reverse link, at least 1750 bytes: three blocks of counters for twelve rates
-// ----------
+// --- 0x127E: reverse link, at least 1750 bytes: three blocks of counters for twelve rates --------
 
 constexpr std::uint16_t kReverseBits[] = {128,  256,  512,  768,  1024, 1536,
                                           2048, 3072, 4096, 6144, 8192, 12288};

@@ -46,8 +46,7 @@ void FrameErrorRate::keepIn(Dictionary& state) const {
 Value FrameErrorRate::text() const { return percentText("%.02f%%", _rate); }
 Value FrameErrorRate::oldText() const { return percentText("%.02f%% (old)", _rate); }
 
-// --- 0x119D
-// ----------------------------------------------------------------------------------------
+// --- 0x119D --------------------------------------------------------------------------------------
 
 constinit const PacketReading kTrafficFrameReading = {
     .code = 0x119D, .packetName = "1x traffic frame", .minimumLength = 17};

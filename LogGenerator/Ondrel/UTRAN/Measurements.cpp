@@ -4,8 +4,7 @@
 namespace kestro {
 namespace {
 
-// --- 0xD00A: UTRAN neighbours, at least 21 bytes; the records stand far behind
-// ---------------------
+// --- 0xD00A: UTRAN neighbours, at least 21 bytes; the records stand far behind -------------------
 
 constexpr NamedValue kSetNames[] = {{0, "ASET"}, {1, "MSET"}, {2, "DSET"}};
 constexpr NamedValue kFlagNames[] = {{0, "FALSE"}, {1, "TRUE"}};
@@ -28,8 +27,7 @@ constexpr ListReading kNeighbors[] = {{.table = {.name = "UTRAN neighbour",
                                                  .stride = 16,
                                                  .fields = kNeighbor}}};
 
-// --- 0xD00E: GSM neighbours: a count, then records of 8 bytes
-// --------------------------------------
+// --- 0xD00E: GSM neighbours: a count, then records of 8 bytes ------------------------------------
 
 constexpr Field kGSMNeighbor[] = {
     {"Cell ID", u16(0).bits(0, 13), decimal()},
@@ -49,8 +47,7 @@ constexpr ListReading kGSMNeighbors[] = {{.table = {.name = "GSM neighbour",
                                                     .fields = kGSMNeighbor},
                                           .use = RowsUse::Dropped}};
 
-// --- 0xD00C: transport channels (TrCH) and coded composite ones (CCTrCH)
-// ---------------------------
+// --- 0xD00C: transport channels (TrCH) and coded composite ones (CCTrCH) -------------------------
 
 constexpr Place kTRCHCount = u16(14).bits(6, 11);
 

@@ -19,8 +19,7 @@ constexpr NamedValue kModeNames[] = {
 };
 constexpr TextRule kModeRule = named(kModeNames, kUnknownMode);
 
-// --- 0xD0E0: the mode, and whether it is valid
-// -----------------------------------------------------
+// --- 0xD0E0: the mode, and whether it is valid ---------------------------------------------------
 
 constexpr std::size_t kLength = 15;
 constexpr Place kIsValid = u8(13);

@@ -4,8 +4,7 @@
 namespace kestro {
 namespace {
 
-// --- 0xD0E2: system information, at least 26 bytes
-// -------------------------------------------------
+// --- 0xD0E2: system information, at least 26 bytes -----------------------------------------------
 
 constexpr NamedValue kAccessNames[] = {{0, "All Calls"}, {1, "Emergency Calls Only"}};
 
@@ -19,8 +18,7 @@ constexpr Field kSystemInformation[] = {
 };
 static_assert(isLayout(kSystemInformation));
 
-// --- The cell monitor's serving cells
-// --------------------------------------------------------------
+// --- The cell monitor's serving cells ------------------------------------------------------------
 
 constexpr ListedValue kServingCellValues[] = {
     {kTqCellMonitorLAC, "Local Area Code", decimal(),
