@@ -4,10 +4,13 @@
 #include <chrono>
 #include <string>
 #include <utility>
+#include <variant>
 
 #include "LogGenerator/LogGenerator.h"
 #include "Platform/TelephonyProtocol.h"
+#include "TelephonyServer/ChannelCommand.h"
 #include "TelephonyServer/Sources/SourceCatalogue.h"
+#include "Tests/Soak/CountingGenerator.h"
 
 namespace kestro::soak {
 namespace {
@@ -38,7 +41,18 @@ LiveSystem::LiveSystem(std::string_view technology, double speed)
   }
   _platform.systemLog().setThreshold(LogPriority::Error);
   connectService();
-  _model = KestroModel::create(_platform, [this] { redraw(); });
+  _model = KestroModel::create(
+      _platform, [this] { redraw(); },
+      [this](Platform&, std::string_view name) { return makeGenerator(name); });
+}
+
+std::unique_ptr<LogGenerator> LiveSystem::makeGenerator(std::string_view technology) {
+  auto generator = LogGenerator::generatorFromTechnology(_platform, technology);
+  require(generator != nullptr, "the server names a technology");
+  const auto command = parseChannelCommand(*_coding, *_coding->xml(generator->getStartCommand()));
+  require(command && std::holds_alternative<StartCommand>(*command), "the start command is one");
+  _filter = std::get<StartCommand>(*command).filter;
+  return std::make_unique<CountingGenerator>(_platform, std::move(generator), _counts.received);
 }
 
 void LiveSystem::connectService() {
@@ -70,7 +84,7 @@ void LiveSystem::startServer() {
   auto server = Server::open(_platform, kServerName, _technology, [] {});
   require(server.has_value(), "a server can take the name of one that is gone");
   _server = std::move(*server);
-  _listener = std::make_unique<CountingListener>(*_server, _sent);
+  _listener = std::make_unique<CountingListener>(*_server, _filter, _counts);
   _playback =
       std::make_unique<Playback>(std::move(*source), PlaybackOptions{.speed = _speed, .loop = true},
                                  _platform.mainQueue(), _platform.clock(), *_listener, ignore);

@@ -11,27 +11,38 @@
 #include "Model/KestroModel.h"
 #include "Platform/Linux/LinuxPlatform.h"
 #include "Platform/Virtual/QuietPlatform.h"
+#include "TelephonyServer/CodeFilter.h"
 #include "TelephonyServer/Playback.h"
 #include "TelephonyServer/Server.h"
 
 namespace kestro::soak {
 
+/// How many messages the server played, how many of them the model had asked for, and how many
+/// reached its generator.
+struct MessageCounts {
+  std::uint64_t sent = 0;
+  std::uint64_t wanted = 0;
+  std::uint64_t received = 0;
+};
+
 /// Counts what a server hands out while it passes it on.
 class CountingListener : public PlaybackListener {
  public:
-  explicit CountingListener(Server& server, std::uint64_t& count)
-      : _server(server), _count(count) {}
+  CountingListener(Server& server, const CodeFilter& filter, MessageCounts& counts)
+      : _server(server), _filter(filter), _counts(counts) {}
   void technologyChanged(std::string_view technology) override {
     _server.technologyChanged(technology);
   }
   void messageDue(ByteView message) override {
-    ++_count;
+    ++_counts.sent;
+    if (_filter.accepts(message)) ++_counts.wanted;
     _server.messageDue(message);
   }
 
  private:
   Server& _server;
-  std::uint64_t& _count;
+  const CodeFilter& _filter;
+  MessageCounts& _counts;
 };
 
 /// A failure of the run, with what was promised.
@@ -58,7 +69,7 @@ class LiveSystem {
   /// Looks at the promises that hold at every moment.
   void check();
 
-  [[nodiscard]] std::uint64_t messagesSent() const noexcept { return _sent; }
+  [[nodiscard]] const MessageCounts& counts() const noexcept { return _counts; }
   [[nodiscard]] std::uint64_t redraws() const noexcept { return _redraws; }
   [[nodiscard]] bool isConnected() const { return _model->isConnected(); }
   [[nodiscard]] std::size_t nodeCount() const noexcept { return _nodeCount; }
@@ -66,6 +77,7 @@ class LiveSystem {
 
  private:
   void connectService();
+  [[nodiscard]] std::unique_ptr<LogGenerator> makeGenerator(std::string_view technology);
   [[nodiscard]] LogChannelReply requestChannel(std::string_view localPort);
   void redraw();
 
@@ -76,7 +88,8 @@ class LiveSystem {
   std::unique_ptr<Server> _server;
   std::unique_ptr<CountingListener> _listener;
   std::unique_ptr<Playback> _playback;
-  std::uint64_t _sent = 0;
+  CodeFilter _filter;  ///< what the model has asked for
+  MessageCounts _counts;
   std::uint64_t _redraws = 0;
   std::size_t _nodeCount = 0;
   std::shared_ptr<KestroModel> _model;
