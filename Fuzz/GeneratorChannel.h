@@ -41,15 +41,21 @@ class GeneratorChannel {
   /// A generator that goes on with the state, as after a reconnection.
   void start() { _generator = LogGenerator::generatorFromTechnology(_platform, _technology); }
 
-  /// Hands a message over. It may raise what messages are known to raise, and nothing else.
-  void receive(ByteView message) {
+  /// Hands a message over. It may raise what messages are known to raise, and nothing else; false
+  /// when it does.
+  bool receive(ByteView message) {
+    bool isSurvived = true;
     try {
       _generator->updateStateWithData(_state, message);
     } catch (const ArrayOutOfBoundsException&) {
+      isSurvived = false;
     } catch (const LogCode_0xFF0000::UnknownDataException&) {
+      isSurvived = false;
     } catch (const InternalConsistencyFailure&) {
+      isSurvived = false;
     }
     static_cast<void>(_platform.systemLog().take());
+    return isSurvived;
   }
 
   /// Looks at every value that a message yields.

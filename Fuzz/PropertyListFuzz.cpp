@@ -14,7 +14,9 @@ void checkForms(const PropertyListCoding& coding, const Value& value) {
   if (!binary) return;  // for instance a date outside the years that can be written
   const auto again = coding.parse(*binary);
   require(again.has_value(), "what was written as binary parses");
-  require(coding.binary(*again) == binary, "a second writing yields the same bytes");
+  // As a value, not as bytes: whether the library writes equal data once or twice depends on where
+  // it stands in memory.
+  require(*again == value, "what was written as binary reads back the same");
   const auto xml = coding.xml(value);
   require(xml.has_value(), "what can be written as binary can be written as XML");
   require(coding.parse(*xml).has_value(), "what was written as XML parses");

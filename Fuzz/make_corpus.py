@@ -2,10 +2,11 @@
 # SPDX-License-Identifier: MIT
 """Makes seeds for the harnesses out of recordings: make_corpus.py TECHNOLOGY=CAPTURE...
 
-Each recording (kestro-cli record) yields seeds for the generator, the template and the capture
-harness of its technology: a few messages each, of every length and log code that occurs."""
+Each recording (kestro-cli record) yields seeds for the harnesses of its technology and for those of
+recordings and snapshots: a few messages each, of every length and log code that occurs."""
 
 import pathlib
+import plistlib
 import struct
 import sys
 
@@ -16,7 +17,9 @@ TEMPLATES = {
     "UTRAN2": "UTRAN",
     "Ondrel_CDMA": "C2KTemplate",
 }
+TECHNOLOGIES = ["IFX", "Ondrel_GSM", "Ondrel_CDMA", "LTE", "UTRAN2"]  # as the program lists them
 KINDS = 40  # of messages, per technology
+SECOND, REFRESH, WHOLE_MESSAGE = b"\x0a", b"\xff", b"\xfe"
 
 
 def messages_of(capture):
@@ -46,8 +49,45 @@ def write(target, name, contents):
     (folder / name).write_bytes(contents)
 
 
+def make_comparison(technology, kinds):
+    for number, message in enumerate(kinds):
+        write(f"DifferentialFuzz_{technology}", f"message-{number:02}",
+              WHOLE_MESSAGE + framed(message))
+    drive = b"".join(WHOLE_MESSAGE + framed(message) for message in kinds[:12])
+    write(f"DifferentialFuzz_{technology}", "drive", drive + REFRESH + drive + REFRESH)
+
+
+def dlf_of(entries):
+    """A version report of zeros, then every entry without its first byte."""
+    return bytes(161) + b"".join(entry[1:] for entry in entries)
+
+
+def make_logs(technology, entries):
+    write("DlfFuzz", technology,
+          bytes([len(entries)]) + b"".join(framed(entry) for entry in entries) + dlf_of(entries))
+    history = [{"DisplayState": entry, "Display": {"Section": ["row", {"key": "value"}]},
+                "ExtraInfo": {}, "Date": "2012-03-04 13:05:09 +0100", "Description": "Snapshot"}
+               for entry in entries]
+    log = {"Description": "DLF binary", "DLF": dlf_of(entries)}
+    snapshot = {"Timestamp": "2012-03-04 13:05:09 +0100", "Data": [*history, log],
+                "Description": "drive"}
+    for form in (plistlib.FMT_XML, plistlib.FMT_BINARY):
+        write("SnapshotFuzz", f"{technology}-{form.name[4:].lower()}",
+              plistlib.dumps(snapshot, fmt=form, sort_keys=False))
+
+
+def make_recordings(technology, kinds):
+    write("ReplayFuzz", technology,
+          bytes([TECHNOLOGIES.index(technology)])
+          + b"".join(SECOND + framed(message) for message in kinds[:12]))
+    if technology in TEMPLATES:
+        make_comparison(technology, kinds)
+        make_logs(technology, [b"".join(kinds[:3]), kinds[3] if len(kinds) > 3 else b"", b"\x01"])
+
+
 def make(technology, capture):
     kinds = [message for message in kinds_of(messages_of(capture)) if len(message) < 2048]
+    make_recordings(technology, kinds)
     for number, message in enumerate(kinds):
         write(f"GeneratorFuzz_{technology}", f"message-{number:02}",
               b"\x00\x00" + framed(message))

@@ -1,0 +1,106 @@
+// SPDX-License-Identifier: MIT
+// Packets of one technology: its generator shows what a plain reader of the same layouts shows.
+#include <algorithm>
+#include <vector>
+
+#include "Fuzz/GeneratorChannel.h"
+#include "Fuzz/PlainReader/PlainReader.h"
+#include "Platform/PropertyListDescription.h"
+
+namespace kestro::fuzz {
+namespace {
+
+constexpr std::string_view kTechnology = KESTRO_FUZZ_TECHNOLOGY;
+
+/// What the first byte of a step asks for; every other value is a packet of one of the codes.
+constexpr unsigned kRefresh = 0xFF;
+constexpr unsigned kWholeMessage = 0xFE;
+constexpr std::size_t kMaximumPayload = 2048;
+
+/// A generator and a plain reader that get the same messages.
+class Comparison {
+ public:
+  Comparison() {
+    const Bytes contents = propertyListCoding().xml(_reader->displayTemplate()).value();
+    for (const char* name : {"LTE", "Ondrel_GSM", "UTRAN", "C2KTemplate"}) {
+      _channel.platform().bundle().setResource(fmt::format("{}.plist", name), contents);
+    }
+    _channel.start();
+  }
+
+  void takeStep(Input& input) {
+    const unsigned choice = input.byte();
+    if (choice == kRefresh) return refresh();
+    if (choice != kWholeMessage) return receive(packet(choice, input));
+    const ByteView message = input.bytes(input.number16() % kMaximumPayload);
+    receive({message.begin(), message.end()});
+  }
+
+  /// Both make a history entry of what they show.
+  void refresh() {
+    _channel.refresh();
+    _history.push_back({Value(_reader->display()).deepCopy(), _reader->takeCollected()});
+    if (_history.size() > kMaximumHistoryEntries) _history.erase(_history.begin());
+    const Array history = _channel.state()[kStateHistory].array();
+    require(history.size() == _history.size(), "every refresh makes a history entry");
+    for (std::size_t i = 0; i < _history.size(); ++i) {
+      const Dictionary entry = history[i].dictionary();
+      // Before the first message there is nothing but the packets, none.
+      if (entry.contains(kStateDisplay)) requireSame(entry[kStateDisplay], _history[i].display);
+      require(std::ranges::equal(entry[kStateDisplayState].bytes(), _history[i].collected),
+              "a history entry holds the messages that led to it");
+    }
+  }
+
+ private:
+  struct Entry {
+    Value display;
+    Bytes collected;
+  };
+
+  /// A packet of one of the technology's codes with a payload of the input.
+  [[nodiscard]] Bytes packet(unsigned choice, Input& input) const {
+    const std::uint32_t code = _reader->codes()[choice % _reader->codes().size()];
+    const ByteView payload = input.bytes(input.number16() % kMaximumPayload);
+    Bytes message(13);
+    message[0] = code > 0xFFFF ? 0xFF : 1;
+    message[3] = static_cast<std::uint8_t>(code);
+    message[4] = static_cast<std::uint8_t>(code >> 8);
+    message.insert(message.end(), payload.begin(), payload.end());
+    return message;
+  }
+
+  void receive(const Bytes& message) {
+    const bool isSurvived = _reader->receive(message);
+    require(_channel.receive(message) == isSurvived, "the same messages end the application");
+    requireSame(_channel.state()[kStateDisplay], _reader->display());
+  }
+
+  static void requireSame(const Value& shown, const Value& plain) {
+    if (shown == plain) return;
+    for (const auto& [name, expected] : plain.dictionary()) {
+      const Value& found = shown.dictionary()[name.text()];
+      if (found == expected) continue;
+      fmt::print(stderr, "{}\n  shown: {}\n  plain: {}\n", describe(name), describe(found),
+                 describe(expected));
+    }
+    require(false, "the generator shows what the plain reader shows");
+  }
+
+  GeneratorChannel _channel{kTechnology};
+  std::unique_ptr<plain::PlainReader> _reader =
+      plain::makePlainReader(kTechnology, propertyListCoding());
+  std::vector<Entry> _history;
+};
+
+}  // namespace
+}  // namespace kestro::fuzz
+
+extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+  using namespace kestro::fuzz;
+  Input input(data, size);
+  Comparison comparison;
+  while (!input.isAtEnd()) comparison.takeStep(input);
+  comparison.refresh();
+  return 0;
+}

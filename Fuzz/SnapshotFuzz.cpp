@@ -1,0 +1,34 @@
+// SPDX-License-Identifier: MIT
+// Bytes as a snapshot, and everything that is done with one: shown, its log exported, saved again.
+#include "CommandLine/SnapshotText.h"
+#include "Fuzz/SavedSnapshot.h"
+#include "Model/StorableValue.h"
+
+namespace kestro::fuzz {
+namespace {
+
+void show(const Dictionary& snapshot) {
+  std::size_t size = 0;
+  writeSnapshotText(snapshot, [&size](std::string_view text) { size += text.size(); });
+  require(size > 0, "a snapshot shows its timestamp");
+}
+
+void exportLog(const Dictionary& snapshot) {
+  const Value log = dlfOfSnapshot(snapshot);
+  static_cast<void>(reframedDlf(log.bytes(), snapshot[kSnapshotData].array()));
+}
+
+}  // namespace
+}  // namespace kestro::fuzz
+
+extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+  using namespace kestro;
+  const auto snapshot = parseSnapshot(fuzz::propertyListCoding(), {data, size});
+  if (!snapshot) return 0;
+  fuzz::show(*snapshot);
+  fuzz::exportLog(*snapshot);
+  VirtualPlatform platform(fuzz::propertyListCoding());
+  fuzz::checkSaving(platform.clock(), (*snapshot)[kSnapshotData],
+                    (*snapshot)[kSnapshotDescription].text());
+  return 0;
+}
