@@ -19,6 +19,9 @@ TEMPLATES = {
 }
 TECHNOLOGIES = ["IFX", "Ondrel_GSM", "Ondrel_CDMA", "LTE", "UTRAN2"]  # as the program lists them
 KINDS = 40  # of messages, per technology
+# Payloads on both sides of every minimum length, for each of the plain reader's codes.
+LENGTHS = {"LTE": (9, range(27)), "Ondrel_GSM": (28, range(21)), "UTRAN2": (8, range(15)),
+           "Ondrel_CDMA": (8, (3, 4, 9, 10, 11, 12, 13, 36, 37, 38, 157, 158, 227, 228))}
 SECOND, REFRESH, WHOLE_MESSAGE = b"\x0a", b"\xff", b"\xfe"
 
 
@@ -55,6 +58,14 @@ def make_comparison(technology, kinds):
               WHOLE_MESSAGE + framed(message))
     drive = b"".join(WHOLE_MESSAGE + framed(message) for message in kinds[:12])
     write(f"DifferentialFuzz_{technology}", "drive", drive + REFRESH + drive + REFRESH)
+    write(f"DifferentialFuzz_{technology}", "cut",
+          b"".join(WHOLE_MESSAGE + framed(message[:-1]) for message in kinds[:12]))
+    codes, lengths = LENGTHS[technology]
+    for count in (0, 1):  # of records, wherever it stands
+        payload = bytes(count if i < 16 else 37 * i % 251 for i in range(2000))
+        write(f"DifferentialFuzz_{technology}", f"lengths-{count}",
+              b"".join(bytes([code]) + framed(payload[:length])
+                       for code in range(codes) for length in lengths))
 
 
 def dlf_of(entries):

@@ -1,7 +1,9 @@
 // SPDX-License-Identifier: MIT
 // The packets of the CDMA2000 channel.
+#include <algorithm>
 #include <array>
 #include <cmath>
+#include <iterator>
 #include <optional>
 
 #include "Fuzz/PlainReader/PlainReader.h"
@@ -129,34 +131,18 @@ class C2KReader : public PlainReader {
 
   /// False for a code that nobody wants.
   bool read(const Packet& packet, std::uint32_t code) {
-    switch (code) {
-      case 0x1183:
-        if (packet.size() == 50) readEvdoStatus(packet);
-        return true;
-      case 0x12B6:
-        readActiveSet(packet);
-        return true;
-      case 0x108A:
-        readFingers(packet);
-        return true;
-      case 0x119C:
-        if (packet.size() >= 17) readOneXStatus(packet);
-        return true;
-      case 0x119D:
-        if (packet.size() >= 17) readFrame(packet);
-        return true;
-      case 0x134F:
-        if (packet.size() >= 171 && packet.byte(13) >= 2) readSystemParameters(packet);
-        return true;
-      case 0x1192:
-        if (packet.size() >= 241) readForwardLink(packet);
-        return true;
-      case 0x127E:
-        if (packet.size() >= 1750) readReverseLink(packet);
-        return true;
-      default:
-        return false;
-    }
+    const auto is = [&](std::uint32_t wanted, std::size_t length) {
+      return code == wanted && packet.size() >= length;
+    };
+    if (is(0x1183, 50) && packet.size() == 50) readEvdoStatus(packet);
+    if (is(0x12B6, 25)) readActiveSet(packet);
+    if (is(0x108A, 23)) readFingers(packet);
+    if (is(0x119C, 17)) readOneXStatus(packet);
+    if (is(0x119D, 17)) readFrame(packet);
+    if (is(0x134F, 171) && packet.byte(13) >= 2) readSystemParameters(packet);
+    if (is(0x1192, 241)) readForwardLink(packet);
+    if (is(0x127E, 1750)) readReverseLink(packet);
+    return std::ranges::find(kCodes, code) != std::end(kCodes);
   }
 
   void readEvdoStatus(const Packet& packet) {
@@ -180,7 +166,7 @@ class C2KReader : public PlainReader {
 
   void readActiveSet(const Packet& packet) {
     const auto count = static_cast<std::size_t>(packet.byte(15));
-    if (packet.size() < 25 + 12 * count || packet.size() < 25) return;
+    if (packet.size() < 25 + 12 * count) return;
     Dictionary pilots = emptyPilots();
     for (std::size_t i = 0; i < count; ++i) {
       pilots.set(text("%zu;%d", i, packet.half(25 + 12 * i)), energyText(packet.half(27 + 12 * i)));
@@ -190,7 +176,7 @@ class C2KReader : public PlainReader {
 
   void readFingers(const Packet& packet) {
     const auto count = static_cast<std::size_t>(packet.byte(22));
-    if (packet.size() < 23 || packet.size() != 23 + 14 * count) return;
+    if (packet.size() != 23 + 14 * count) return;
     Dictionary fingers = emptyPilots();
     for (std::size_t i = 0; i < count; ++i) {
       const int offset = packet.half(23 + 14 * i);
