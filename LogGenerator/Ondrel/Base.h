@@ -12,6 +12,7 @@
 
 #include "LogGenerator/Packets/Catalogue.h"
 #include "LogGenerator/Packets/Explain.h"
+#include "LogGenerator/Packets/Packet.h"
 #include "LogGenerator/Packets/Section.h"
 #include "Platform/Platform.h"
 #include "Platform/PropertyList.h"
@@ -60,10 +61,11 @@ class Base {
   [[nodiscard]] virtual SectionKind sectionKind() const = 0;
   /// Decodes one packet, header included, and rewrites the section. Throws
   /// ArrayOutOfBoundsException for a record index past its count.
-  virtual void updateWithDataLogCode(ByteView packet, LogCode code) = 0;
+  virtual void updateWithDataLogCode(const Packet& packet, LogCode code) = 0;
 
   /// Visits every value that the decoder takes from the packet; nothing for a code without values.
-  virtual void explainPacket(ByteView packet, LogCode code, const ExplainVisitor& visit) const = 0;
+  virtual void explainPacket(const Packet& packet, LogCode code,
+                             const ExplainVisitor& visit) const = 0;
   /// What the decoder takes from a code that it subscribes to.
   [[nodiscard]] virtual CatalogueEntry catalogueCode(LogCode code) const = 0;
 

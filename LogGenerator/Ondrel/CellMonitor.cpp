@@ -34,8 +34,8 @@ ExplainedValue explainValue(const Section& section, const ListedValue& value,
 
 }  // namespace
 
-Array readCellArray(ByteView packet, const PropertyListCoding& coding, SystemLog& log) {
-  const Result<Value> root = parsePayload(packet, coding);
+Array readCellArray(const Packet& packet, const PropertyListCoding& coding, SystemLog& log) {
+  const Result<Value>& root = packet.propertyList(coding);
   if (!root) {
     log.write(LogPriority::Error, "Cell Info Array data could not be constructed");
     return Array::null();
@@ -87,10 +87,10 @@ void writeCellValues(const Dictionary& cell, std::span<const ListedValue> values
   }
 }
 
-bool CellMonitorDecoder::updateWithOtherPacket(PacketView packet, LogCode code) {
+bool CellMonitorDecoder::updateWithOtherPacket(const Packet& packet, LogCode code) {
   const PropertyListReading& reading = *section().propertyList;
   if (code != reading.code) return false;
-  const Array list = readCellArray(packet.bytes(), platform().propertyListCoding(), systemLog());
+  const Array list = readCellArray(packet, platform().propertyListCoding(), systemLog());
   if (section().kind == SectionKind::List) {
     Array rows = sectionList();
     clearElementsInArray(rows);
@@ -103,11 +103,11 @@ bool CellMonitorDecoder::updateWithOtherPacket(PacketView packet, LogCode code) 
   return true;
 }
 
-void CellMonitorDecoder::explainOtherPacket(PacketView packet, LogCode code,
+void CellMonitorDecoder::explainOtherPacket(const Packet& packet, LogCode code,
                                             const ExplainVisitor& visit) const {
   const PropertyListReading& reading = *section().propertyList;
   if (code != reading.code) return;
-  const Result<Value> root = parsePayload(packet.bytes(), platform().propertyListCoding());
+  const Result<Value>& root = packet.propertyList(platform().propertyListCoding());
   if (!root) return;
   std::size_t row = 0;
   for (const Dictionary& cell : chosenCells(reading, root->array())) {

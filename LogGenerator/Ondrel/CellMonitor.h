@@ -54,7 +54,7 @@ inline constexpr std::string_view kMissingCellArrayLine = "Failed to get Cell Ar
 
 /// The array of cells in a cell-monitor packet; a null handle when there is none. Bytes that are no
 /// property list leave a line in `log`; a root that is no array leaves none.
-[[nodiscard]] Array readCellArray(ByteView packet, const PropertyListCoding& coding,
+[[nodiscard]] Array readCellArray(const Packet& packet, const PropertyListCoding& coding,
                                   SystemLog& log);
 
 /// Whether the cell says its technology and its type, and both are those asked for.
@@ -85,8 +85,8 @@ class CellMonitorDecoder : public SectionDecoder {
   using SectionDecoder::SectionDecoder;
 
  protected:
-  bool updateWithOtherPacket(PacketView packet, LogCode code) override;
-  void explainOtherPacket(PacketView packet, LogCode code,
+  bool updateWithOtherPacket(const Packet& packet, LogCode code) override;
+  void explainOtherPacket(const Packet& packet, LogCode code,
                           const ExplainVisitor& visit) const override;
 
  private:

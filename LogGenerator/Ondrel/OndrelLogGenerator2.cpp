@@ -53,16 +53,15 @@ void OndrelLogGenerator2::updateStateWithData(Dictionary& state, ByteView data) 
 
 void OndrelLogGenerator2::updateWithData(ByteView message) {
   if (message.size() < kPacketHeaderSize) return;
-  const PacketView packet(packetOfMessage(message));
-  const std::uint8_t type = logTypeOf(packet);
+  const PacketView view(packetOfMessage(message));
+  const std::uint8_t type = logTypeOf(view);
   if (!isKnownLogType(type)) {
     platform().systemLog().log(LogPriority::Error, "Invalid log type: {:x}. Dropping.", type);
     return;
   }
-  const LogCode code = logCodeOf(packet);
-  for (Base* subscriber : subscribersOf(code)) {
-    subscriber->updateWithDataLogCode(packet.bytes(), code);
-  }
+  const LogCode code = logCodeOf(view);
+  const Packet packet(view.bytes());
+  for (Base* subscriber : subscribersOf(code)) subscriber->updateWithDataLogCode(packet, code);
 }
 
 std::span<Base* const> OndrelLogGenerator2::subscribersOf(LogCode code) const {
@@ -72,11 +71,12 @@ std::span<Base* const> OndrelLogGenerator2::subscribersOf(LogCode code) const {
 
 void OndrelLogGenerator2::explainMessage(ByteView message, const ExplainVisitor& visit) const {
   if (message.size() < kPacketHeaderSize) return;
-  const PacketView packet(packetOfMessage(message));
-  if (!isKnownLogType(logTypeOf(packet))) return;
-  const LogCode code = logCodeOf(packet);
+  const PacketView view(packetOfMessage(message));
+  if (!isKnownLogType(logTypeOf(view))) return;
+  const LogCode code = logCodeOf(view);
+  const Packet packet(view.bytes());
   for (const Base* subscriber : subscribersOf(code)) {
-    subscriber->explainPacket(packet.bytes(), code, visit);
+    subscriber->explainPacket(packet, code, visit);
   }
 }
 

@@ -9,14 +9,14 @@ SectionDecoder::SectionDecoder(Platform& platform, const Section& section)
   for (const PacketReading& reading : section.readings) _readings.emplace_back(reading);
 }
 
-void SectionDecoder::updateWithDataLogCode(ByteView bytes, LogCode code) {
+void SectionDecoder::updateWithDataLogCode(const Packet& packet, LogCode code) {
   systemLog().write(_section.logPriority, _section.logLine);
-  const PacketView packet(bytes);
+  const PacketView view(packet.bytes());
   bool isDescribed = false;
   for (BoundReading& bound : _readings) {
     if (bound.reading->code != code) continue;
-    if (packet.size() >= bound.reading->minimumLength) {
-      apply(bound, packet);
+    if (view.size() >= bound.reading->minimumLength) {
+      apply(bound, view);
       return;
     }
     isDescribed = true;
@@ -25,11 +25,11 @@ void SectionDecoder::updateWithDataLogCode(ByteView bytes, LogCode code) {
   if (_section.reportsUnknownCodes) reportUnknownCode(code);
 }
 
-void SectionDecoder::explainPacket(ByteView bytes, LogCode code,
+void SectionDecoder::explainPacket(const Packet& packet, LogCode code,
                                    const ExplainVisitor& visit) const {
-  const PacketView packet(bytes);
-  if (const PacketReading* reading = readingOf(_section, code, packet.size())) {
-    explainReading(_section, *reading, packet, visit);
+  const PacketView view(packet.bytes());
+  if (const PacketReading* reading = readingOf(_section, code, view.size())) {
+    explainReading(_section, *reading, view, visit);
   } else if (readingOf(_section, code) == nullptr) {
     explainOtherPacket(packet, code, visit);
   }
@@ -90,11 +90,11 @@ void SectionDecoder::applyUnderKey(BoundTable& table, PacketView packet, Diction
   section.set(table.key(), list);
 }
 
-bool SectionDecoder::updateWithOtherPacket(PacketView /*packet*/, LogCode /*code*/) {
+bool SectionDecoder::updateWithOtherPacket(const Packet& /*packet*/, LogCode /*code*/) {
   return false;
 }
 
-void SectionDecoder::explainOtherPacket(PacketView /*packet*/, LogCode /*code*/,
+void SectionDecoder::explainOtherPacket(const Packet& /*packet*/, LogCode /*code*/,
                                         const ExplainVisitor& /*visit*/) const {}
 
 void SectionDecoder::catalogueOtherCode(CatalogueEntry& /*entry*/) const {}

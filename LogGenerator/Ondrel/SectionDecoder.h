@@ -21,16 +21,17 @@ class SectionDecoder : public Base, protected FieldSupplier {
   [[nodiscard]] std::string_view getSectionName() const override { return _section.name; }
   [[nodiscard]] std::span<const LogCode> getLogCodeArray() const override { return _section.codes; }
   [[nodiscard]] SectionKind sectionKind() const override { return _section.kind; }
-  void updateWithDataLogCode(ByteView packet, LogCode code) override;
-  void explainPacket(ByteView packet, LogCode code, const ExplainVisitor& visit) const override;
+  void updateWithDataLogCode(const Packet& packet, LogCode code) override;
+  void explainPacket(const Packet& packet, LogCode code,
+                     const ExplainVisitor& visit) const override;
   [[nodiscard]] CatalogueEntry catalogueCode(LogCode code) const override;
 
  protected:
   /// Decodes a code that has no reading; false when the code is unknown to the decoder too.
-  virtual bool updateWithOtherPacket(PacketView packet, LogCode code);
+  virtual bool updateWithOtherPacket(const Packet& packet, LogCode code);
 
   /// Explains a code that has no reading.
-  virtual void explainOtherPacket(PacketView packet, LogCode code,
+  virtual void explainOtherPacket(const Packet& packet, LogCode code,
                                   const ExplainVisitor& visit) const;
 
   /// Completes the entry of a code that has no reading: what the packet is and its keys.

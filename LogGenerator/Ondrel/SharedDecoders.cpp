@@ -3,7 +3,6 @@
 
 #include <string>
 
-#include "LogGenerator/Packets/PropertyListReading.h"
 #include "Platform/PropertyListCoding.h"
 #include "Platform/SystemLog.h"
 
@@ -58,11 +57,11 @@ constinit const Section kPDPContextListSection = {
     .propertyList = &kPacketDataContexts,
 };
 
-LogCode_0xFF0000::PropertyListReader::PropertyListReader(ByteView packet,
+LogCode_0xFF0000::PropertyListReader::PropertyListReader(const Packet& packet,
                                                          const PropertyListCoding& coding,
                                                          SystemLog& log)
     : _files(Dictionary::null()) {
-  const Result<Value> root = parsePayload(packet, coding);
+  const Result<Value>& root = packet.propertyList(coding);
   if (!root) {
     log.write(LogPriority::Error, "SIM File dictionary data could not be constructed");
     throw UnknownDataException();
@@ -70,9 +69,9 @@ LogCode_0xFF0000::PropertyListReader::PropertyListReader(ByteView packet,
   _files = root->dictionary();
 }
 
-bool SimInfo::updateWithOtherPacket(PacketView packet, LogCode code) {
+bool SimInfo::updateWithOtherPacket(const Packet& packet, LogCode code) {
   if (code != kSimFilesCode) return false;
-  const LogCode_0xFF0000::PropertyListReader files(packet.bytes(), platform().propertyListCoding(),
+  const LogCode_0xFF0000::PropertyListReader files(packet, platform().propertyListCoding(),
                                                    systemLog());
   Dictionary target = sectionDictionary();
   for (const ListedValue& file : kSimFileValues) {
@@ -81,9 +80,9 @@ bool SimInfo::updateWithOtherPacket(PacketView packet, LogCode code) {
   return true;
 }
 
-void SimInfo::explainOtherPacket(PacketView packet, LogCode code,
+void SimInfo::explainOtherPacket(const Packet& packet, LogCode code,
                                  const ExplainVisitor& visit) const {
-  const Result<Value> root = parsePayload(packet.bytes(), platform().propertyListCoding());
+  const Result<Value>& root = packet.propertyList(platform().propertyListCoding());
   if (code != kSimFilesCode || !root) return;
   const Dictionary files = root->dictionary();
   for (const ListedValue& file : kSimFileValues) {
@@ -96,8 +95,8 @@ void SimInfo::explainOtherPacket(PacketView packet, LogCode code,
   }
 }
 
-bool PDPContextList::updateWithOtherPacket(PacketView packet, LogCode /*code*/) {
-  const Result<Value> root = parsePayload(packet.bytes(), platform().propertyListCoding());
+bool PDPContextList::updateWithOtherPacket(const Packet& packet, LogCode /*code*/) {
+  const Result<Value>& root = packet.propertyList(platform().propertyListCoding());
   if (!root || !root->isArray()) return true;
   const auto contexts = root->array();
   Array target = sectionList();
@@ -105,9 +104,9 @@ bool PDPContextList::updateWithOtherPacket(PacketView packet, LogCode /*code*/) 
   return true;
 }
 
-void PDPContextList::explainOtherPacket(PacketView packet, LogCode /*code*/,
+void PDPContextList::explainOtherPacket(const Packet& packet, LogCode /*code*/,
                                         const ExplainVisitor& visit) const {
-  const Result<Value> root = parsePayload(packet.bytes(), platform().propertyListCoding());
+  const Result<Value>& root = packet.propertyList(platform().propertyListCoding());
   if (!root) return;
   std::size_t row = 0;
   for (const Value& context : root->array()) {

@@ -19,7 +19,7 @@ class UnknownDataException {};
 class PropertyListReader {
  public:
   /// Throws UnknownDataException, after a line in `log`, when the packet carries no property list.
-  PropertyListReader(ByteView packet, const PropertyListCoding& coding, SystemLog& log);
+  PropertyListReader(const Packet& packet, const PropertyListCoding& coding, SystemLog& log);
 
   /// The value under a key; a null pointer when there is none, or when the root is no dictionary.
   [[nodiscard]] const Value* find(std::string_view key) const { return _files.find(key); }
@@ -39,8 +39,8 @@ class SimInfo : public SectionDecoder {
   explicit SimInfo(Platform& platform) : SectionDecoder(platform, kSimInfoSection) {}
 
  protected:
-  bool updateWithOtherPacket(PacketView packet, LogCode code) override;
-  void explainOtherPacket(PacketView packet, LogCode code,
+  bool updateWithOtherPacket(const Packet& packet, LogCode code) override;
+  void explainOtherPacket(const Packet& packet, LogCode code,
                           const ExplainVisitor& visit) const override;
 };
 
@@ -51,8 +51,8 @@ class PDPContextList : public SectionDecoder {
   explicit PDPContextList(Platform& platform) : SectionDecoder(platform, kPDPContextListSection) {}
 
  protected:
-  bool updateWithOtherPacket(PacketView packet, LogCode code) override;
-  void explainOtherPacket(PacketView packet, LogCode code,
+  bool updateWithOtherPacket(const Packet& packet, LogCode code) override;
+  void explainOtherPacket(const Packet& packet, LogCode code,
                           const ExplainVisitor& visit) const override;
 };
 

@@ -8,13 +8,8 @@
 #include <string_view>
 
 #include "LogGenerator/Packets/Field.h"
-#include "Platform/Bytes.h"
-#include "Platform/PropertyList.h"
-#include "Platform/Result.h"
 
 namespace kestro {
-
-class PropertyListCoding;
 
 /// A value of a property list: its key there, its key in the section, and how it is shown.
 struct ListedValue {
@@ -51,9 +46,5 @@ struct PropertyListReading {
   std::string_view
       missingListLine{};  ///< the log line when there is no array of cells; may be empty
 };
-
-/// The property list after the packet's header; the error says why there is none. A packet of no
-/// more than the header has an empty payload, which is no property list.
-[[nodiscard]] Result<Value> parsePayload(ByteView packet, const PropertyListCoding& coding);
 
 }  // namespace kestro

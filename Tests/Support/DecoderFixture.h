@@ -60,7 +60,7 @@ class DecoderFixture : public ::testing::Test {
   void decode(ByteView bytes, LogCode code) {
     const auto memory = std::make_unique<std::uint8_t[]>(bytes.size());
     std::ranges::copy(bytes, memory.get());
-    decoder.updateWithDataLogCode({memory.get(), bytes.size()}, code);
+    decoder.updateWithDataLogCode(ByteView(memory.get(), bytes.size()), code);
   }
   void decode(const PacketBytes& bytes) { decode(bytes.bytes(), bytes.code()); }
   /// Hands over an extra packet that carries a property list.

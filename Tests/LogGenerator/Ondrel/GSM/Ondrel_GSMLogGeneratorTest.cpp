@@ -3,6 +3,7 @@
 #include "LogGenerator/Ondrel/GSM/Ondrel_GSMLogGenerator.h"
 #include "Platform/Bundle.h"
 #include "Platform/TelephonyService.h"
+#include "Tests/Support/CountingPropertyListCoding.h"
 #include "Tests/Support/DecoderFixture.h"
 
 namespace kestro::testing {
@@ -68,8 +69,8 @@ class Ondrel_GSMTest : public ::testing::Test {
     return texts;
   }
 
-  std::unique_ptr<PropertyListCoding> coding = createPropertyListCoding();
-  VirtualPlatform platform{*coding};
+  CountingPropertyListCoding coding;
+  VirtualPlatform platform{coding};
 };
 
 // --- The index -----------------------------------------------------------------------------------
@@ -235,6 +236,20 @@ TEST_F(Ondrel_GSMLogGeneratorTest, EveryDecoderReportsOneBadCellList) {
   EXPECT_THAT(lines(),
               ElementsAre("GSMServingCell", bad, missing, "NeighboringCells", bad, missing,
                           "ServingPLMN", bad, missing, "UMTSSet", bad, missing, "UMTSRRInfo"));
+}
+
+TEST_F(Ondrel_GSMLogGeneratorTest, AllDecodersShareOneParsedCellList) {
+  Dictionary cell{
+      {"kTqCellMonitorCellRadioAccessTechnology", "kTqCellMonitorRadioAccessTechnologyGSM"},
+      {"kTqCellMonitorCellType", "kTqCellMonitorCellTypeServing"},
+      {"kTqCellMonitorCellId", Value::integer(4711)},
+      {"kTqCellMonitorLAC", Value::integer(601)}};
+  receive(packet(0x7132));
+  const int before = coding.parsed();
+  receive(packet(0xFF0001).append(*coding.binary(Array{cell})));
+  EXPECT_EQ(coding.parsed(), before + 1);
+  EXPECT_EQ(section("GSM Serving Cell").dictionary()["Cell ID"], Value("4711"));
+  EXPECT_EQ(section("Serving PLMN").dictionary()["Location Area Code"], Value("601"));
 }
 
 // --- The template --------------------------------------------------------------------------------
