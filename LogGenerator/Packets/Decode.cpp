@@ -1,42 +1,80 @@
 // SPDX-License-Identifier: MIT
 #include "LogGenerator/Packets/Decode.h"
 
-#include <array>
 #include <utility>
 
 namespace kestro {
+
+// --- One field -----------------------------------------------------------------------------------
+
 namespace {
 
-Value otherValue(const BoundField& field, PacketView packet, const RecordPosition& position,
-                 const FieldSupplier* supplier) {
-  if (!field.isSupplied()) return field.value(packet, position);
-  return supplier == nullptr ? Value() : supplier->supply(field.field(), packet, position);
-}
+bool isCommon(const Place& place) { return place.origin == Origin::Here && !place.isBigEndian; }
 
 }  // namespace
 
-Value BoundField::makeValue(PacketView packet, const RecordPosition& position) const {
-  if (!holds(_field->condition, packet, position)) {
-    return _field->otherwise.empty() ? Value() : Value(_field->otherwise);
+BoundField::BoundField(const Field& field)
+    : _field(&field),
+      _key(field.key),
+      _cache(TextCache::forField(field)),
+      _mask(maskOf(field.places[0])),
+      _place(field.places[0]),
+      _isQuick(_cache != nullptr && field.text.number == nullptr && field.condition.isAlways() &&
+               isCommon(_place)) {}
+
+bool BoundField::writeSupplied(Value& shown, PacketView packet, const RecordPosition& position,
+                               const FieldSupplier* supplier) const {
+  if (supplier == nullptr) return false;
+  Value supplied = supplier->supply(*_field, packet, position);
+  if (supplied.isNull()) return false;
+  shown = std::move(supplied);
+  return true;
+}
+
+bool BoundField::writeOtherwise(Value& shown) const {
+  if (_field->otherwise.empty()) return false;
+  shown = Value(_field->otherwise);
+  return true;
+}
+
+bool BoundField::writeOther(Value& shown, PacketView packet, const RecordPosition& position,
+                            const FieldSupplier* supplier) const {
+  if (!holds(_field->condition, packet, position)) return writeOtherwise(shown);
+  if (_cache != nullptr && _field->text.number == nullptr) {
+    const std::uint32_t bits = readBits(_place, packet, position);
+    shown = bits < TextCache::kSize ? _cache->text(bits) : wideText(bits);
+    return true;
   }
+  if (isSupplied()) return writeSupplied(shown, packet, position, supplier);
   std::array<std::int64_t, Field::kMaximumPlaces> raw;
   for (std::size_t i = 0; i < _field->placeCount; ++i) {
     raw[i] = readNumber(_field->places[i], packet, position);
   }
   const std::span<const std::int64_t> numbers(raw.data(), _field->placeCount);
-  if (_field->text.number != nullptr) return showNumber(_field->text.number(numbers));
-  if (_cache == nullptr) return makeText(_field->text, numbers);
-  const std::uint32_t bits = readBits(_place, packet, position);
-  return bits < TextCache::kSize ? _cache->text(bits) : makeText(_field->text, numbers);
+  if (_cache == nullptr) {
+    shown = makeText(_field->text, numbers);
+  } else {
+    writeNumber(shown, _field->text.number(numbers));
+  }
+  return true;
 }
 
-Value BoundField::showNumber(std::int64_t number) const {
-  const bool isKept = number >= INT16_MIN && number <= INT16_MAX;
-  if (isKept) return _cache->text(static_cast<std::uint16_t>(number));
+void BoundField::writeNumber(Value& shown, std::int64_t number) const {
+  if (number >= INT16_MIN && number <= INT16_MAX) {
+    shown = _cache->text(static_cast<std::uint16_t>(number));
+    return;
+  }
   TextBuffer text;
   writeText(_field->text, number, text);
-  return text.text();
+  shown = text.text();
 }
+
+Value BoundField::wideText(std::uint32_t bits) const {
+  const std::int64_t number = numberFromBits(_place, bits);
+  return makeText(_field->text, {&number, 1});
+}
+
+// --- The fields of a layout ----------------------------------------------------------------------
 
 BoundFields::BoundFields(std::span<const Field> fields) {
   for (const Field& field : fields) {
@@ -50,17 +88,13 @@ void BoundFields::fill(Dictionary& dictionary, PacketView packet) {
   if (dictionary.isNull()) return;
   for (std::size_t i = 0; i < _fields.size(); ++i) {
     const BoundField& field = _fields[i];
-    if (const Value* kept = field.keptText(packet, {})) {
-      _hints[i] = dictionary.set(field.key(), *kept, _hints[i]);
-      continue;
-    }
-    if (field.isSupplied()) continue;
     if (field.field().text.kind == TextRule::Kind::Removed) {
       dictionary.remove(field.key());
       continue;
     }
-    const Value value = field.value(packet, {});
-    if (!value.isNull()) _hints[i] = dictionary.set(field.key(), value, _hints[i]);
+    Value shown;
+    if (!field.write(shown, packet, {}, nullptr)) continue;
+    _hints[i] = dictionary.set(field.key(), shown, _hints[i]);
   }
 }
 
@@ -69,14 +103,9 @@ BoundFields::Presence BoundFields::readValues(PacketView packet, const RecordPos
   _values.clear();
   Presence present = 0;
   for (std::size_t i = 0; i < _fields.size(); ++i) {
-    const BoundField& field = _fields[i];
-    if (const Value* kept = field.keptText(packet, position)) {
-      _values.push_back(*kept);
-    } else {
-      Value value = otherValue(field, packet, position, supplier);
-      if (value.isNull()) continue;
-      _values.push_back(std::move(value));
-    }
+    Value shown;
+    if (!_fields[i].write(shown, packet, position, supplier)) continue;
+    _values.push_back(std::move(shown));
     present |= Presence{1} << i;
   }
   return present;
@@ -85,14 +114,7 @@ BoundFields::Presence BoundFields::readValues(PacketView packet, const RecordPos
 bool BoundFields::rewrite(std::span<Value> values, PacketView packet,
                           const RecordPosition& position, const FieldSupplier* supplier) const {
   for (std::size_t i = 0; i < values.size(); ++i) {
-    const BoundField& field = _fields[i];
-    if (const Value* kept = field.keptText(packet, position)) {
-      values[i] = *kept;
-      continue;
-    }
-    Value value = otherValue(field, packet, position, supplier);
-    if (value.isNull()) return false;
-    values[i] = std::move(value);
+    if (!_fields[i].write(values[i], packet, position, supplier)) return false;
   }
   return true;
 }

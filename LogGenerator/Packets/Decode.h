@@ -3,6 +3,7 @@
 // one builds the rows of a record table.
 #pragma once
 
+#include <array>
 #include <cstddef>
 #include <cstdint>
 #include <map>
@@ -29,12 +30,7 @@ class FieldSupplier {
 /// A field made ready for use: its key as a value, its texts at hand. The layout must outlive it.
 class BoundField {
  public:
-  explicit BoundField(const Field& field)
-      : _field(&field),
-        _key(field.key),
-        _cache(TextCache::forField(field)),
-        _isPlain(_cache != nullptr && field.condition.isAlways() && !field.text.number),
-        _place(field.places[0]) {}
+  explicit BoundField(const Field& field);
 
   [[nodiscard]] const Field& field() const noexcept { return *_field; }
   [[nodiscard]] const Value& key() const noexcept { return _key; }
@@ -42,28 +38,47 @@ class BoundField {
     return _field->text.kind == TextRule::Kind::Supplied;
   }
 
-  /// What the field shows; null when its condition fails and it has no other text.
+  /// What the field shows; null when its condition fails and it has no other text, or when it is a
+  /// supplied one.
   [[nodiscard]] Value value(PacketView packet, const RecordPosition& position) const {
-    const Value* kept = keptText(packet, position);
-    return kept == nullptr ? makeValue(packet, position) : *kept;
+    Value shown;
+    static_cast<void>(write(shown, packet, position, nullptr));
+    return shown;
   }
-  /// What the field shows, where that is a text that was made before: a quick look that saves a
-  /// copy. A null pointer says nothing.
-  [[nodiscard]] const Value* keptText(PacketView packet, const RecordPosition& position) const {
-    if (!_isPlain) return nullptr;
-    const std::uint32_t bits = readBits(_place, packet, position);
-    return bits < TextCache::kSize ? &_cache->text(bits) : nullptr;
+
+  /// Writes what the field shows over `shown`. False, with `shown` as it was, when that is nothing:
+  /// its condition fails and it has no other text, or the supplier (which may be null) has none.
+  [[nodiscard, gnu::always_inline]] bool write(Value& shown, PacketView packet,
+                                               const RecordPosition& position,
+                                               const FieldSupplier* supplier) const {
+    if (!_isQuick) return writeOther(shown, packet, position, supplier);
+    const std::uint32_t bits =
+        packet.word(position.here + _place.offset) >> _place.firstBit & _mask;
+    if (bits < TextCache::kSize) [[likely]] {
+      shown = _cache->text(bits);
+    } else {
+      shown = wideText(bits);
+    }
+    return true;
   }
 
  private:
-  [[nodiscard]] Value makeValue(PacketView packet, const RecordPosition& position) const;
-  [[nodiscard]] Value showNumber(std::int64_t number) const;
+  [[nodiscard]] bool writeOther(Value& shown, PacketView packet, const RecordPosition& position,
+                                const FieldSupplier* supplier) const;
+  [[nodiscard]] bool writeSupplied(Value& shown, PacketView packet, const RecordPosition& position,
+                                   const FieldSupplier* supplier) const;
+  [[nodiscard]] bool writeOtherwise(Value& shown) const;
+  void writeNumber(Value& shown, std::int64_t number) const;
+  [[nodiscard]] Value wideText(std::uint32_t bits) const;
 
   const Field* _field;
   Value _key;
   TextCache* _cache;
-  bool _isPlain;  ///< whether the texts of the first place's bits are all there is to know
-  Place _place;
+  std::uint32_t _mask;  ///< of the first place's bits, once they are shifted down
+  Place _place;         ///< the first
+  /// Whether the texts of the first place's bits are all there is to know, and it is a common one:
+  /// of the record, little-endian, under no condition.
+  bool _isQuick;
 };
 
 /// The shown fields of a layout, ready for use.

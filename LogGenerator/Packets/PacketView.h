@@ -31,7 +31,7 @@ class PacketView {
   [[nodiscard]] std::uint32_t word(std::size_t offset) const noexcept {
     static_assert(std::endian::native == std::endian::little);
     std::uint32_t bytes;
-    if (offset < _bytes.size() && _bytes.size() - offset >= sizeof(bytes)) {
+    if (offset < _bytes.size() && _bytes.size() - offset >= sizeof(bytes)) [[likely]] {
       std::memcpy(&bytes, _bytes.data() + offset, sizeof(bytes));
       return bytes;
     }
@@ -49,8 +49,10 @@ class PacketView {
  private:
   [[nodiscard]] std::uint32_t wordNearEnd(std::size_t offset) const noexcept {
     if (offset >= _bytes.size()) return 0;
-    std::uint32_t bytes = 0;
-    std::memcpy(&bytes, _bytes.data() + offset, _bytes.size() - offset);  // at most three bytes
+    const std::size_t left = _bytes.size() - offset;  // at most three
+    std::uint32_t bytes = _bytes[offset];
+    if (left > 1) bytes |= std::uint32_t{_bytes[offset + 1]} << 8;
+    if (left > 2) bytes |= std::uint32_t{_bytes[offset + 2]} << 16;
     return bytes;
   }
 

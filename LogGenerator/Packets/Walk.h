@@ -34,12 +34,17 @@ struct RecordPosition {
   return position.here + place.offset;
 }
 
+/// The place's bits, all of them set.
+[[nodiscard]] constexpr std::uint32_t maskOf(const Place& place) {
+  return 0xFFFFFFFFU >> (32 - place.bitCount);
+}
+
 /// The place's bits as they stand in the packet, without regard to their sign.
 [[nodiscard]] inline std::uint32_t readBits(const Place& place, PacketView packet,
                                             const RecordPosition& position) {
   std::uint32_t word = packet.word(offsetOf(place, position));
   if (place.isBigEndian) word = __builtin_bswap32(word) >> (8 * (4 - place.width));
-  return word >> place.firstBit & (0xFFFFFFFFU >> (32 - place.bitCount));
+  return word >> place.firstBit & maskOf(place);
 }
 
 /// The bits as a number, signed where the place is.
