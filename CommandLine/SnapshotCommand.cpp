@@ -17,6 +17,7 @@
 #include "CommandLine/Input.h"
 #include "CommandLine/OfflinePlatform.h"
 #include "CommandLine/Output.h"
+#include "CommandLine/ReplaceFile.h"
 #include "CommandLine/SnapshotText.h"
 #include "LogGenerator/Ondrel/Reframing.h"
 #include "Model/Replay.h"
@@ -40,7 +41,7 @@ Examples:
 constexpr const char* kSaveFooter =
     R"(The capture is replayed with a refresh every 2 s of its time, as `decode` does, and saved as if the
 save button were pressed at its last message: all times in the snapshot are the capture's. An
-existing file is replaced.
+existing file is replaced when the snapshot is complete.
 
 Example:
   kestro-cli snapshot save drive.pcap -o drive.kestro --description="drop at the tunnel")";
@@ -76,12 +77,9 @@ int writeFile(const SnapshotOptions& options, const Bytes& contents, ExitStatus 
   if (std::filesystem::equivalent(options.input, options.output, error)) {
     return nothingDone(fmt::format("{}: the output would replace the input", options.output));
   }
-  auto output = Output::create(options.output);
-  if (!output) return nothingDone(output.error().message);
-  output->write({reinterpret_cast<const char*>(contents.data()), contents.size()});
-  output->flush();
-  if (!output->failureMessage().empty()) return nothingDone(output->failureMessage());
-  return status;
+  const auto written = replaceFile(
+      options.output, {reinterpret_cast<const char*>(contents.data()), contents.size()});
+  return written ? status : nothingDone(written.error().message);
 }
 
 Result<Dictionary> readSnapshot(const std::string& path) {

@@ -1,0 +1,103 @@
+// SPDX-License-Identifier: MIT
+#include <gtest/gtest.h>
+#include <sys/resource.h>
+
+#include <csignal>
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+
+#include "CommandLine/ReplaceFile.h"
+#include "Tests/Support/TemporaryFile.h"
+
+namespace kestro {
+namespace {
+
+namespace fs = std::filesystem;
+using testing::TemporaryFile;
+
+/// While it lives, files of this process end at `size` bytes, as on a full disk.
+class FileSizeLimit {
+ public:
+  explicit FileSizeLimit(rlim_t size) : _earlier(::signal(SIGXFSZ, SIG_IGN)) {
+    ::getrlimit(RLIMIT_FSIZE, &_limit);
+    const rlimit limit = {.rlim_cur = size, .rlim_max = _limit.rlim_max};
+    ::setrlimit(RLIMIT_FSIZE, &limit);
+  }
+  ~FileSizeLimit() {
+    ::setrlimit(RLIMIT_FSIZE, &_limit);
+    ::signal(SIGXFSZ, _earlier);
+  }
+  FileSizeLimit(const FileSizeLimit&) = delete;
+  FileSizeLimit& operator=(const FileSizeLimit&) = delete;
+
+ private:
+  rlimit _limit = {};
+  void (*_earlier)(int);
+};
+
+class ReplaceFileTest : public ::testing::Test {
+ protected:
+  static void write(const std::string& path, std::string_view contents) {
+    std::ofstream(path, std::ios::binary) << contents;
+  }
+  [[nodiscard]] std::size_t filesInDirectory() const {
+    const fs::directory_iterator entries(file.directory());
+    return static_cast<std::size_t>(std::distance(begin(entries), end(entries)));
+  }
+
+  TemporaryFile file{"file"};
+};
+
+TEST_F(ReplaceFileTest, WritesAFileThatWasNotThere) {
+  ASSERT_TRUE(replaceFile(file.path(), "new"));
+  EXPECT_EQ(file.contents(), "new");
+  EXPECT_EQ(filesInDirectory(), 1U);
+}
+
+TEST_F(ReplaceFileTest, ReplacesAFileAndKeepsItsMode) {
+  write(file.path(), "the earlier one");
+  fs::permissions(file.path(), fs::perms::owner_read | fs::perms::owner_write);
+  ASSERT_TRUE(replaceFile(file.path(), "new"));
+  EXPECT_EQ(file.contents(), "new");
+  EXPECT_EQ(fs::status(file.path()).permissions(), fs::perms::owner_read | fs::perms::owner_write);
+  EXPECT_EQ(filesInDirectory(), 1U);
+}
+
+TEST_F(ReplaceFileTest, AFullDiskLeavesTheEarlierFileWhole) {
+  write(file.path(), "earlier");
+  const std::string contents(100'000, 'x');
+  {
+    const FileSizeLimit limit(50'000);
+    const auto written = replaceFile(file.path(), contents);
+    ASSERT_FALSE(written);
+    EXPECT_EQ(written.error().message, file.path() + ": File too large");
+  }
+  EXPECT_EQ(file.contents(), "earlier");
+  EXPECT_EQ(filesInDirectory(), 1U);
+}
+
+TEST_F(ReplaceFileTest, ALinkGoesOnLeadingToTheFile) {
+  write(file.path(), "earlier");
+  const std::string link = file.directory() + "/link";
+  fs::create_symlink("file", link);
+  ASSERT_TRUE(replaceFile(link, "new"));
+  EXPECT_TRUE(fs::is_symlink(link));
+  EXPECT_EQ(file.contents(), "new");
+}
+
+TEST_F(ReplaceFileTest, AMissingDirectoryIsNamed) {
+  const auto written = replaceFile("/nowhere/file", "new");
+  ASSERT_FALSE(written);
+  EXPECT_EQ(written.error().message, "/nowhere/file: No such file or directory");
+}
+
+TEST_F(ReplaceFileTest, ADeviceIsWrittenToAsItIs) {
+  const auto written = replaceFile("/dev/full", "new");
+  ASSERT_FALSE(written);
+  EXPECT_EQ(written.error().message, "/dev/full: No space left on device");
+  EXPECT_TRUE(fs::is_character_file("/dev/full"));
+}
+
+}  // namespace
+}  // namespace kestro
