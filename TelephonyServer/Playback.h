@@ -39,7 +39,8 @@ struct PlaybackOptions {
 
 /// Hands a source's events to a listener when they are due. Time passes whether or not anybody is
 /// there to listen; events that are late (a busy machine) follow at once, in portions that leave
-/// room for everything else on the main thread. A clock that is set does not disturb the pace.
+/// room for everything else on the main thread. A clock that is set moves the source on by ten
+/// seconds too much, or by one too few, at most.
 class Playback {
  public:
   /// The references must outlive the playback. `report` gets a line when the source ends, fails or

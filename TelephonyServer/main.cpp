@@ -10,6 +10,7 @@
 
 #include "Platform/Linux/LinuxPlatform.h"
 #include "Platform/TextSink.h"
+#include "TelephonyServer/DescriptorLimit.h"
 #include "TelephonyServer/EndWithParent.h"
 #include "TelephonyServer/Options.h"
 #include "TelephonyServer/Playback.h"
@@ -49,6 +50,7 @@ int runServer(int argumentCount, const char* const* arguments) {
   }
   const auto& options = std::get<ServerOptions>(parsed);
   if (options.exitsWithParent && !endWithParent(options.parent)) return 0;
+  allowDescriptors(Server::kMaximumDescriptors);
   LinuxPlatformOptions platformOptions;
   platformOptions.logThreshold = options.logThreshold;
   const auto platform = createLinuxPlatform(platformOptions);
