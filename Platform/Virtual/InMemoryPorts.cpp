@@ -128,6 +128,7 @@ std::shared_ptr<LocalPort> InMemoryPorts::createLocalPort(std::string_view name,
                                                           ReceiveHandler handler) {
   if (std::exchange(_failures.localPort, false) || !isPortName(name) || exists(name))
     return nullptr;
+  std::erase_if(_ports, [](const auto& entry) { return entry.second.expired(); });
   auto port = std::make_shared<Local>(_queue, std::move(handler));
   _ports.insert_or_assign(std::string(name), port);
   return port;
