@@ -23,6 +23,10 @@ struct MessageCounts {
   std::uint64_t sent = 0;
   std::uint64_t wanted = 0;
   std::uint64_t received = 0;
+
+  MessageCounts operator-(const MessageCounts& earlier) const {
+    return {sent - earlier.sent, wanted - earlier.wanted, received - earlier.received};
+  }
 };
 
 /// Counts what a server hands out while it passes it on.
