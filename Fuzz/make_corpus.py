@@ -7,6 +7,7 @@ recordings and snapshots: a few messages each, of every length and log code that
 
 import pathlib
 import plistlib
+import random
 import struct
 import sys
 
@@ -22,6 +23,10 @@ KINDS = 40  # of messages, per technology
 # Payloads on both sides of every minimum length, for each of the plain reader's codes.
 LENGTHS = {"LTE": (9, range(27)), "Ondrel_GSM": (28, range(21)), "UTRAN2": (8, range(15)),
            "Ondrel_CDMA": (8, (3, 4, 9, 10, 11, 12, 13, 36, 37, 38, 157, 158, 227, 228))}
+# Payloads long enough for some records of every table, of all kinds of bytes.
+RANDOM_LENGTHS = {"LTE": (300, 300), "Ondrel_GSM": (52, 150), "UTRAN2": (450, 450),
+                  "Ondrel_CDMA": (52, 300)}
+COUNTERS = {"Ondrel_CDMA": (2, 6)}  # codes whose packets are longer still
 SECOND, REFRESH, WHOLE_MESSAGE = b"\x0a", b"\xff", b"\xfe"
 
 
@@ -68,6 +73,22 @@ def make_comparison(technology, kinds):
                        for code in range(codes) for length in lengths))
 
 
+def make_random(technology):
+    codes = LENGTHS[technology][0]
+    for number in range(3):
+        numbers = random.Random(number)
+        steps = []
+        for code in range(codes):
+            for length in RANDOM_LENGTHS[technology]:
+                if code in COUNTERS.get(technology, ()):
+                    length = 1740
+                # Counts stand in front, and small ones leave room for what they count.
+                steps.append(bytes([code]) + framed(
+                    bytes(numbers.randrange(5) if i < 16 and numbers.random() < 0.8
+                          else numbers.randrange(256) for i in range(length))))
+        write(f"DifferentialFuzz_{technology}", f"random-{number}", b"".join(steps))
+
+
 def dlf_of(entries):
     """A version report of zeros, then every entry without its first byte."""
     return bytes(161) + b"".join(entry[1:] for entry in entries)
@@ -93,6 +114,7 @@ def make_recordings(technology, kinds):
           + b"".join(SECOND + framed(message) for message in kinds[:12]))
     if technology in TEMPLATES:
         make_comparison(technology, kinds)
+        make_random(technology)
         make_logs(technology, [b"".join(kinds[:3]), kinds[3] if len(kinds) > 3 else b"", b"\x01"])
 
 
