@@ -332,8 +332,13 @@ bool TableView::viewportEvent(QEvent* event) {
     case QEvent::TouchBegin:
     case QEvent::TouchUpdate:
     case QEvent::TouchEnd:
-    case QEvent::TouchCancel:
       touch(static_cast<QTouchEvent&>(*event));
+      event->accept();
+      return true;
+    case QEvent::TouchCancel:  // the system takes the touch away: there are no points
+      QScroller::scroller(viewport())->stop();
+      _movement = Movement::Elsewhere;
+      releaseAt(_lastPosition);
       event->accept();
       return true;
     default:
@@ -357,7 +362,6 @@ void TableView::touch(const QTouchEvent& event) {
     moveTo(position);
     if (_movement != Movement::Sideways) scroll(QScroller::InputMove);
   } else {
-    if (event.type() == QEvent::TouchCancel) _movement = Movement::Elsewhere;
     scroll(QScroller::InputRelease);
     releaseAt(position);
   }

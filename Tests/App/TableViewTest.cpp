@@ -212,6 +212,16 @@ TEST_F(TableViewTest, AFingerThatMovesScrollsAndSelectsNothing) {
   EXPECT_GT(table.verticalScrollBar()->value(), 100);
 }
 
+TEST_F(TableViewTest, ATouchThatTheSystemTakesAwaySelectsNothing) {
+  const std::unique_ptr<QPointingDevice> device(QTest::createTouchDevice());
+  QTest::touchEvent(&table, device.get()).press(0, middleOf(3), &table);
+  ASSERT_TRUE(cell(3).isPressed());
+  QTouchEvent cancel(QEvent::TouchCancel, device.get());  // it comes without points
+  QCoreApplication::sendEvent(table.viewport(), &cancel);
+  EXPECT_FALSE(cell(3).isPressed());
+  EXPECT_THAT(selected, IsEmpty());
+}
+
 TEST_F(TableViewTest, AFingerThatStopsCoastingRowsSelectsNone) {
   const std::unique_ptr<QPointingDevice> device(QTest::createTouchDevice());
   QTest::touchEvent(&table, device.get()).press(0, QPoint(200, 400), &table);
