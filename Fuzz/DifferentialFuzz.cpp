@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 // Packets of one technology: its generator shows what a plain reader of the same layouts shows.
 #include <algorithm>
+#include <utility>
 #include <vector>
 
 #include "Fuzz/GeneratorChannel.h"
@@ -36,8 +37,9 @@ class Comparison {
     receive({message.begin(), message.end()});
   }
 
-  /// Both make a history entry of what they show.
+  /// Both make a history entry of what they show, unless nothing came since the last one.
   void refresh() {
+    if (!std::exchange(_isChanged, false)) return;
     _channel.refresh();
     _history.push_back({Value(_reader->display()).deepCopy(), _reader->takeCollected()});
     if (_history.size() > kMaximumHistoryEntries) _history.erase(_history.begin());
@@ -71,6 +73,7 @@ class Comparison {
   }
 
   void receive(const Bytes& message) {
+    _isChanged = true;
     const bool isSurvived = _reader->receive(message);
     require(_channel.receive(message) == isSurvived, "the same messages end the application");
     requireSame(_channel.state()[kStateDisplay], _reader->display());
@@ -91,6 +94,7 @@ class Comparison {
   std::unique_ptr<plain::PlainReader> _reader =
       plain::makePlainReader(kTechnology, propertyListCoding());
   std::vector<Entry> _history;
+  bool _isChanged = true;
 };
 
 }  // namespace
