@@ -7,14 +7,14 @@
 
 #include "Platform/PropertyListCoding.h"
 #include "Platform/SystemLog.h"
+#include "Platform/TelephonyProtocol.h"
 #include "Platform/TelephonyService.h"
 #include "Platform/Uuids.h"
 
 namespace kestro {
 namespace {
 
-constexpr std::int32_t kMessageId = 0;
-constexpr std::string_view kGetTechnology = "GetTechnology";
+constexpr std::int32_t kMessageId = messageId(TelephonyMessage::Channel);
 
 }  // namespace
 
@@ -104,7 +104,7 @@ void KestroModel::destroyPorts() {
 // --- Connect cycle -------------------------------------------------------------------------------
 
 void KestroModel::configureGenerator() {
-  const Dictionary command{{kGetTechnology, kGetTechnology}};
+  const Dictionary command{{kTelephonyGetTechnology, kTelephonyGetTechnology}};
   const auto request = _platform.propertyListCoding().xml(command);
   if (!request) {
     logError(" Could not generate GetTechnology command; cannot configure");
@@ -131,7 +131,7 @@ void KestroModel::setGeneratorFromReply(ByteView reply) {
     logError(" ***** Could not parse reply to GetTechnology; cannot configure");
     return;
   }
-  const Value technology = parsed->dictionary()[kGetTechnology];
+  const Value technology = parsed->dictionary()[kTelephonyGetTechnology];
   if (technology.isNull()) {
     logError(" ***** Reply to GetTechnology had no answer; cannot configure");
     return;
