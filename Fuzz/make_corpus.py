@@ -73,6 +73,18 @@ def make_comparison(technology, kinds):
                        for code in range(codes) for length in lengths))
 
 
+def make_identities():
+    """Lists of cells' identities, an empty one too, and measurements of those cells."""
+    identities, measurements = bytes([11]), bytes([7])
+    cells = bytes([0, 2]) + struct.pack("<HBxHBx", 700, 52, 710, 53)
+    levels = bytes(15) + bytes([3]) + b"".join(
+        struct.pack("<HBI7x", channel, 60, 20) for channel in (700, 710, 720))
+    steps = [identities + framed(cells), measurements + framed(levels), REFRESH,
+             identities + framed(b"\x00"), measurements + framed(levels),
+             identities + framed(b"\x00\x00"), measurements + framed(levels)]
+    write("DifferentialFuzz_Ondrel_GSM", "identities", b"".join(steps))
+
+
 def make_random(technology):
     codes = LENGTHS[technology][0]
     for number in range(3):
@@ -115,6 +127,8 @@ def make_recordings(technology, kinds):
     if technology in TEMPLATES:
         make_comparison(technology, kinds)
         make_random(technology)
+    if technology == "Ondrel_GSM":
+        make_identities()
         make_logs(technology, [b"".join(kinds[:3]), kinds[3] if len(kinds) > 3 else b"", b"\x01"])
 
 

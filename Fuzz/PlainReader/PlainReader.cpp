@@ -104,7 +104,8 @@ SectionReader::SectionReader(const PropertyListCoding& coding,
                              std::span<const std::string_view> lists)
     : _coding(coding) {
   for (const std::string_view name : dictionaries) _template.set(name, Dictionary());
-  for (const std::string_view name : lists) _template.set(name, Array());
+  // Lists begin with something, so that it shows when they are emptied.
+  for (const std::string_view name : lists) _template.set(name, Array{"before"});
   shown() = Value(_template).deepCopy().dictionary();
 }
 
