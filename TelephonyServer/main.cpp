@@ -14,6 +14,7 @@
 #include "TelephonyServer/EndWithParent.h"
 #include "TelephonyServer/Options.h"
 #include "TelephonyServer/Playback.h"
+#include "TelephonyServer/ProcessMemory.h"
 #include "TelephonyServer/Server.h"
 
 namespace kestro {
@@ -51,6 +52,7 @@ int runServer(int argumentCount, const char* const* arguments) {
   const auto& options = std::get<ServerOptions>(parsed);
   if (options.exitsWithParent && !endWithParent(options.parent)) return 0;
   allowDescriptors(Server::kMaximumDescriptors);
+  giveBackLargeBlocks();
   LinuxPlatformOptions platformOptions;
   platformOptions.logThreshold = options.logThreshold;
   const auto platform = createLinuxPlatform(platformOptions);

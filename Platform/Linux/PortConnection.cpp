@@ -35,9 +35,17 @@ PortConnection::PortConnection(FileDescriptor socket, PortDirection direction, s
   });
 }
 
+PortConnection::~PortConnection() { _context->queuedBytes -= _countedBytes; }
+
+void PortConnection::countQueue() {
+  _context->queuedBytes += _queue.size() - _countedBytes;
+  _countedBytes = _queue.size();
+}
+
 void PortConnection::enqueue(const PortFrameHeader& header, ByteView body) {
   if (!isOpen()) return;
   _queue.append(header, body);
+  countQueue();
   if (_writeNotifier->isEnabled()) return;  // the system takes no more; the notifier goes on
   if (_queue.size() >= kFlushSize) {
     flush();
@@ -54,6 +62,7 @@ void PortConnection::endTurn() {
 void PortConnection::flush() {
   if (!isOpen()) return;
   const PortSendQueue::FlushStatus status = _queue.flush(socket());
+  countQueue();
   if (status == PortSendQueue::FlushStatus::Broken) {
     close();
     return;
@@ -72,6 +81,7 @@ void PortConnection::close() {
   _writeNotifier.reset();
   _socket.reset();
   _queue = PortSendQueue();
+  countQueue();
   onClosed();
 }
 

@@ -25,6 +25,7 @@ struct PortContext {
   SystemLog& log;
   uid_t peerUser;  ///< the one user whose processes may be peers
   PortFlusher flusher;
+  std::size_t queuedBytes = 0;  ///< what waits to be sent, on all connections together
 };
 
 /// When a wait ends.
@@ -39,10 +40,14 @@ class PortConnection : public std::enable_shared_from_this<PortConnection> {
  public:
   /// The most that may wait in a send queue, headers included.
   static constexpr std::size_t kMaximumQueuedBytes = std::size_t{4} * 1024 * 1024;
+  /// While more than this waits on all connections together, a message is queued on those only on
+  /// which no more than `kCrowdedQueuedBytes` wait.
+  static constexpr std::size_t kMaximumQueuedBytesOfAll = std::size_t{64} * 1024 * 1024;
+  static constexpr std::size_t kCrowdedQueuedBytes = std::size_t{256} * 1024;
 
   PortConnection(const PortConnection&) = delete;
   PortConnection& operator=(const PortConnection&) = delete;
-  virtual ~PortConnection() = default;
+  virtual ~PortConnection();
 
   [[nodiscard]] bool isOpen() const noexcept { return _socket.isOpen(); }
 
@@ -72,6 +77,9 @@ class PortConnection : public std::enable_shared_from_this<PortConnection> {
   [[nodiscard]] PortFrameReader& reader() noexcept { return _reader; }
   [[nodiscard]] PortSendQueue& queue() noexcept { return _queue; }
   [[nodiscard]] int socket() const noexcept { return _socket.get(); }
+
+  /// Keeps the count of what waits on all connections true. For those who change the queue.
+  void countQueue();
 
   /// Queues a frame without looking at the limit; it leaves at the end of this turn at the latest,
   /// if the peer reads. Drops it when the socket is closed.
@@ -110,6 +118,7 @@ class PortConnection : public std::enable_shared_from_this<PortConnection> {
   std::shared_ptr<PortContext> _context;
   PortFrameReader _reader;
   PortSendQueue _queue;
+  std::size_t _countedBytes = 0;  ///< this queue's part of what waits on all connections
   std::unique_ptr<QSocketNotifier> _readNotifier;
   std::unique_ptr<QSocketNotifier> _writeNotifier;  ///< enabled while the system takes no more
   bool _flushScheduled = false;

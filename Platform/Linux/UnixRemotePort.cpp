@@ -20,15 +20,23 @@ bool UnixRemotePort::isValid() const {
   return (state & (POLLRDHUP | POLLHUP | POLLERR | POLLNVAL)) == 0;
 }
 
+std::size_t UnixRemotePort::mostQueuedBytes() const {
+  const bool isCrowded = context().queuedBytes > kMaximumQueuedBytesOfAll;
+  return isCrowded ? kCrowdedQueuedBytes : kMaximumQueuedBytes;
+}
+
 SendError UnixRemotePort::post(std::int32_t messageId, ByteView message) {
   if (!isOpen()) return SendError::InvalidPort;
   if (message.size() > kMaximumMessageSize) return SendError::Transport;
   const std::size_t size = PortFrameHeader::kSize + message.size();
-  const auto overflows = [&] { return queue().size() + size > kMaximumQueuedBytes; };
+  // What waits already counts, not this message: nobody loses a connection that has nothing queued.
+  const auto overflows = [&] {
+    return queue().size() + size > kMaximumQueuedBytes || queue().size() > mostQueuedBytes();
+  };
   if (overflows()) flush();
   if (overflows()) {
     abandon(fmt::format("the peer does not read: {} bytes wait, at most {} may",
-                        queue().size() + size, kMaximumQueuedBytes));
+                        queue().size() + size, mostQueuedBytes()));
   }
   if (!isOpen()) return SendError::Transport;
   enqueue({.kind = PortFrameKind::Message, .messageId = messageId}, message);
@@ -64,6 +72,7 @@ SendError UnixRemotePort::transmit(const PortFrameHeader& header, ByteView messa
     const short ready = waitFor(POLLOUT | POLLIN, deadline);
     if (ready == 0) {
       queue().withdraw(position);
+      countQueue();
       return SendError::SendTimeout;
     }
     // A peer may be unable to read on before its replies are taken.

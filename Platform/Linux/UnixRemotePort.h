@@ -29,6 +29,8 @@ class UnixRemotePort final : public RemotePort, public PortConnection {
 
  private:
   void onReadable() override;
+  /// The most that may wait now.
+  [[nodiscard]] std::size_t mostQueuedBytes() const;
   [[nodiscard]] SendError transmit(const PortFrameHeader& header, ByteView message,
                                    PortDeadline deadline);
   [[nodiscard]] Reply awaitReply(std::uint32_t sequence, PortDeadline deadline);

@@ -2,6 +2,7 @@
 // Remote ports, against receivers that read bytes, and against ports of another thread.
 #include <sys/wait.h>
 
+#include <algorithm>
 #include <csignal>
 
 #include "Tests/Platform/Linux/PortFixture.h"
@@ -284,6 +285,32 @@ TEST_F(UnixRemotePortTest, MoreThanTheQueueHoldsClosesTheConnectionWithALine) {
   EXPECT_THAT(logTexts(),
               ElementsAre("Message port \"Peer\": closing a connection: the peer does not read: "
                           "4194320 bytes wait, at most 4194304 may"));
+}
+
+TEST_F(UnixRemotePortTest, WhenMuchWaitsForManyEachMayHoldUpLess) {
+  std::vector<RawListener> listeners;
+  std::vector<std::shared_ptr<RemotePort>> slow;
+  const Bytes message(kMebibyte);
+  const auto addSlowPeer = [&] {
+    const std::string name = "Slow" + std::to_string(slow.size());
+    listeners.emplace_back(pathOf(name));
+    slow.push_back(ports->createRemotePort(name));
+  };
+  // 60 MiB, of which the system's buffers take some: that may wait.
+  for (int i = 0; i < 20; ++i) {
+    addSlowPeer();
+    for (int j = 0; j < 3; ++j) EXPECT_EQ(slow.back()->post(0, message), SendError::None);
+  }
+  // Nothing waits for these yet. Of all 100 MiB the system's buffers do not take 36.
+  for (int i = 0; i < 10; ++i) {
+    addSlowPeer();
+    EXPECT_EQ(slow.back()->post(0, Bytes(4 * kMebibyte - 16)), SendError::None);
+  }
+  EXPECT_EQ(slow.front()->post(0, {}), SendError::Transport);
+  EXPECT_EQ(slow.front()->post(0, {}), SendError::InvalidPort);
+  // When enough connections are gone, the others may go on.
+  for (const auto& port : slow) static_cast<void>(port->post(0, {}));
+  EXPECT_GE(std::ranges::count_if(slow, [](const auto& port) { return port->isValid(); }), 16);
 }
 
 TEST_F(UnixRemotePortTest, ASlowReaderDoesNotHoldUpAnother) {

@@ -1,0 +1,13 @@
+// SPDX-License-Identifier: MIT
+#include "TelephonyServer/ProcessMemory.h"
+
+#include <malloc.h>
+
+namespace kestro {
+
+void giveBackLargeBlocks() {
+  constexpr int kLarge = 1024 * 1024;
+  ::mallopt(M_MMAP_THRESHOLD, kLarge);
+}
+
+}  // namespace kestro

@@ -1,0 +1,27 @@
+// SPDX-License-Identifier: MIT
+#include <gtest/gtest.h>
+#include <malloc.h>
+
+#include <memory>
+#include <vector>
+
+#include "TelephonyServer/ProcessMemory.h"
+
+namespace kestro {
+namespace {
+
+#ifndef __SANITIZE_ADDRESS__  // which has an allocator of its own
+TEST(ProcessMemory, largeBlocksAreTheSystemsAgainWhenFreed) {
+  giveBackLargeBlocks();
+  for (int round = 0; round < 3; ++round) {
+    const std::size_t before = ::mallinfo2().hblkhd;
+    auto block = std::make_unique<std::vector<char>>(4'000'000);
+    EXPECT_GE(::mallinfo2().hblkhd, before + 4'000'000) << round;
+    block.reset();
+    EXPECT_EQ(::mallinfo2().hblkhd, before) << round;
+  }
+}
+#endif
+
+}  // namespace
+}  // namespace kestro
