@@ -42,9 +42,11 @@ void WatchSession::redraw() {
 
 void WatchSession::refresh() {
   if (_isOver) return;
+  NodePointer tree = _model->topLevelNodes();
+  if (!tree) return;  // the channel's technology has no generator: the last display stays
   const Moment now = _platform.clock().now();
   if (_model->isConnected()) _updateMessage = updatedText(_platform.clock(), now);
-  _state.previous = std::exchange(_state.tree, _model->topLevelNodes());
+  _state.previous = std::exchange(_state.tree, std::move(tree));
   _state.time = now;
   updateStatus();
   ++_refreshCount;

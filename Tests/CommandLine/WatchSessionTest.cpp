@@ -104,6 +104,19 @@ TEST_F(WatchSessionTest, AfterReconnectingTheOldUpdateShowsUntilNewData) {
   EXPECT_THAT(view.take(), ElementsAre(::testing::EndsWith("| 1 > 2")));
 }
 
+TEST_F(WatchSessionTest, ATechnologyThatNobodyDecodesKeepsTheDisplay) {
+  start();
+  sendValue("1");
+  queue().advance(2s);
+  view.take();
+  sendValue("2");
+  answerTechnology("Another");
+  channel.reset();
+  openChannel();
+  queue().advance(2s);
+  EXPECT_THAT(view.take(), ElementsAre("- Connecting... | 1"));
+}
+
 TEST_F(WatchSessionTest, WithoutAServerItGoesOnConnecting) {
   platform.telephonyService().setReachable(false);
   start();
