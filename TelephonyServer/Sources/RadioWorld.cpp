@@ -71,27 +71,36 @@ RadioLayer::RadioLayer(RadioLayerParameters parameters) : _parameters(std::move(
 std::vector<CellLevel> RadioLayer::levels(const Drive& drive) const {
   std::vector<CellLevel> result;
   result.reserve(_cells.size());
-  for (std::size_t i = 0; i < _cells.size(); ++i) result.push_back(levelOf(i, drive));
+  for (const unsigned site : _parameters.sites) {
+    const SiteLevel level = levelOf(site, drive);
+    for (unsigned sector = 0; sector < kSectors; ++sector) {
+      result.push_back(levelOf(result.size(), level, drive));
+    }
+  }
   std::ranges::stable_sort(result, std::ranges::greater(), &CellLevel::level);
   return result;
 }
 
-CellLevel RadioLayer::levelOf(std::size_t cell, const Drive& drive) const {
-  const auto [site, sector] = _cells[cell];
+RadioLayer::SiteLevel RadioLayer::levelOf(unsigned site, const Drive& drive) const {
   const Location mast = RingRoad::siteAt(site);
   const Location car = RingRoad::locationAt(drive.distance());
   const double distance = std::hypot(car.x - mast.x, car.y - mast.y);
-  const double direction = std::atan2(car.y - mast.y, car.x - mast.x);
-  const double mainDirection = (site * 0.37 + sector / double{kSectors}) * kTurn;
   // Sectors of one mast share most of what stands between it and the road.
   constexpr auto kPeriod = static_cast<std::uint64_t>(RingRoad::kLength / kShadowMetres);
   const SmoothNoise shadow(hashed(_parameters.seed, site), kShadowMetres, kPeriod);
+  return {.distance = distance,
+          .direction = std::atan2(car.y - mast.y, car.x - mast.x),
+          .unshadowed = _parameters.power - pathLoss(distance, _parameters.frequency),
+          .shadow = _parameters.shadowDeviation * shadow.at(drive.distance())};
+}
+
+CellLevel RadioLayer::levelOf(std::size_t cell, const SiteLevel& ofSite, const Drive& drive) const {
+  const auto [site, sector] = _cells[cell];
+  const double mainDirection = (site * 0.37 + sector / double{kSectors}) * kTurn;
   const SmoothNoise fading(hashed(_parameters.seed, 1000 + cell), kFadingSeconds);
-  const double level = _parameters.power - pathLoss(distance, _parameters.frequency) -
-                       sectorLoss(direction - mainDirection) +
-                       _parameters.shadowDeviation * shadow.at(drive.distance()) +
-                       _parameters.fadingDeviation * fading.at(drive.seconds());
-  return {.cell = cell, .level = level, .distance = distance};
+  const double level = ofSite.unshadowed - sectorLoss(ofSite.direction - mainDirection) +
+                       ofSite.shadow + _parameters.fadingDeviation * fading.at(drive.seconds());
+  return {.cell = cell, .level = level, .distance = ofSite.distance};
 }
 
 void PowerSum::add(double level) noexcept { _milliwatts += std::pow(10, level / 10); }

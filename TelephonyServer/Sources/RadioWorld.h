@@ -89,7 +89,17 @@ class RadioLayer {
   [[nodiscard]] std::vector<CellLevel> levels(const Drive& drive) const;
 
  private:
-  [[nodiscard]] CellLevel levelOf(std::size_t cell, const Drive& drive) const;
+  /// What the sectors of a mast have in common.
+  struct SiteLevel {
+    double distance;
+    double direction;   ///< from the mast to the car
+    double unshadowed;  ///< dBm in a sector's main direction
+    double shadow;      ///< dB
+  };
+
+  [[nodiscard]] SiteLevel levelOf(unsigned site, const Drive& drive) const;
+  [[nodiscard]] CellLevel levelOf(std::size_t cell, const SiteLevel& ofSite,
+                                  const Drive& drive) const;
 
   RadioLayerParameters _parameters;
   std::vector<SimulatedCell> _cells;
