@@ -98,13 +98,12 @@ class Comparison {
 };
 
 }  // namespace
-}  // namespace kestro::fuzz
 
-extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-  using namespace kestro::fuzz;
-  Input input(data, size);
+void tryInput(ByteView bytes) {
+  Input input(bytes);
   Comparison comparison;
   while (!input.isAtEnd()) comparison.takeStep(input);
   comparison.refresh();
-  return 0;
 }
+
+}  // namespace kestro::fuzz

@@ -78,23 +78,22 @@ void checkRoundTrip(const Array& history) {
 }
 
 }  // namespace
-}  // namespace kestro::fuzz
 
-extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-  using namespace kestro;
-  fuzz::Input input(data, size);
-  const Array history = fuzz::historyOf(input);
-  fuzz::checkRoundTrip(history);
+void tryInput(ByteView bytes) {
+  Input input(bytes);
+  const Array history = historyOf(input);
+  checkRoundTrip(history);
   const ByteView log = input.rest();
   const auto read = reframedDlf(log, history);
   if (read) {
-    fuzz::require(std::ranges::equal(log.subspan(kVersionReportSize),
-                                     ByteView(fuzz::exported(history)).subspan(kVersionReportSize)),
-                  "a log is of no history but its own");
+    require(std::ranges::equal(log.subspan(kVersionReportSize),
+                               ByteView(exported(history)).subspan(kVersionReportSize)),
+            "a log is of no history but its own");
   }
   Bytes records;
   const CollectedRecords found = appendRecords(records, log);
-  fuzz::require(records.size() + found.unframedSize + found.count <= log.size(),
-                "records are bytes of the log");
-  return 0;
+  require(records.size() + found.unframedSize + found.count <= log.size(),
+          "records are bytes of the log");
 }
+
+}  // namespace kestro::fuzz

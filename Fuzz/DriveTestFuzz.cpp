@@ -31,18 +31,17 @@ void play(LogSource& source) {
 }
 
 }  // namespace
-}  // namespace kestro::fuzz
 
-extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-  using namespace kestro;
-  fuzz::Input input(data, size);
+void tryInput(ByteView bytes) {
+  Input input(bytes);
   const auto choices = technologyChoices();
   const std::string_view technology = choices[input.byte() % choices.size()];
-  const fuzz::MemoryFile file(input.rest());
-  VirtualPlatform platform(fuzz::propertyListCoding());
+  const MemoryFile file(input.rest());
+  VirtualPlatform platform(propertyListCoding());
   const SourceReporter ignore = [](std::string_view) {};
   const auto source = openSource(
       {.kind = "drive-test", .argument = file.path(), .technology = technology}, platform, ignore);
-  if (source) fuzz::play(**source);
-  return 0;
+  if (source) play(**source);
 }
+
+}  // namespace kestro::fuzz

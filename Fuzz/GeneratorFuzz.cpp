@@ -27,11 +27,9 @@ void takeStep(Input& input, GeneratorChannel& channel) {
 }
 
 }  // namespace
-}  // namespace kestro::fuzz
 
-extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-  using namespace kestro::fuzz;
-  Input input(data, size);
+void tryInput(ByteView bytes) {
+  Input input(bytes);
   GeneratorChannel channel(KESTRO_FUZZ_TECHNOLOGY);
   const unsigned beginning = input.byte();
   if ((beginning & 1) == 0) channel.addTemplates();
@@ -39,5 +37,6 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
   if ((beginning & 2) == 0) channel.refresh();
   while (!input.isAtEnd()) takeStep(input, channel);
   channel.refresh();
-  return 0;
 }
+
+}  // namespace kestro::fuzz

@@ -13,10 +13,10 @@
 
 #include "Platform/Bytes.h"
 
-/// The harness. Returns 0; a promise that does not hold ends the process.
-extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size);
-
 namespace kestro::fuzz {
+
+/// The harness: each of them defines it. A promise that does not hold ends the process.
+void tryInput(ByteView bytes);
 
 /// Ends the process unless the promise holds.
 inline void require(bool holds, std::string_view promise) {
@@ -28,7 +28,7 @@ inline void require(bool holds, std::string_view promise) {
 /// Takes an input apart from its front. Beyond its end bytes are 0 and pieces empty.
 class Input {
  public:
-  Input(const std::uint8_t* data, std::size_t size) : _rest(data, size) {}
+  explicit Input(ByteView bytes) : _rest(bytes) {}
 
   [[nodiscard]] bool isAtEnd() const noexcept { return _rest.empty(); }
 

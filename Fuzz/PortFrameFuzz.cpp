@@ -34,17 +34,16 @@ void readAll(Input& input, PortDirection direction, const std::array<int, 2>& so
 }
 
 }  // namespace
-}  // namespace kestro::fuzz
 
-extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-  using namespace kestro;
-  fuzz::Input input(data, size);
+void tryInput(ByteView bytes) {
+  Input input(bytes);
   std::array<int, 2> sockets{};
-  if (::socketpair(AF_UNIX, SOCK_STREAM | SOCK_NONBLOCK, 0, sockets.data()) != 0) return 0;
+  if (::socketpair(AF_UNIX, SOCK_STREAM | SOCK_NONBLOCK, 0, sockets.data()) != 0) return;
   const auto direction =
       (input.byte() & 1) != 0 ? PortDirection::ToReceiver : PortDirection::ToSender;
-  fuzz::readAll(input, direction, sockets);
+  readAll(input, direction, sockets);
   ::close(sockets[0]);
   ::close(sockets[1]);
-  return 0;
 }
+
+}  // namespace kestro::fuzz

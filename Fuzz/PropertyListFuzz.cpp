@@ -23,14 +23,13 @@ void checkForms(const PropertyListCoding& coding, const Value& value) {
 }
 
 }  // namespace
-}  // namespace kestro::fuzz
 
-extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-  using namespace kestro;
+void tryInput(ByteView bytes) {
   static const auto coding = createPropertyListCoding();
-  const auto value = coding->parse({data, size});
-  if (!value) return 0;
-  fuzz::checkForms(*coding, *value);
+  const auto value = coding->parse(bytes);
+  if (!value) return;
+  checkForms(*coding, *value);
   static_cast<void>(value->deepCopy());
-  return 0;
 }
+
+}  // namespace kestro::fuzz

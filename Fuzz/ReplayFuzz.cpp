@@ -59,16 +59,15 @@ class Recording {
 };
 
 }  // namespace
-}  // namespace kestro::fuzz
 
-extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-  using namespace kestro;
-  fuzz::Input input(data, size);
+void tryInput(ByteView bytes) {
+  Input input(bytes);
   const auto technologies = LogGenerator::technologies();
   const unsigned choice = input.byte();
-  fuzz::Recording recording(technologies[choice % technologies.size()],
-                            choice < 128 ? kDisplayUpdateInterval : std::chrono::seconds(0));
+  Recording recording(technologies[choice % technologies.size()],
+                      choice < 128 ? kDisplayUpdateInterval : std::chrono::seconds(0));
   recording.replay(input);
   recording.save();
-  return 0;
 }
+
+}  // namespace kestro::fuzz

@@ -23,7 +23,7 @@ void replay(const std::filesystem::path& path) {
   const std::vector<char> bytes{std::istreambuf_iterator<char>(file), {}};
   const auto memory = std::make_unique<std::uint8_t[]>(bytes.size());
   for (std::size_t i = 0; i < bytes.size(); ++i) memory[i] = static_cast<std::uint8_t>(bytes[i]);
-  LLVMFuzzerTestOneInput(memory.get(), bytes.size());
+  kestro::fuzz::tryInput({memory.get(), bytes.size()});
 }
 
 }  // namespace

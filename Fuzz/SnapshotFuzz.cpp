@@ -19,16 +19,15 @@ void exportLog(const Dictionary& snapshot) {
 }
 
 }  // namespace
-}  // namespace kestro::fuzz
 
-extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-  using namespace kestro;
-  const auto snapshot = parseSnapshot(fuzz::propertyListCoding(), {data, size});
-  if (!snapshot) return 0;
-  fuzz::show(*snapshot);
-  fuzz::exportLog(*snapshot);
-  VirtualPlatform platform(fuzz::propertyListCoding());
-  fuzz::checkSaving(platform.clock(), (*snapshot)[kSnapshotData],
-                    (*snapshot)[kSnapshotDescription].text());
-  return 0;
+void tryInput(ByteView bytes) {
+  const auto snapshot = parseSnapshot(propertyListCoding(), bytes);
+  if (!snapshot) return;
+  show(*snapshot);
+  exportLog(*snapshot);
+  VirtualPlatform platform(propertyListCoding());
+  checkSaving(platform.clock(), (*snapshot)[kSnapshotData],
+              (*snapshot)[kSnapshotDescription].text());
 }
+
+}  // namespace kestro::fuzz

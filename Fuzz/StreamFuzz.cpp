@@ -38,15 +38,14 @@ void feed(Input& input, const VirtualInputStreams& streams, StreamSource& source
 }
 
 }  // namespace
-}  // namespace kestro::fuzz
 
-extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-  using namespace kestro;
-  fuzz::Input input(data, size);
+void tryInput(ByteView bytes) {
+  Input input(bytes);
   VirtualInputStreams streams;
   streams.allow("stream");
   const auto source = StreamSource::open(streams, "stream", kTqLogChannelTechnology_Ondrel_LTE);
-  fuzz::require(source.has_value(), "the stream opens");
-  fuzz::feed(input, streams, **source);
-  return 0;
+  require(source.has_value(), "the stream opens");
+  feed(input, streams, **source);
 }
+
+}  // namespace kestro::fuzz

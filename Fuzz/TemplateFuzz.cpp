@@ -12,11 +12,9 @@ void addTemplate(GeneratorChannel& channel, ByteView contents) {
 }
 
 }  // namespace
-}  // namespace kestro::fuzz
 
-extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-  using namespace kestro::fuzz;
-  Input input(data, size);
+void tryInput(ByteView bytes) {
+  Input input(bytes);
   GeneratorChannel channel(KESTRO_FUZZ_TECHNOLOGY);
   addTemplate(channel, input.bytes(input.number16()));
   channel.start();
@@ -25,5 +23,6 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
   channel.refresh();
   channel.start();
   channel.refresh();
-  return 0;
 }
+
+}  // namespace kestro::fuzz
