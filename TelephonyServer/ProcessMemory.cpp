@@ -6,7 +6,7 @@
 namespace kestro {
 
 void giveBackLargeBlocks() {
-  constexpr int kLarge = 1024 * 1024;
+  constexpr int kLarge = 128 * 1024;
   ::mallopt(M_MMAP_THRESHOLD, kLarge);
 }
 

@@ -4,8 +4,8 @@
 
 namespace kestro {
 
-/// From now on large blocks (1 MiB and more) go back to the system as soon as they are freed. Left
-/// alone, the allocator keeps such blocks for later once it has seen a few.
+/// From now on large blocks (128 KiB and more) go back to the system as soon as they are freed.
+/// Left alone, the allocator keeps such blocks for later once it has seen a few.
 void giveBackLargeBlocks();
 
 }  // namespace kestro

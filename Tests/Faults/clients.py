@@ -8,10 +8,11 @@ from promises import MEBIBYTE, Use, in_lanes, pause, require, spread, wait_until
 from world import World
 
 # What a queue of 4 MiB takes while it grows, what all queues may hold together and each of many,
-# and what memory may vary by besides.
+# what the allocator may keep of each, and what memory may vary by besides.
 LONGEST_QUEUE = 8 * MEBIBYTE
 ALL_QUEUES = 64 * MEBIBYTE
 CROWDED_QUEUE = MEBIBYTE // 4
+KEPT_FOR_CLIENT = MEBIBYTE // 16
 SLACK = 4 * MEBIBYTE
 # What a session lets a program open, unless it asks for more.
 USUAL_LIMIT = 1024
@@ -130,7 +131,8 @@ def clients_stopped(options):
         require(len(steady.recording.stretches) == 1, "nobody else misses anything")
         allowed = 2 * (ALL_QUEUES + count * CROWDED_QUEUE) + SLACK
         require(max(memory) <= memory[0] + allowed, "all queues together are bounded")
-        wait_until(lambda: server.memory() <= memory[0] + SLACK, "what they held up is free")
+        kept = SLACK + count * KEPT_FOR_CLIENT
+        wait_until(lambda: server.memory() <= memory[0] + kept, "what they held up is free")
         figures = (value / MEBIBYTE for value in (memory[0], max(memory), server.memory()))
         return (
             f"{count} clients, left behind after {waited:.1f} s; server "
