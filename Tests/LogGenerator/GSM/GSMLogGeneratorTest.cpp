@@ -45,6 +45,14 @@ TEST_F(GSMLogGeneratorTest, AsksForStreaming) {
   EXPECT_EQ(Value(generator->getStartCommand()), Value(Dictionary{{"SetState", "Streaming"}}));
 }
 
+TEST_F(GSMLogGeneratorTest, HasNoPacketsToExplainOrToList) {
+  int visits = 0;
+  const Bytes message = *coding->binary(Dictionary{{"A", "x"}});
+  generator->explainMessage(message, [&](const ExplainedValue&) { ++visits; });
+  generator->catalogue([&](const CatalogueEntry&) { ++visits; });
+  EXPECT_EQ(visits, 0);
+}
+
 TEST_F(GSMLogGeneratorTest, CollapsesAOneEntryDictionary) {
   EXPECT_EQ(processed(Dictionary{{"A", Dictionary{{"B", "x"}}}}), Value(Dictionary{{"A", "x"}}));
 }

@@ -50,6 +50,21 @@ class EncodeTest : public ::testing::Test {
   PacketWriter writer{0xB17F, 21};
 };
 
+TEST_F(EncodeTest, TheNumberOfAHiddenFieldIsItsRawValue) {
+  writer.fields(kFields).number("Records", 5);
+  EXPECT_EQ(payload()[20 - 13], 5 << 2);
+}
+
+TEST_F(EncodeTest, ATextHasNoNumber) {
+  writer.fields(kFields).number("Colour", 3);
+  EXPECT_FALSE(writer.finish(Moment()));
+}
+
+TEST_F(EncodeTest, NoFewerRecordsThanTheCountSaysForItself) {
+  writer.setCount(kTable, 0);
+  EXPECT_FALSE(writer.finish(Moment()));
+}
+
 TEST_F(EncodeTest, WritesTheHeaderOfABasebandPacket) {
   PacketWriter empty(0xB17F, 0);
   const Bytes bytes = empty.finish(Moment(std::chrono::microseconds(0x0102030405060708))).value();

@@ -144,6 +144,13 @@ TEST_F(FileInputStreamsTest, AStreamMayBeDestroyedInItsOwnHandlers) {
   EXPECT_EQ(stream, nullptr);
 }
 
+TEST_F(FileInputStreamsTest, AReadThatFailsEndsTheStreamWithTheReason) {
+  open("/proc/self/mem");  // nothing lies at address 0
+  platform->run();
+  EXPECT_EQ(pieces, 0);
+  EXPECT_EQ(ended, "Input/output error");
+}
+
 TEST_F(FileInputStreamsTest, WhatCannotBeOpenedIsRefusedWithTheReason) {
   EXPECT_THAT(refusal(directory.path() / "nothing"), HasSubstr("nothing: No such file"));
   EXPECT_THAT(refusal(directory.path()), HasSubstr("Is a directory"));

@@ -174,6 +174,14 @@ TYPED_TEST(EmptySetTest, IsEmptyWhateverCellsAPacketHas) {
   }
 }
 
+TYPED_TEST(EmptySetTest, TakesItsCountAloneFromItsByte) {
+  for (const unsigned neighbour : {0U, 255U}) {
+    this->list().append("old");
+    this->decode(setInformation(1, neighbour << 8).u8(16, neighbour).length(75));
+    EXPECT_THAT(this->list(), IsEmpty()) << neighbour;
+  }
+}
+
 TYPED_TEST(EmptySetTest, NeedsSixteenBytes) {
   this->list().append("old");
   this->decode(setInformation(0).length(15));

@@ -433,6 +433,11 @@ TEST_F(MobileAllocationTest, ShowsAnEmptyListForNoFrequency) {
   EXPECT_THAT(frequencies(), IsEmpty());
 }
 
+TEST_F(MobileAllocationTest, ASequenceNumberOfZeroIsNoBound) {
+  decode(packet(0x51F8).u8(13, 0).u8(14, 1).u16(15, 514));
+  EXPECT_THAT(frequencies(), ElementsAre("514"));
+}
+
 TEST_F(MobileAllocationTest, NeedsFifteenBytes) {
   decode(packet(0x51F8).u8(13, 33).length(14));
   EXPECT_THAT(entries(), IsEmpty());

@@ -8,6 +8,7 @@ namespace {
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 using ::testing::Pair;
+using ::testing::SizeIs;
 
 /// The rows of the list under `key`.
 std::vector<Entries> rowsUnder(const Dictionary& section, std::string_view key) {
@@ -58,6 +59,11 @@ TEST_F(BLERTest, ShowsAnEmptyListForNoChannel) {
   EXPECT_EQ(text("Window Size"), "501");
   EXPECT_TRUE(section()["Transport Channels"].isArray());
   EXPECT_THAT(rows(), IsEmpty());
+}
+
+TEST_F(BLERTest, AWindowOfZeroIsNoBound) {
+  decode(channels(1, 0).u8(16, 24).length(25));
+  EXPECT_THAT(rows(), SizeIs(1));
 }
 
 TEST_F(BLERTest, NeedsSixteenBytes) {

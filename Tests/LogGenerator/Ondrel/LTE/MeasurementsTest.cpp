@@ -251,6 +251,12 @@ TEST_F(ServingCellMeasurementTest, ShowsTheLowestValues) {
                   Pair("Measurement Rules Updated", "False"), Pair("Measurement Rules", "0")));
 }
 
+TEST_F(ServingCellMeasurementTest, OneBitAloneSaysThatTheRulesWereUpdated) {
+  // Bit 25 of the last word, whatever its neighbours are.
+  EXPECT_EQ(shown(packet(0xB17F).u32(29, 1U << 25), "Measurement Rules Updated"), "True");
+  EXPECT_EQ(shown(packet(0xB17F).u32(29, ~(1U << 25)), "Measurement Rules Updated"), "False");
+}
+
 TEST_F(ServingCellMeasurementTest, ShowsTheHighestValues) {
   decode(packet(0xB17F).length(13).length(33, 0xFF));
   EXPECT_THAT(
@@ -431,6 +437,11 @@ TEST_F(NeighborCellsListTest, ReportsUpToThirtyTwoNeighbors) {
 TEST_F(NeighborCellsListTest, TheCountReachesIntoTheSecondByte) {
   decode(neighbors().u16(19, 8U << 6));  // bits 6 to 10 are 8: the highest of them in byte 20
   EXPECT_THAT(list(), SizeIs(9));
+}
+
+TEST_F(NeighborCellsListTest, TheBoundHasAllBitsOfTheCount) {
+  decode(neighbors().u16(19, 16U << 6));
+  EXPECT_THAT(list(), SizeIs(17));
 }
 
 TEST_F(NeighborCellsListTest, OneLevelIsTwiceTheStepsOfTheServingCell) {

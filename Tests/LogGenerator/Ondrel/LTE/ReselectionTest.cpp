@@ -126,6 +126,15 @@ TEST_F(ReselectionCandidatesListTest, ShowsNoFieldsOfOtherTechnologies) {
   }
 }
 
+TEST_F(ReselectionCandidatesListTest, ReadsSixteenBitsOfTheTechnology) {
+  for (const unsigned technology : {0x0100U, 0x0101U, 0x0102U, 0x0103U, 0x0200U, 0x0300U}) {
+    decode(candidate(technology));
+    EXPECT_THAT(row(0),
+                ElementsAre(Pair("Candidate Priority", "6"), Pair("Candidate RAT Type", "??")))
+        << technology;
+  }
+}
+
 TEST_F(ReselectionCandidatesListTest, CandidatesStandFourBytesApart) {
   decode(candidate(1).u16(19, 2).u16(27, 2).u16(25, 4));
   ASSERT_THAT(list(), SizeIs(2));

@@ -67,6 +67,12 @@ TEST_F(RRCStateTest, ShowsAModeOfItsOwnNumber) {
             "Display Dict = { State = \"Unknown RRC Mode\"; }, rrc mode = 6 Unknown RRC Mode");
 }
 
+TEST_F(RRCStateTest, ReadsEightBitsOfTheMode) {
+  decode(state(1, 254).length(17, 0xFF));
+  EXPECT_EQ(consoleLines().back(),
+            "Display Dict = { State = \"Unknown RRC Mode\"; }, rrc mode = 254 Unknown RRC Mode");
+}
+
 TEST_F(RRCStateTest, APacketWithoutItsModeIsReportedAndShown) {
   decode(state(1, 3));
   takeLines();
