@@ -3,6 +3,7 @@
 
 #include <algorithm>
 #include <memory>
+#include <new>
 #include <unordered_set>
 #include <vector>
 
@@ -12,6 +13,11 @@ namespace {
 
 /// Lists of keys longer than this are searched through an index.
 constexpr std::size_t kLinearSearchLimit = 24;
+
+bool isKey(const Value& key, const Value& wanted) noexcept { return key == wanted; }
+bool isKey(const Value& key, std::string_view wanted) noexcept {
+  return key.isText() && key.text() == wanted;
+}
 
 }  // namespace
 
@@ -30,11 +36,13 @@ struct KeyEqual {
   using is_transparent = void;
   const std::vector<Value>* keys;
   bool operator()(std::uint32_t left, std::uint32_t right) const noexcept { return left == right; }
-  bool operator()(const Value& key, std::uint32_t index) const noexcept {
-    return (*keys)[index] == key;
+  template <class Key>
+  bool operator()(const Key& key, std::uint32_t index) const noexcept {
+    return isKey((*keys)[index], key);
   }
-  bool operator()(std::uint32_t index, const Value& key) const noexcept {
-    return (*keys)[index] == key;
+  template <class Key>
+  bool operator()(std::uint32_t index, const Key& key) const noexcept {
+    return isKey((*keys)[index], key);
   }
 };
 
@@ -65,23 +73,45 @@ struct KeyListObject {
     if (keys.size() > kLinearSearchLimit) buildIndex();
   }
 
+  void swap(std::vector<Value>& other) {
+    index.reset();
+    keys.swap(other);
+    if (keys.size() > kLinearSearchLimit) buildIndex();
+  }
+
   void buildIndex() {
     index = std::make_unique<KeyIndex>(2 * keys.size(), KeyHash{&keys}, KeyEqual{&keys});
     for (std::uint32_t i = 0; i < keys.size(); ++i) index->insert(i);
   }
 
-  /// The key's position, or the number of keys when it is not there.
-  [[nodiscard]] std::size_t find(const Value& key) const noexcept {
+  /// The position of a key (a value, or a text), or the number of keys when it is not there.
+  template <class Key>
+  [[nodiscard]] std::size_t find(const Key& key) const noexcept {
     if (index) {
       const auto found = index->find(key);
       return found == index->end() ? keys.size() : *found;
     }
-    return static_cast<std::size_t>(std::find(keys.begin(), keys.end(), key) - keys.begin());
+    const auto found =
+        std::ranges::find_if(keys, [&](const Value& other) { return isKey(other, key); });
+    return static_cast<std::size_t>(found - keys.begin());
   }
 };
 
+/// The text follows the object in the same piece of memory.
 struct TextObject : SharedObject {
-  std::string text;
+  std::size_t size = 0;
+
+  [[nodiscard]] static TextObject* make(std::string_view text) {
+    auto* object = new (::operator new(sizeof(TextObject) + text.size())) TextObject;
+    object->size = text.size();
+    std::memcpy(object + 1, text.data(), text.size());
+    return object;
+  }
+  void destroy() noexcept { ::operator delete(this); }
+
+  [[nodiscard]] std::string_view text() const noexcept {
+    return {reinterpret_cast<const char*>(this + 1), size};
+  }
 };
 
 struct DataObject : SharedObject {
@@ -171,9 +201,7 @@ Value::Value(std::string_view text) {
     _tag = static_cast<std::uint8_t>(text.size());
     return;
   }
-  auto* object = new detail::TextObject;
-  object->text = text;
-  *this = tagged<detail::SharedObject*>(kSharedText, object);
+  *this = tagged<detail::SharedObject*>(kSharedText, detail::TextObject::make(text));
 }
 
 Value::Value(const Dictionary& dictionary) noexcept {
@@ -256,7 +284,7 @@ std::string_view Value::typeName() const noexcept {
 std::string_view Value::text() const& noexcept {
   if (_tag <= kInlineCapacity) return {reinterpret_cast<const char*>(_bytes), _tag};
   if (_tag == kSharedText) {
-    return static_cast<detail::TextObject*>(payload<detail::SharedObject*>())->text;
+    return static_cast<detail::TextObject*>(payload<detail::SharedObject*>())->text();
   }
   return {};
 }
@@ -311,7 +339,7 @@ void Value::destroyShared(const Value& last) noexcept {
   auto* object = last.payload<detail::SharedObject*>();
   switch (last._tag) {
     case kSharedText:
-      delete static_cast<detail::TextObject*>(object);
+      static_cast<detail::TextObject*>(object)->destroy();
       break;
     case kData:
       delete static_cast<detail::DataObject*>(object);
@@ -326,7 +354,6 @@ void Value::destroyShared(const Value& last) noexcept {
 }
 
 bool Value::equalContents(const Value& other) const noexcept {
-  if (type() != other.type()) return false;
   switch (type()) {
     case ValueType::Text:
       return text() == other.text();
@@ -432,8 +459,11 @@ std::size_t Dictionary::indexOf(const Value& key) const noexcept {
 }
 
 const Value& Dictionary::operator[](std::string_view key) const noexcept {
-  const Value* value = find(Value(key));
-  return value == nullptr ? detail::kNullValue : *value;
+  if (_object == nullptr || _object->keys == nullptr) return detail::kNullValue;
+  const detail::KeyListObject& keys = *_object->keys;
+  const bool isShort = key.size() <= Value::kInlineCapacity;  // and quickly made
+  const std::size_t index = isShort ? keys.find(Value(key)) : keys.find(key);
+  return index == size() ? detail::kNullValue : _object->values[index];
 }
 
 const Value* Dictionary::find(const Value& key) const noexcept {
@@ -504,6 +534,14 @@ std::span<Value> Dictionary::valuesToRewrite() noexcept {
 
 void Dictionary::swapValues(std::vector<Value>& values) noexcept {
   if (_object != nullptr) _object->values.swap(values);
+}
+
+void Dictionary::swapEntries(std::vector<Value>& keys, std::vector<Value>& values) {
+  if (_object == nullptr) return;
+  if (_object->keys != nullptr && _object->keys->references > 1) _object->dropKeys();
+  if (_object->keys == nullptr) _object->keys = new detail::KeyListObject;
+  _object->keys->swap(keys);
+  _object->values.swap(values);
 }
 
 bool Dictionary::hasKeyList(const KeyList& keys) const noexcept {

@@ -153,7 +153,8 @@ class Value {
   /// same order. Containers are compared by contents, a container with itself without a look
   /// inside.
   friend bool operator==(const Value& left, const Value& right) noexcept {
-    return left.sameBits(right) || left.equalContents(right);
+    if (left.sameBits(right)) return true;
+    return left._tag == right._tag && left._tag > kNull && left.equalContents(right);
   }
 
  private:
@@ -341,6 +342,9 @@ class Dictionary {
   [[nodiscard]] std::span<Value> valuesToRewrite() noexcept;
   /// Exchanges all values at once; there must be as many as keys.
   void swapValues(std::vector<Value>& values) noexcept;
+  /// Exchanges all entries at once; the keys must be distinct, and as many as the values. Keys that
+  /// other dictionaries share stay theirs: `keys` is empty then.
+  void swapEntries(std::vector<Value>& keys, std::vector<Value>& values);
   /// Whether this dictionary's keys are the very list `keys` (not merely equal ones).
   [[nodiscard]] bool hasKeyList(const KeyList& keys) const noexcept;
 

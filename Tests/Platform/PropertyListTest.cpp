@@ -258,6 +258,7 @@ TEST(DictionaryTest, KeysMayBeOtherValuesThanTexts) {
   EXPECT_EQ(*dictionary.find(Value::integer(1)), Value("one"));
   EXPECT_EQ(*dictionary.find(Value::real(1)), Value("real"));
   EXPECT_EQ(dictionary["1"], Value("text"));
+  EXPECT_TRUE(dictionary[""].isNull());
   EXPECT_EQ(dictionary.find(Value()), nullptr);
 }
 
@@ -281,6 +282,45 @@ TEST(DictionaryTest, AHintedWriteReplacesOrAppendsWhateverTheHint) {
   dictionary.set("c", "5", 2);
   dictionary.set("d", "6", 100);
   EXPECT_EQ(Value(dictionary), Value(Dictionary{{"a", "4"}, {"b", "3"}, {"c", "5"}, {"d", "6"}}));
+}
+
+TEST(DictionaryTest, AllEntriesAreExchangedAtOnce) {
+  Dictionary dictionary{{"a", "1"}, {"b", "2"}};
+  std::vector<Value> keys{"c"};
+  std::vector<Value> values{"3"};
+  dictionary.swapEntries(keys, values);
+  EXPECT_EQ(Value(dictionary), Value(Dictionary{{"c", "3"}}));
+  EXPECT_THAT(keys, ElementsAre(Value("a"), Value("b")));
+  EXPECT_THAT(values, ElementsAre(Value("1"), Value("2")));
+  Dictionary empty;
+  empty.swapEntries(keys, values);
+  EXPECT_EQ(Value(empty), Value(Dictionary{{"a", "1"}, {"b", "2"}}));
+  EXPECT_TRUE(keys.empty() && values.empty());
+}
+
+TEST(DictionaryTest, ExchangingEntriesLeavesSharedKeysAlone) {
+  Dictionary first{{"a", "1"}};
+  const Dictionary second = first.copy();
+  std::vector<Value> keys{"c"};
+  std::vector<Value> values{"3"};
+  first.swapEntries(keys, values);
+  EXPECT_EQ(Value(first), Value(Dictionary{{"c", "3"}}));
+  EXPECT_EQ(Value(second), Value(Dictionary{{"a", "1"}}));
+  EXPECT_TRUE(keys.empty());
+}
+
+TEST(DictionaryTest, ManyExchangedEntriesAreFound) {
+  constexpr int kSize = 1000;
+  Dictionary dictionary = largeDictionary(2 * kSize);
+  std::vector<Value> keys;
+  std::vector<Value> values;
+  for (int i = kSize; i < 2 * kSize; ++i) {
+    keys.emplace_back(numbered(i));
+    values.push_back(Value::integer(-i));
+  }
+  dictionary.swapEntries(keys, values);
+  for (int i = kSize; i < 2 * kSize; ++i) EXPECT_EQ(dictionary[numbered(i)], Value::integer(-i));
+  EXPECT_TRUE(dictionary[numbered(1)].isNull());
 }
 
 TEST(DictionaryTest, RowsOfATableShareTheirKeysUntilOneChanges) {
