@@ -7,6 +7,8 @@
 #include <cstdlib>
 #include <string>
 #include <string_view>
+#include <utility>
+#include <vector>
 
 #include "Platform/Linux/PropertyListDates.h"
 #include "Platform/PropertyListCoding.h"
@@ -28,7 +30,7 @@ class Reader {
  public:
   explicit Reader(const PropertyListFacts& facts) : _facts(facts) {}
 
-  [[nodiscard]] Value value(plist_t node) const {
+  [[nodiscard]] Value value(plist_t node) {
     switch (plist_get_node_type(node)) {
       case PLIST_BOOLEAN:
         return boolean(node);
@@ -103,7 +105,7 @@ class Reader {
     return Value::data(Bytes(bytes, bytes + length));
   }
 
-  [[nodiscard]] Value array(plist_t node) const {
+  [[nodiscard]] Value array(plist_t node) {
     Array result;
     result.reserve(plist_array_get_size(node));
     void* state = nullptr;
@@ -117,8 +119,14 @@ class Reader {
     }
   }
 
-  [[nodiscard]] Value dictionary(plist_t node) const {
-    Dictionary result;
+  struct Entry {
+    AllocatedText key;
+    Value value;
+  };
+
+  [[nodiscard]] std::vector<Entry> entriesOf(plist_t node) {
+    std::vector<Entry> entries;
+    entries.reserve(plist_dict_get_size(node));
     void* state = nullptr;
     plist_dict_new_iter(node, &state);
     const Iterator iterator(state);
@@ -126,13 +134,41 @@ class Reader {
       char* key = nullptr;
       plist_t content = nullptr;
       plist_dict_next_item(node, state, &key, &content);
-      const AllocatedText owner(key);
-      if (content == nullptr) return result;
-      result.set(key, value(content));
+      AllocatedText owner(key);
+      if (content == nullptr) return entries;
+      entries.push_back({std::move(owner), value(content)});
     }
   }
 
+  [[nodiscard]] bool haveEarlierKeys(const std::vector<Entry>& entries) const {
+    std::size_t same = 0;
+    for (const auto& [key, value] : _earlierKeys) {
+      if (same == entries.size() || key.text() != entries[same].key.get()) return false;
+      ++same;
+    }
+    return same == entries.size();
+  }
+
+  // The rows of a table have the same keys: they share one list of them.
+  [[nodiscard]] Value dictionary(plist_t node) {
+    std::vector<Entry> entries = entriesOf(node);
+    if (!haveEarlierKeys(entries)) {
+      _earlierKeys = Dictionary();
+      for (const Entry& entry : entries) _earlierKeys.set(entry.key.get(), Value());
+    }
+    Dictionary result = _earlierKeys.copy();
+    if (result.size() == entries.size()) {
+      for (std::size_t i = 0; i < entries.size(); ++i) {
+        result.setValueAt(i, std::move(entries[i].value));
+      }
+    } else {  // of entries with one key the last counts
+      for (Entry& entry : entries) result.set(entry.key.get(), std::move(entry.value));
+    }
+    return result;
+  }
+
   const PropertyListFacts& _facts;
+  Dictionary _earlierKeys;  ///< with null values
 };
 
 // --- From values to nodes

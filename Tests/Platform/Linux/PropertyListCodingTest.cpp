@@ -128,6 +128,22 @@ TEST_F(PropertyListCodingTest, OfEntriesWithOneKeyTheLastCounts) {
             expected);
 }
 
+TEST_F(PropertyListCodingTest, RowsWithTheSameKeysAreDifferentDictionaries) {
+  const Value list = parsedXml(
+      "<array><dict><key>a</key><string>1</string><key>b</key><string>2</string></dict>"
+      "<dict><key>a</key><string>3</string><key>b</key><string>4</string></dict>"
+      "<dict><key>a</key><string>5</string></dict>"
+      "<dict/>"
+      "<dict><key>a</key><dict><key>a</key><string>6</string></dict></dict></array>");
+  EXPECT_EQ(list, Value(Array{Dictionary{{"a", "1"}, {"b", "2"}},
+                              Dictionary{{"a", "3"}, {"b", "4"}}, Dictionary{{"a", "5"}},
+                              Dictionary(), Dictionary{{"a", Dictionary{{"a", "6"}}}}}));
+  Dictionary first = list.array()[0].dictionary();
+  first.set("c", "7");
+  first.remove("a");
+  EXPECT_EQ(list.array()[1], Value(Dictionary{{"a", "3"}, {"b", "4"}}));
+}
+
 TEST_F(PropertyListCodingTest, EveryKindSurvivesBothForms) {
   expectRoundTrips(Dictionary{
       {"text", "Cell DCH"},
