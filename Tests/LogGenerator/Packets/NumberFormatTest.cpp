@@ -117,6 +117,36 @@ TEST(NumberFormatTest, AgreesWithTheCLibrary) {
   }
 }
 
+TEST(NumberFormatTest, AgreesWithTheCLibraryAroundHalvesAndAtTheEndOfTheQuickWay) {
+  char expected[64];
+  const auto check = [&](double number) {
+    std::snprintf(expected, sizeof(expected), "%+.2f", number);
+    ASSERT_EQ(print("%+.2f", number), expected);
+    std::snprintf(expected, sizeof(expected), "%.0f", number);
+    ASSERT_EQ(print("%.0f", number), expected);
+    std::snprintf(expected, sizeof(expected), "%.6f", number);
+    ASSERT_EQ(print("%.6f", number), expected);
+    std::snprintf(expected, sizeof(expected), "%.7f", number);
+    ASSERT_EQ(print("%.7f", number), expected);
+  };
+  constexpr double kInfinity = std::numeric_limits<double>::infinity();
+  for (int raw = -3000; raw <= 3000; ++raw) {
+    const double half = (raw + 0.5) / 100;
+    for (const double number :
+         {half, std::nextafter(half, kInfinity), std::nextafter(half, -kInfinity), half + 1e-9,
+          half - 1e-9, half + 9e-9, half - 1.1e-8, raw / 1e6 + 5e-7}) {
+      check(number);
+    }
+  }
+  for (const double limit : {1073741824.0, 10737418.24, 1073.741824}) {
+    for (const double number : {limit, limit - 0.005, limit - 0.015, limit + 0.005, limit - 0.4995,
+                                std::nextafter(limit, 0), 4 * limit, 1e15 * limit}) {
+      check(number);
+      check(-number);
+    }
+  }
+}
+
 TEST(TextBufferTest, AppendsAndBeginsAnew) {
   TextBuffer text;
   text.append("a");
