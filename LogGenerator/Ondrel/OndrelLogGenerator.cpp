@@ -39,7 +39,9 @@ ByteView exportedPart(ByteView collected) noexcept {
 }
 
 void OndrelLogGenerator::handOverCollected(Dictionary& state) {
+  const std::size_t size = _binData.size();
   state.set(kStateDisplayState, Value::data(std::exchange(_binData, {})));
+  _binData.reserve(size);  // the next refresh brings about as much
 }
 
 std::optional<Bytes> OndrelLogGenerator::versionReport() {
