@@ -129,7 +129,7 @@ C2KParser* C2KLogGenerator::parserOf(LogCode code) const noexcept {
 
 void C2KLogGenerator::updateStateWithData(Dictionary& state, ByteView data) {
   getDisplayFromState(state);
-  updateFromLogUsingLookupUsingState(data, state[kStateLookup].dictionary(), state);
+  updateFromLogUsingLookupUsingState(data, _lookupKey.in(state).dictionary(), state);
 }
 
 void C2KLogGenerator::updateFromLogUsingLookupUsingState(ByteView message, const Dictionary& lookup,
@@ -174,7 +174,7 @@ Value C2KLogGenerator::generateLogUsingState(Dictionary& state) {
 }
 
 Value C2KLogGenerator::getDisplayFromState(Dictionary& state) {
-  Value known = state[kStateDisplay];
+  const Value& known = _displayKey.in(state);
   if (!known.isNull()) return known;
   const Value displayTemplate = templateOfState(state);
   if (displayTemplate.isNull()) {

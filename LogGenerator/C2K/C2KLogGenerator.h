@@ -9,6 +9,7 @@
 #include <vector>
 
 #include "LogGenerator/C2K/C2KParser.h"
+#include "LogGenerator/C2K/C2KState.h"
 #include "LogGenerator/C2K/TemplatePlaces.h"
 #include "LogGenerator/Ondrel/OndrelLogGenerator.h"
 
@@ -55,7 +56,9 @@ class C2KLogGenerator : public OndrelLogGenerator {
   [[nodiscard]] const TemplatePlaces& places() const;
 
   std::vector<std::unique_ptr<C2KParser>> _parsers;  ///< in the order of the start command
-  mutable std::optional<TemplatePlaces> _places;     ///< read from the resource when first needed
+  StateKey _displayKey{kStateDisplay};
+  StateKey _lookupKey{kStateLookup};
+  mutable std::optional<TemplatePlaces> _places;  ///< read from the resource when first needed
 };
 
 }  // namespace kestro

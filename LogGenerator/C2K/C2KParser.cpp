@@ -19,16 +19,21 @@ bool C2KParser::isLongEnough(PacketView packet, SystemLog& log) const {
   return false;
 }
 
-StoredFields::StoredFields(std::span<const Field> fields) : _fields(fields) {
-  for (const BoundField& field : _fields.fields()) _names.emplace_back(field.field().key);
+StoredFields::StoredFields(std::span<const Field> fields) {
+  for (const Field& field : fields) {
+    if (field.text.kind == TextRule::Kind::Hidden) continue;
+    _fields.push_back({BoundField(field), LookupName(field.key)});
+  }
 }
 
 void StoredFields::store(PacketView packet, const RecordPosition& position,
                          const LookupTable& lookup) {
-  const std::span<const BoundField> fields = _fields.fields();
-  for (std::size_t i = 0; i < fields.size(); ++i) {
-    const Value value = fields[i].value(packet, position);
-    if (!value.isNull()) lookup.store(_names[i], value);
+  for (auto& [field, name] : _fields) {
+    Value other;
+    Value* shown = lookup.onlyValue(name);
+    const bool isElsewhere = shown == nullptr;
+    if (isElsewhere) shown = &other;
+    if (field.write(*shown, packet, position, nullptr) && isElsewhere) lookup.store(name, other);
   }
 }
 

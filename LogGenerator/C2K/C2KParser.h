@@ -71,8 +71,12 @@ class StoredFields {
   void store(PacketView packet, const RecordPosition& position, const LookupTable& lookup);
 
  private:
-  BoundFields _fields;
-  std::vector<LookupName> _names;
+  struct StoredField {
+    BoundField field;
+    LookupName name;
+  };
+
+  std::vector<StoredField> _fields;
 };
 
 }  // namespace kestro

@@ -3,8 +3,6 @@
 
 #include <cmath>
 
-#include "LogGenerator/C2K/PilotList.h"
-
 namespace kestro {
 namespace {
 
@@ -53,10 +51,7 @@ constinit const PacketReading kEVDOFingersReading = {
 // --- EVDOPilots ----------------------------------------------------------------------------------
 
 EVDOPilots::EVDOPilots(const PacketReading& pilotsReading)
-    : C2KParser(pilotsReading),
-      _pnOffset(table().fields[0]),
-      _energy(table().fields[1]),
-      _name(pilotsReading.lists[0].key) {}
+    : C2KParser(pilotsReading), _energy(table().fields[1]), _name(pilotsReading.lists[0].key) {}
 
 std::size_t EVDOPilots::recordsIn(PacketView packet) const { return recordCount(table(), packet); }
 
@@ -70,13 +65,15 @@ void EVDOPilots::parse(PacketView packet, C2KOutput& output) {
     reportLength(packet, output.log);
     return;
   }
-  PilotList pilots;
-  pilots.reserve(recordsIn(packet));
   forEachRecord(table(), packet, [&](std::size_t index, const RecordPosition& position) {
-    pilots.add(index, readBits(_pnOffset.field().places[0], packet, position),
-               _energy.value(packet, position));
+    _pilots.add(index, readBits(table().fields[0].places[0], packet, position),
+                _energy.value(packet, position));
   });
-  output.lookup.store(_name, pilots.empty() ? Value(kNoPilots) : Value(pilots.take()));
+  if (_pilots.empty()) {
+    output.lookup.store(_name, kNoPilots);
+  } else {
+    _pilots.store(_name, output.lookup);
+  }
 }
 
 void EVDOPilots::explain(PacketView packet, const ExplainVisitor& visit) const {

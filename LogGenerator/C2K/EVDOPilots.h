@@ -4,6 +4,7 @@
 #pragma once
 
 #include "LogGenerator/C2K/C2KParser.h"
+#include "LogGenerator/C2K/PilotList.h"
 
 namespace kestro {
 
@@ -29,9 +30,9 @@ class EVDOPilots : public C2KParser {
  private:
   [[nodiscard]] const RecordTable& table() const { return reading().lists[0].table; }
 
-  BoundField _pnOffset;
   BoundField _energy;
   LookupName _name;
+  PilotList _pilots;  ///< empty between packets
 };
 
 class EVDOActiveSet : public EVDOPilots {

@@ -1,17 +1,22 @@
 // SPDX-License-Identifier: MIT
 #include "LogGenerator/C2K/EVDOThroughput.h"
 
+#include <algorithm>
 #include <array>
 #include <string>
-
-#include "LogGenerator/C2K/C2KState.h"
-#include "LogGenerator/LogGenerator.h"
 
 namespace kestro {
 namespace {
 
-// --- 0x1192: forward link, at least 241 bytes: 56 counters in a row ------------------------------
+constexpr bool lieWithin(std::span<const SentCounter> counters, std::size_t size) {
+  return std::ranges::all_of(counters, [size](const SentCounter& counter) {
+    return counter.offset + sizeof(std::uint32_t) <= size;
+  });
+}
 
+// --- 0x1192: forward link: 56 counters in a row --------------------------------------------------
+
+constexpr std::size_t kForwardSize = 241;
 constexpr std::uint16_t kForwardBits[] = {
     128,  256,  512, 1024, 0,    128,  256,  512,  1024, 0,    128,  256,  512,  1024,
     0,    128,  256, 512,  1024, 0,    128,  256,  512,  1024, 0,    512,  1024, 2048,
@@ -27,10 +32,11 @@ constexpr auto forwardCounters() {
   return counters;
 }
 constexpr auto kForwardCounters = forwardCounters();
-static_assert(kForwardCounters.size() == 56);
+static_assert(kForwardCounters.size() == 56 && lieWithin(kForwardCounters, kForwardSize));
 
-// --- 0x127E: reverse link, at least 1750 bytes: three blocks of counters for twelve rates --------
+// --- 0x127E: reverse link: three blocks of counters for twelve rates -----------------------------
 
+constexpr std::size_t kReverseSize = 1750;
 constexpr std::uint16_t kReverseBits[] = {128,  256,  512,  768,  1024, 1536,
                                           2048, 3072, 4096, 6144, 8192, 12288};
 constexpr std::uint16_t kReverseOffsets[] = {18, 22, 26, 30, 306, 310, 314, 318};
@@ -54,6 +60,7 @@ constexpr auto reverseCounters() {
   return counters;
 }
 constexpr auto kReverseCounters = reverseCounters();
+static_assert(lieWithin(kReverseCounters, kReverseSize));
 
 /// A rate depends on two packets.
 constexpr std::string_view kSinceLastPacket = "(since the packet before)";
@@ -61,7 +68,9 @@ constexpr std::string_view kSinceLastPacket = "(since the packet before)";
 }  // namespace
 
 constinit const ThroughputLayout kForwardThroughput = {
-    .reading = {.code = 0x1192, .packetName = "EV-DO forward throughput", .minimumLength = 241},
+    .reading = {.code = 0x1192,
+                .packetName = "EV-DO forward throughput",
+                .minimumLength = kForwardSize},
     .sequenceNumber = u32(13),
     .counters = kForwardCounters,
     .rateName = "kFLDataRate",
@@ -69,7 +78,9 @@ constinit const ThroughputLayout kForwardThroughput = {
     .sentStateKey = kStateFLDataSent};
 
 constinit const ThroughputLayout kReverseThroughput = {
-    .reading = {.code = 0x127E, .packetName = "EV-DO reverse throughput", .minimumLength = 1750},
+    .reading = {.code = 0x127E,
+                .packetName = "EV-DO reverse throughput",
+                .minimumLength = kReverseSize},
     .sequenceNumber = u32(14),
     .counters = kReverseCounters,
     .rateName = "kRLDataRate",
@@ -91,25 +102,25 @@ EVDOThroughput::EVDOThroughput(const ThroughputLayout& layout)
 std::vector<std::string_view> EVDOThroughput::lookupNames() const { return {_layout.rateName}; }
 
 std::int64_t EVDOThroughput::sentIn(PacketView packet) const noexcept {
+  if (!isLongEnough(packet)) return 0;
   std::int64_t sent = 0;
   for (const SentCounter& counter : _layout.counters) {
-    sent += std::int64_t{packet.u32(counter.offset)} * counter.bits;
+    // All of them lie in a packet that is long enough: a view of just four bytes need not look.
+    const PacketView count(packet.bytes().subspan(counter.offset, sizeof(std::uint32_t)));
+    sent += std::int64_t{count.u32(0)} * counter.bits;
   }
   return sent;
 }
 
-EVDOThroughput::Sample EVDOThroughput::keptIn(const Dictionary& state) const {
-  const Value* sequence = state.find(_sequence.kept);
-  const Value* sent = state.find(_sent.kept);
-  return {sequence == nullptr ? Value() : *sequence, sent == nullptr ? Value() : *sent};
+EVDOThroughput::Sample EVDOThroughput::keptIn(const Dictionary& state) {
+  return {_sequence.kept.in(state), _sent.kept.in(state)};
 }
 
-void EVDOThroughput::keep(const Sample& sample, Dictionary& state) const {
-  state.set(_sequence.kept, sample.sequence);
-  state.set(_sent.kept, sample.sent);
-  Dictionary extraInfo = state[kStateExtraInfo].dictionary();
-  extraInfo.set(_sequence.newest, sample.sequence);
-  extraInfo.set(_sent.newest, sample.sent);
+void EVDOThroughput::keep(const Sample& sample, Dictionary& state, Dictionary& extraInfo) {
+  _sequence.kept.set(state, sample.sequence);
+  _sent.kept.set(state, sample.sent);
+  _sequence.newest.set(extraInfo, sample.sequence);
+  _sent.newest.set(extraInfo, sample.sent);
 }
 
 void EVDOThroughput::parse(PacketView packet, C2KOutput& output) {
@@ -117,15 +128,15 @@ void EVDOThroughput::parse(PacketView packet, C2KOutput& output) {
   const Sample previous = keptIn(output.state);
   const Sample current{Value::integer(readNumber(_layout.sequenceNumber, packet, {})),
                        Value::integer(sentIn(packet))};
+  Dictionary extraInfo = _extraInfo.in(output.state).dictionary();
   if (previous.sequence.isInteger() && previous.sent.isInteger()) {
     storeRate(previous, current, output.lookup);
-    Dictionary extraInfo = output.state[kStateExtraInfo].dictionary();
-    extraInfo.set(_sequence.previous, previous.sequence);
-    extraInfo.set(_sent.previous, previous.sent);
+    _sequence.previous.set(extraInfo, previous.sequence);
+    _sent.previous.set(extraInfo, previous.sent);
   } else {
     output.lookup.store(_rate, "");
   }
-  keep(current, output.state);
+  keep(current, output.state, extraInfo);
 }
 
 void EVDOThroughput::storeRate(const Sample& previous, const Sample& current,

@@ -8,6 +8,8 @@
 #include <string_view>
 
 #include "LogGenerator/C2K/C2KParser.h"
+#include "LogGenerator/C2K/C2KState.h"
+#include "LogGenerator/LogGenerator.h"
 
 namespace kestro {
 
@@ -43,7 +45,7 @@ class EVDOThroughput : public C2KParser {
   void explain(PacketView packet, const ExplainVisitor& visit) const override;
   [[nodiscard]] std::vector<std::string_view> lookupNames() const override;
 
-  /// What the packet's counters add up to, in bits.
+  /// What the packet's counters add up to, in bits; 0 for a packet that is too short.
   [[nodiscard]] std::int64_t sentIn(PacketView packet) const noexcept;
 
  private:
@@ -52,23 +54,24 @@ class EVDOThroughput : public C2KParser {
   struct Keys {
     explicit Keys(std::string_view stateKey);
 
-    Value kept;
-    Value newest;
-    Value previous;
+    StateKey kept;
+    StateKey newest;
+    StateKey previous;
   };
   struct Sample {
     Value sequence;
     Value sent;
   };
 
-  [[nodiscard]] Sample keptIn(const Dictionary& state) const;
-  void keep(const Sample& sample, Dictionary& state) const;
+  [[nodiscard]] Sample keptIn(const Dictionary& state);
+  void keep(const Sample& sample, Dictionary& state, Dictionary& extraInfo);
   void storeRate(const Sample& previous, const Sample& current, const LookupTable& lookup);
 
   const ThroughputLayout& _layout;
   LookupName _rate;
   Keys _sequence;
   Keys _sent;
+  StateKey _extraInfo{kStateExtraInfo};
 };
 
 }  // namespace kestro

@@ -7,18 +7,6 @@ namespace {
 constexpr std::string_view kTargetKey = "key";
 constexpr std::string_view kTargetDictionary = "dict";
 
-/// A target's two parts. Targets made here have them in this order; others are searched.
-const Value& keyOf(const Dictionary& target) {
-  static const Value name(kTargetKey);
-  const bool isFirst = target.size() > 0 && target.keyAt(0) == name;
-  return isFirst ? target.valueAt(0) : target[kTargetKey];
-}
-Dictionary displayOf(const Dictionary& target) {
-  static const Value name(kTargetDictionary);
-  const bool isSecond = target.size() > 1 && target.keyAt(1) == name;
-  return (isSecond ? target.valueAt(1) : target[kTargetDictionary]).dictionary();
-}
-
 }  // namespace
 
 void LookupTable::addTarget(const Value& name, const Value& key, const Dictionary& display) {
@@ -29,26 +17,29 @@ void LookupTable::addTarget(const Value& name, const Value& key, const Dictionar
 }
 
 void LookupTable::store(LookupName& name, const Value& value) const {
-  for (const Value& element : targetsOf(name)) {
-    const Dictionary target = element.dictionary();
-    Dictionary display = displayOf(target);
-    const Value& key = keyOf(target);
-    if (display.isNull() || !key.isText()) return;
-    name.displayHint = display.set(key, value, name.displayHint);
+  for (auto& target : targetsOf(name)) {
+    target.hint = target.display.set(target.key, value, target.hint);
   }
 }
 
-Array LookupTable::targetsOf(LookupName& name) const {
-  const std::size_t size = _table.size();
-  if (name.tableHint < size && _table.keyAt(name.tableHint) == name.text) {
-    return _table.valueAt(name.tableHint).array();
+Value* LookupTable::onlyValue(LookupName& name) const {
+  const auto targets = targetsOf(name);
+  if (targets.size() != 1) return nullptr;
+  auto& [display, key, hint] = targets[0];
+  const std::span<Value> values = display.valuesToRewrite();
+  return hint < values.size() && display.keyAt(hint) == key ? &values[hint] : nullptr;
+}
+
+void LookupTable::findTargets(LookupName& name) const {
+  name._table = _table;
+  name._targets.clear();
+  for (const Value& element : _table[name._text.text()].array()) {
+    const Dictionary target = element.dictionary();
+    const Dictionary display = target[kTargetDictionary].dictionary();
+    const Value& key = target[kTargetKey];
+    if (display.isNull() || !key.isText()) break;
+    name._targets.push_back({display, key});
   }
-  for (std::size_t i = 0; i < size; ++i) {
-    if (!(_table.keyAt(i) == name.text)) continue;
-    name.tableHint = i;
-    return _table.valueAt(i).array();
-  }
-  return Array::null();
 }
 
 }  // namespace kestro

@@ -3,24 +3,36 @@
 #pragma once
 
 #include <cstddef>
+#include <span>
 #include <string_view>
+#include <vector>
 
 #include "Platform/PropertyList.h"
 
 namespace kestro {
 
-/// A lookup name, and where its entry stood when it was last used.
-struct LookupName {
-  explicit LookupName(std::string_view name) : text(name) {}
+/// A lookup name, and its targets in the table through which it was last stored.
+class LookupName {
+ public:
+  explicit LookupName(std::string_view name) : _text(name) {}
 
-  Value text;
-  std::size_t tableHint = 0;
-  std::size_t displayHint = 0;
+ private:
+  friend class LookupTable;
+  struct Target {
+    Dictionary display;
+    Value key;
+    std::size_t hint = 0;  ///< where the key stood when it was last written
+  };
+
+  Value _text;
+  Dictionary _table = Dictionary::null();
+  std::vector<Target> _targets{};
 };
 
 /// Lookup names to the places of a display that show them. The table itself is a dictionary that
 /// others own, in the generator state: each name has an array of targets, dictionaries of a display
-/// dictionary ("dict") and a key in it ("key").
+/// dictionary ("dict") and a key in it ("key"). The table is complete before values are stored: a
+/// name looks its targets up once in each table.
 class LookupTable {
  public:
   /// A null handle is a table without names.
@@ -33,8 +45,16 @@ class LookupTable {
   /// display dictionary or no text as its key. A name that the table lacks is passed over.
   void store(LookupName& name, const Value& value) const;
 
+  /// What the only target of the name shows, to be written over. A null pointer when the name has
+  /// several targets or none, or was not stored before. Valid until the next change.
+  [[nodiscard]] Value* onlyValue(LookupName& name) const;
+
  private:
-  [[nodiscard]] Array targetsOf(LookupName& name) const;
+  [[nodiscard]] std::span<LookupName::Target> targetsOf(LookupName& name) const {
+    if (!name._table.isSame(_table)) findTargets(name);
+    return name._targets;
+  }
+  void findTargets(LookupName& name) const;
 
   Dictionary _table;
 };

@@ -3,7 +3,6 @@
 
 #include <cmath>
 
-#include "LogGenerator/C2K/PilotList.h"
 #include "LogGenerator/Packets/NumberFormat.h"
 
 namespace kestro {
@@ -48,6 +47,13 @@ OneXActiveSet::OneXActiveSet(PacketView packet, std::size_t start)
   _variableSize = kEnergyOffsetPerValue * values;
   const std::size_t size = kFixedPilotSize + kSizePerValue * values;
   _stride = (size + kPilotAlignment - 1) / kPilotAlignment * kPilotAlignment;
+  _referencePN = readBits(kReferencePN, packet, _position);
+  const double length = readBits(kAccumulationLength, packet, _position);
+  const double factor = readBits(kFactor, packet, _position);
+  const int exponent = static_cast<int>(readBits(kExponent, packet, _position));
+  _factor = std::ldexp(1, 2 * exponent - 3);
+  _divisor = 9 * length * length * factor;
+  _noise = 1 / length;
 }
 
 RecordPosition OneXActiveSet::pilotAt(std::size_t index) const noexcept {
@@ -63,29 +69,21 @@ std::uint32_t OneXActiveSet::pnOffset(std::size_t index) const noexcept {
 }
 
 double OneXActiveSet::energy(std::size_t index) const noexcept {
-  const double length = readBits(kAccumulationLength, _packet, _position);
-  const double factor = readBits(kFactor, _packet, _position);
-  const int exponent = static_cast<int>(readBits(kExponent, _packet, _position));
   const double sum = readBits(kOneXPilotEnergy, _packet, pilotEnergyAt(index));
   // Without a length or a factor this is infinite, or no number.
-  const double energy =
-      std::ldexp(1, 2 * exponent - 3) * sum / (9 * length * length * factor) - 1 / length;
+  const double energy = _factor * sum / _divisor - _noise;
   return energy >= kWeakestEnergy ? energy : kWeakestEnergy;
 }
 
 Value OneXActiveSet::energyText(std::size_t index) const {
-  const bool isReference = pnOffset(index) == readBits(kReferencePN, _packet, _position);
   TextBuffer text;
-  if (isReference) text.append("(ref pilot) ");
+  if (pnOffset(index) == _referencePN) text.append("(ref pilot) ");
   text.append("%+.2f dB", 10 * std::log10(energy(index)));
   return text.text();
 }
 
-Dictionary OneXActiveSet::list() const {
-  PilotList pilots;
-  pilots.reserve(_pilotCount);
-  for (std::size_t i = 0; i < _pilotCount; ++i) pilots.add(i, pnOffset(i), energyText(i));
-  return pilots.take();
+void OneXActiveSet::addTo(PilotList& list) const {
+  for (std::size_t i = 0; i < _pilotCount; ++i) list.add(i, pnOffset(i), energyText(i));
 }
 
 void OneXActiveSet::explain(std::string_view section, std::string_view list,

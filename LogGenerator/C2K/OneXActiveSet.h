@@ -6,6 +6,7 @@
 #include <cstdint>
 #include <span>
 
+#include "LogGenerator/C2K/PilotList.h"
 #include "LogGenerator/Packets/Explain.h"
 #include "LogGenerator/Packets/Field.h"
 #include "LogGenerator/Packets/Walk.h"
@@ -37,8 +38,8 @@ class OneXActiveSet {
   /// The pilot's energy, marked when it is the reference pilot's.
   [[nodiscard]] Value energyText(std::size_t index) const;
 
-  /// The list as the display shows it.
-  [[nodiscard]] Dictionary list() const;
+  /// Adds every pilot to the list.
+  void addTo(PilotList& list) const;
 
   /// Visits the fields that all pilots share, then PN offset and energy of each as a row of `list`.
   void explain(std::string_view section, std::string_view list, const ExplainVisitor& visit) const;
@@ -53,6 +54,11 @@ class OneXActiveSet {
   std::size_t _pilotCount;
   std::size_t _variableSize;  ///< of a pilot's record
   std::size_t _stride;
+  std::uint32_t _referencePN;
+  // What all energies are computed from.
+  double _factor;
+  double _divisor;
+  double _noise;
 };
 
 }  // namespace kestro

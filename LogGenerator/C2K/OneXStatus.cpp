@@ -82,7 +82,8 @@ void OneXStatus::parse(PacketView packet, C2KOutput& output) {
     return;
   }
   _fields.store(packet, found.position(), output.lookup);
-  output.lookup.store(_activeSet, OneXActiveSet(packet, *found.activeSet).list());
+  OneXActiveSet(packet, *found.activeSet).addTo(_pilots);
+  _pilots.store(_activeSet, output.lookup);
   if (!holds(kInTraffic, packet, found.position())) storeOldErrorRate(output);
 }
 

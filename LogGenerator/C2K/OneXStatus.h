@@ -7,6 +7,7 @@
 #include <span>
 
 #include "LogGenerator/C2K/C2KParser.h"
+#include "LogGenerator/C2K/PilotList.h"
 #include "LogGenerator/C2K/SubPackets.h"
 
 namespace kestro {
@@ -50,6 +51,7 @@ class OneXStatus : public C2KParser {
   StoredFields _fields;
   LookupName _activeSet;
   LookupName _errorRate;
+  PilotList _pilots;  ///< empty between packets
 };
 
 }  // namespace kestro

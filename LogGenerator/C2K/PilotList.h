@@ -6,8 +6,7 @@
 #include <cstdint>
 #include <vector>
 
-#include "LogGenerator/Packets/Field.h"
-#include "LogGenerator/Packets/Section.h"
+#include "LogGenerator/C2K/LookupTable.h"
 #include "Platform/PropertyList.h"
 
 namespace kestro {
@@ -16,17 +15,19 @@ namespace kestro {
 /// offset ("3;168") to its energy, sorted by these keys.
 class PilotList {
  public:
-  PilotList();
+  PilotList() { clear(); }
 
-  void reserve(std::size_t count);
   /// Each number may be used once.
   void add(std::size_t number, std::uint32_t pnOffset, Value energy);
 
   [[nodiscard]] bool empty() const noexcept { return _keys.size() == 1; }
-  /// The dictionary; the list is empty afterwards.
-  [[nodiscard]] Dictionary take();
+  /// Shows the list at every place of the name; it is empty afterwards. An earlier list that
+  /// nothing else refers to is written anew in its place.
+  void store(LookupName& name, const LookupTable& lookup);
 
  private:
+  void clear();
+
   std::vector<Value> _keys;
   std::vector<Value> _values;
 };

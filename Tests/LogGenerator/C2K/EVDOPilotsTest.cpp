@@ -60,6 +60,41 @@ TEST_F(EVDOActiveSetTest, ReplacesTheSet) {
   EXPECT_THAT(pilots("kActiveSetPilots"), SizeIs(2));
 }
 
+TEST_F(EVDOActiveSetTest, LeavesAListThatSomebodyHasAsItWas) {
+  receive(threePilots());
+  const Dictionary held = display()["kActiveSetPilots"].dictionary();
+  generator->generateLogUsingState(state);
+  receive(packet(0x12B6).u8(15, 1).u16(25, 7).u16(27, 5120).length(37));
+  EXPECT_EQ(Value(held), Value(Dictionary{{"_sorted", "_sorted"},
+                                          {"0;168", "+0.00 dB"},
+                                          {"1;12", "+10.00 dB"},
+                                          {"2;168", "-3.01 dB"}}));
+  const Value kept = state["History"].array()[0].dictionary()["Display"];
+  EXPECT_EQ(kept.dictionary()["kActiveSetPilots"], Value(held));
+  EXPECT_THAT(pilots("kActiveSetPilots"),
+              ElementsAre(Pair("_sorted", "_sorted"), Pair("0;7", "+10.00 dB")));
+}
+
+TEST_F(EVDOActiveSetTest, WritingAListAnewLeavesTheHistoryAsItWas) {
+  receive(threePilots());
+  generator->generateLogUsingState(state);
+  receive(packet(0x12B6).u8(15, 1).u16(25, 7).u16(27, 5120).length(37));
+  const Value kept = state["History"].array()[0].dictionary()["Display"];
+  EXPECT_EQ(kept.dictionary()["kActiveSetPilots"], Value(Dictionary{{"_sorted", "_sorted"},
+                                                                    {"0;168", "+0.00 dB"},
+                                                                    {"1;12", "+10.00 dB"},
+                                                                    {"2;168", "-3.01 dB"}}));
+}
+
+TEST_F(EVDOActiveSetTest, ShowsTheListAtEveryPlaceOfItsName) {
+  setTemplate(Dictionary{{"A", "kActiveSetPilots"}, {"B", "kActiveSetPilots"}});
+  receive(threePilots());
+  receive(packet(0x12B6).u8(15, 1).u16(25, 7).u16(27, 5120).length(37));
+  const Value expected = Dictionary{{"_sorted", "_sorted"}, {"0;7", "+10.00 dB"}};
+  EXPECT_EQ(display()["A"], expected);
+  EXPECT_EQ(display()["B"], expected);
+}
+
 TEST_F(EVDOActiveSetTest, NeedsTwentyFiveBytes) {
   receive(threePilots().length(24));
   EXPECT_THAT(takeLines(), ElementsAre(errorLine("Log code 0x12b6 is 24 bytes long but must be at "

@@ -72,16 +72,44 @@ TEST_F(LookupTableTest, StopsAtATargetWhoseKeyIsNoText) {
   EXPECT_THAT(second, IsEmpty());
 }
 
-TEST_F(LookupTableTest, RemembersWhereNamesStoodButNotMore) {
+TEST_F(LookupTableTest, ANameHasItsOwnTargetsInEveryTable) {
   LookupName name("name");
   table.store(name, "1");
-  contents.remove("name");
-  table.addTarget("before", "B", first);
-  table.addTarget("name", "A", first);
-  table.store(name, "2");
-  EXPECT_EQ(first["A"], Value("2"));
-  EXPECT_EQ(second["A"], Value("1"));
-  EXPECT_TRUE(first["B"].isNull());
+  Dictionary third;
+  LookupTable other{Dictionary()};
+  other.addTarget("before", "B", third);
+  other.addTarget("name", "A", third);
+  other.store(name, "2");
+  EXPECT_EQ(Value(third), Value(Dictionary{{"A", "2"}}));
+  EXPECT_EQ(first["A"], Value("1"));
+  table.store(name, "3");
+  EXPECT_EQ(first["A"], Value("3"));
+  EXPECT_EQ(second["A"], Value("3"));
+  EXPECT_EQ(third["A"], Value("2"));
+}
+
+TEST_F(LookupTableTest, TheValueOfAnOnlyTargetMayBeWrittenOver) {
+  first.set("A", "");
+  table.addTarget("single", "B", first);
+  LookupName single("single");
+  EXPECT_EQ(table.onlyValue(single), nullptr);
+  table.store(single, "1");
+  ASSERT_NE(table.onlyValue(single), nullptr);
+  *table.onlyValue(single) = "2";
+  EXPECT_EQ(Value(first), Value(Dictionary{{"A", ""}, {"B", "2"}}));
+  first.remove("A");
+  EXPECT_EQ(table.onlyValue(single), nullptr);
+  table.store(single, "3");
+  EXPECT_EQ(*table.onlyValue(single), Value("3"));
+}
+
+TEST_F(LookupTableTest, OtherNamesHaveNoOnlyValue) {
+  LookupName name("name");
+  table.store(name, "1");
+  EXPECT_EQ(table.onlyValue(name), nullptr);
+  LookupName other("other");
+  table.store(other, "1");
+  EXPECT_EQ(table.onlyValue(other), nullptr);
 }
 
 TEST_F(LookupTableTest, ANullTableHasNoNames) {
