@@ -14,96 +14,104 @@ ALL_QUEUES = 64 * MEBIBYTE
 CROWDED_QUEUE = MEBIBYTE // 4
 KEPT_FOR_CLIENT = MEBIBYTE // 16
 SLACK = 4 * MEBIBYTE
+# The interval and the filling of messages that fill such a queue in 3 s.
+FULL_IN_3_SECONDS = (0.01, 16_000)
 # What a session lets a program open, unless it asks for more.
 USUAL_LIMIT = 1024
 
 
+def read_for(steady, seconds):
+    """Goes on reading what is recorded, so that the recorder need not wait."""
+    end = time.monotonic() + seconds
+    while time.monotonic() < end:
+        steady.read()
+        pause(0.02)
+
+
+def kill(_server, _steady, client):
+    client.kill()
+
+
+def stop_and_kill(_server, steady, client):
+    client.stop()
+    read_for(steady, 1)
+    client.kill()
+
+
+def stop_shortly(_server, steady, client):
+    client.stop()
+    read_for(steady, 0.3)
+    client.go_on()
+    count = client.recording.count
+    wait_until(lambda: steady.read() and client.read().count > count, "the stream goes on")
+    require(len(client.recording.stretches) == 1, "who stops for a moment misses nothing")
+
+
+def stop_long(server, steady, client):
+    """Until its channel is closed; the most memory that the server used for it."""
+    held, memory = server.descriptors(), []
+    client.stop()
+
+    def is_left_behind():
+        steady.read()
+        memory.append(server.memory())
+        return server.descriptors() < held
+
+    wait_until(is_left_behind, "who does not read is left behind")
+    client.go_on()
+    life = client.read().stretches[0][0]
+    wait_until(
+        lambda: steady.read() and client.read().stretches_of(life) == 2,
+        "who was left behind connects again",
+    )
+    return max(memory)
+
+
+KINDS = [kill, stop_shortly, stop_and_kill, stop_long] + [kill, stop_shortly] * 2 + [kill] * 2
+
+
+def lose_client(world, server, steady, number):
+    """One client comes and fails; how long it took to connect, and the server's memory."""
+    held = server.descriptors()
+    client = world.record(f"client-{number}", pipe=True)
+    waited = wait_until(lambda: steady.read() and client.has(1), "a client connects")
+    memory = KINDS[number % len(KINDS)](server, steady, client) or server.memory()
+    world.forget(client)
+    wait_until(
+        lambda: steady.read() and server.descriptors() <= held, "the server forgets who has gone"
+    )
+    require(len(steady.recording.stretches) == 1, "nobody else misses anything")
+    return waited, memory
+
+
 def clients_killed(options):
     """clients are killed, or stopped until they lose their channel"""
-    interval, padding = 0.01, 16_000  # 1.6 MB/s fill a queue in 3 s
-
-    def read(clients):
-        return [client.read() for client in clients]
-
-    def pass_time(clients, seconds):
-        """Goes on reading what they record, meanwhile."""
-        end = time.monotonic() + seconds
-        while time.monotonic() < end:
-            read(clients)
-            pause(0.02)
-
-    def kill(server, steady, client):
-        client.kill()
-
-    def stop_shortly(server, steady, client):
-        client.stop()
-        pass_time([steady], 0.3)
-        client.go_on()
-        count = client.recording.count
-        wait_until(lambda: steady.read() and client.read().count > count, "the stream goes on")
-        require(len(client.recording.stretches) == 1, "who stops for a moment misses nothing")
-
-    def stop_long(server, steady, client):
-        held = server.descriptors()
-        client.stop()
-        memory = []
-
-        def is_left_behind():
-            steady.read()
-            memory.append(server.memory())
-            return server.descriptors() < held
-
-        wait_until(is_left_behind, "who does not read is left behind")
-        client.go_on()
-        life = client.read().stretches[0][0]
-        wait_until(
-            lambda: steady.read() and client.read().stretches_of(life) == 2,
-            "who was left behind connects again",
-        )
-        return max(memory)
-
-    def stop_and_kill(server, steady, client):
-        client.stop()
-        pass_time([steady], 1)
-        client.kill()
-
-    kinds = [kill, stop_shortly, stop_and_kill, stop_long] + [kill, stop_shortly] * 2 + [kill] * 2
 
     def lane(rounds):
         with World(options.programs) as world:
-            server = world.start_fed_server(interval, padding)
+            server = world.start_fed_server(*FULL_IN_3_SECONDS)
             steady = world.record("steady", pipe=True)
             wait_until(lambda: steady.has(1), "a client connects")
-            use, most, connecting = Use(), 0, []
+            use, outcomes = Use(), []
             for number in range(rounds):
                 use.look(server, steady)
-                held = server.descriptors()
-                client = world.record(f"client-{number}", pipe=True)
-                connecting.append(
-                    wait_until(lambda: steady.read() and client.has(1), "a client connects")
-                )
-                memory = kinds[number % len(kinds)](server, steady, client)
-                most = max(most, memory or server.memory())
-                world.forget(client)
-                wait_until(
-                    lambda: steady.read() and server.descriptors() <= held,
-                    "the server forgets who has gone",
-                )
-                require(len(steady.recording.stretches) == 1, "nobody else misses anything")
-            pass_time([steady], 0.5)
+                outcomes.append(lose_client(world, server, steady, number))
+            read_for(steady, 0.5)
             use.look(server, steady)
             use.check(SLACK)
-            require(
-                most <= use.first["server"][0] + 2 * LONGEST_QUEUE + SLACK,
-                "no more waits for a client than its queue holds",
-            )
-            return rounds, steady.read().count, connecting, most, use
+            return outcomes, steady.read().count, use
 
     results = in_lanes(max(1, options.lanes // 3), options.rounds, lane)
-    times, counts, waits, memories, uses = zip(*results)
+    outcomes, counts, uses = zip(*results)
+    waits, memories = zip(*sum(outcomes, []))
+    first = max(use.first["server"][0] for use in uses)
+    require(
+        max(memories) <= first + 2 * LONGEST_QUEUE + SLACK,
+        "no more waits for a client than its queue holds",
+    )
     return (
-        f"{sum(times)} times; {sum(counts)} messages recorded by the others without a gap; "
-        f"connected after {spread(sum(waits, []))}; server and client {uses[0]}, "
+        f"{len(waits)} times; {sum(counts)} messages recorded by the others without a gap; "
+        f"connected after {spread(waits)}; server and client {uses[0]}, "
         f"the server at most {max(memories) / MEBIBYTE:.1f} MiB"
     )
 
@@ -112,7 +120,7 @@ def clients_stopped(options):
     """many clients stop reading at the same time"""
     count = max(24, options.crowd // 5)
     with World(options.programs) as world:
-        server = world.start_fed_server(0.01, 16_000)
+        server = world.start_fed_server(*FULL_IN_3_SECONDS)
         steady = world.record("steady")
         wait_until(lambda: steady.has(1), "a client connects")
         memory, held = [server.memory()], server.descriptors()
