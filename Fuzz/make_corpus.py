@@ -66,7 +66,7 @@ def make_comparison(technology, kinds):
     write(f"DifferentialFuzz_{technology}", "cut",
           b"".join(WHOLE_MESSAGE + framed(message[:-1]) for message in kinds[:12]))
     codes, lengths = LENGTHS[technology]
-    for count in (0, 1):  # of records, wherever it stands
+    for count in (0, 1, 2):  # of records, wherever it stands
         payload = bytes(count if i < 16 else 37 * i % 251 for i in range(2000))
         write(f"DifferentialFuzz_{technology}", f"lengths-{count}",
               b"".join(bytes([code]) + framed(payload[:length])
@@ -85,19 +85,24 @@ def make_identities():
     write("DifferentialFuzz_Ondrel_GSM", "identities", b"".join(steps))
 
 
+def random_payload(numbers, length):
+    """Counts stand in front, and small ones leave room for what they count."""
+    return bytes(numbers.randrange(5) if i < 16 and numbers.random() < 0.8
+                 else numbers.randrange(256) for i in range(length))
+
+
 def make_random(technology):
     codes = LENGTHS[technology][0]
     for number in range(3):
         numbers = random.Random(number)
         steps = []
         for code in range(codes):
-            for length in RANDOM_LENGTHS[technology]:
+            for step, length in enumerate(RANDOM_LENGTHS[technology]):
+                payload = random_payload(numbers, length)
                 if code in COUNTERS.get(technology, ()):
-                    length = 1740
-                # Counts stand in front, and small ones leave room for what they count.
-                steps.append(bytes([code]) + framed(
-                    bytes(numbers.randrange(5) if i < 16 and numbers.random() < 0.8
-                          else numbers.randrange(256) for i in range(length))))
+                    # As short as may be, behind a sequence number that grows.
+                    payload = bytes([0, step, 0, 0, 0]) + random_payload(numbers, 1732)
+                steps.append(bytes([code]) + framed(payload))
         write(f"DifferentialFuzz_{technology}", f"random-{number}", b"".join(steps))
 
 
