@@ -14,7 +14,7 @@ struct Column {
   int width;
 };
 
-/// The column in the middle of a window of this width.
+/// The column in the middle of a window of this width, in device-independent pixels.
 [[nodiscard]] constexpr Column columnIn(int width) noexcept {
   const int columnWidth = std::min(width, kMaximumColumnWidth);
   return {(width - columnWidth) / 2, columnWidth};

@@ -64,15 +64,25 @@ class KestroApp : public QApplication, private PaneHost {
   /// Connects, or connects anew, in a later turn of the main queue.
   void restartMonitor();
 
+  /// Has the shell show the signal strength as a number until the exit, unless this program's own
+  /// preference is set: then it is left alone.
   void getRSSIPref();
+  /// Looks whether the device has what makes saving worth offering.
   void getSaveButtonPref();
+  /// Writes the shell's preference, and tells that it has changed.
   // NOLINTNEXTLINE(readability-identifier-naming)
   void _setGSMRSSI(bool shown);
 
+  /// Shows the save screen with a copy of the history; does nothing while it is shown.
   void showSaveView() override;
+  /// Takes the save screen away, if it is shown.
   void closeSaveView();
+  /// Shows "Connecting..." in the pane's toolbar, or the update message while connected.
   void updateStatusForViewController(KestroPaneController& pane);
+  /// Shows the model's present tree in all panes. The first one whose path is gone is popped, with
+  /// all above it.
   void updateViewControllerFromModel();
+  /// Brings the status of a pane up to date before it comes on top.
   void navigationControllerWillShowViewController(ViewController& pane, bool animated);
 
   /// Saves the history without asking; for who ends the process. False when it could not be saved.
@@ -85,11 +95,13 @@ class KestroApp : public QApplication, private PaneHost {
   }
   /// The message that a failed write left on the screen, until it is closed.
   [[nodiscard]] AlertView* alert() const noexcept { return _alert; }
+  /// What the toolbar says while connected: "Connecting..." until the first refresh.
   [[nodiscard]] const QString& updateMessage() const noexcept { return _updateMessage; }
   void setUpdateMessage(const QString& message) { _updateMessage = message; }
   [[nodiscard]] bool allowSaveButton() const override { return _allowSaveButton; }
   void setAllowSaveButton(bool allow) noexcept { _allowSaveButton = allow; }
 
+  /// Ends the process where a handler throws.
   bool notify(QObject* receiver, QEvent* event) noexcept override;
 
  private:

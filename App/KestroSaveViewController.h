@@ -37,8 +37,9 @@ class KestroSaveViewController : public QWidget {
   void savePressed();
   /// Closes without writing.
   void cancelPressed();
-  /// Enter in the text field: hides the keyboard.
+  /// Enter in the text field: hides the keyboard. Always true.
   bool textFieldShouldReturn();
+  /// A touch beside the controls: hides the keyboard.
   void backgroundTouched();
 
   [[nodiscard]] QLineEdit& saveDescription() const;

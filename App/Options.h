@@ -14,7 +14,7 @@ struct Options {
   std::string demoSource;  ///< empty: no demo
   std::optional<QSize> windowSize;
   bool plain = false;
-  int logPriority = 0;
+  int logPriority = 0;     ///< the number of a LogPriority
   std::string screenshot;  ///< the file of a picture to take before ending; empty: none
   double after = 0;        ///< seconds until then
 

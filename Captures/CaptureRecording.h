@@ -19,6 +19,8 @@ namespace kestro {
 /// are replaced.
 class CaptureRecording {
  public:
+  /// Creates the first file. The error says why that is not possible; a technology that has no link
+  /// type is refused.
   [[nodiscard]] static Result<CaptureRecording> create(const std::string& path,
                                                        std::string_view technology);
 

@@ -13,7 +13,7 @@
 
 namespace kestro {
 
-/// Nothing of it touches the running system, except that texts of the console and of the library's
+/// Nothing of it touches the running system, except that texts of the console and of the decoders'
 /// standard output go to the process's standard error. Time stands still until the clock is set.
 class OfflinePlatform : public Platform {
  public:

@@ -16,9 +16,9 @@
 
 namespace kestro {
 
-/// Connects as the model does and writes every message to a capture, undecoded; so it also records
-/// technologies that nothing here decodes. When the technology changes, the recording goes on in
-/// the next file. Main thread only.
+/// Connects as the model does and writes every message to a capture, undecoded. When the technology
+/// changes, the recording goes on in the next file; one without a link type ends it. Main thread
+/// only.
 class RecordSession {
  public:
   /// A remark for the person who records: that it connects, records, or leaves a message out.

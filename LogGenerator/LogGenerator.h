@@ -40,7 +40,7 @@ class LogGenerator {
   LogGenerator(const LogGenerator&) = delete;
   LogGenerator& operator=(const LogGenerator&) = delete;
 
-  /// Applies one incoming message to the state.
+  /// Applies one message to the state. Throws for a message that ends the application.
   virtual void updateStateWithData(Dictionary& state, ByteView data) = 0;
 
   /// Returns the display object, or null when there is none yet, after recording a history entry.

@@ -13,13 +13,13 @@
 
 namespace kestro {
 
-/// Outcome of a send or a request; the numbers are part of the port protocol's documentation.
+/// Outcome of a send or a request; Documentation/message-ports.md has the same numbers.
 enum class SendError : int {
-  None = 0,
-  SendTimeout = -1,
-  ReceiveTimeout = -2,
-  InvalidPort = -3,
-  Transport = -4,
+  None = 0,             ///< handed to the system; for a request: the reply is there
+  SendTimeout = -1,     ///< the system did not take all of it in time
+  ReceiveTimeout = -2,  ///< no reply came in time
+  InvalidPort = -3,     ///< the connection was closed before
+  Transport = -4,       ///< the connection broke meanwhile, or the message is too long
 };
 
 /// The largest body of a message; longer ones are refused by the sender (SendError::Transport) and

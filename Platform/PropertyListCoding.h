@@ -38,7 +38,7 @@ class PropertyListCoding {
   /// Parses XML or binary, told apart by the bytes. The order of dictionary entries is the order in
   /// the list; of entries with one key the last counts. The error says what is wrong and, where
   /// known, at which byte. Binary dates are read to 10 µs. Texts that are not UTF-8 or hold a NUL
-  /// are refused.
+  /// are refused, and so are XML dictionaries of more than 9,999 keys.
   [[nodiscard]] virtual Result<Value> parse(
       ByteView bytes, const PropertyListLimits& limits = PropertyListLimits::message()) const = 0;
 

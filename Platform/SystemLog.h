@@ -22,7 +22,7 @@ class SystemLog {
   SystemLog(const SystemLog&) = delete;
   SystemLog& operator=(const SystemLog&) = delete;
 
-  /// The gravest priority number that is still written; everything above it is dropped unformatted.
+  /// The least grave priority that is still written; greater numbers are dropped unformatted.
   [[nodiscard]] LogPriority threshold() const noexcept { return _threshold; }
   void setThreshold(LogPriority threshold) noexcept { _threshold = threshold; }
 

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-// A place for whole lines of text: the console log, or the library's own standard output.
+// A place for whole lines of text: the console log, or the decoders' standard output.
 #pragma once
 
 #include <string_view>

@@ -32,6 +32,7 @@ struct OptionsText {
   int exitStatus = 0;
 };
 
+/// Reads the command line; prints nothing.
 [[nodiscard]] std::variant<ServerOptions, OptionsText> parseServerOptions(
     int argumentCount, const char* const* arguments);
 

@@ -21,8 +21,8 @@ struct LinuxPlatformOptions {
   std::string telephonyServerName = "TelephonyServer";
   /// Where ports live; without a value the environment decides ($KESTRO_PORT_DIR and so on).
   std::optional<std::string> portDirectory;
-  /// Whether the library's own standard output goes to the process's standard error, so that what
-  /// a program prints for other programs stays clean.
+  /// Whether the decoders' lines for standard output go to the process's standard error, so that
+  /// what a program prints for other programs stays clean.
   bool standardOutputToStandardError = true;
 };
 

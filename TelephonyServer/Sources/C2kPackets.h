@@ -33,7 +33,7 @@ struct OneXReport {
   C2kChannel channel;           ///< of both receivers
   double receivePower[2] = {};  ///< dBm; what lies outside -106.0 to -20.8 is reported as these
   double transmitPower = 0;     ///< dBm
-  /// The pilots and how strong each is against everything received, -20 to -1 dB. The first one
+  /// The pilots with the Ec/Io of each (against everything received), -20 to -1 dB. The first one
   /// is the reference.
   std::span<const C2kPilot> activeSet;
 };
@@ -66,7 +66,7 @@ struct EvdoReport {
 };
 [[nodiscard]] std::optional<Bytes> evdoStatus(const EvdoReport& report, Moment time);
 
-/// The energies against everything received.
+/// The energies are Ec/Io: against everything received.
 [[nodiscard]] std::optional<Bytes> evdoActiveSet(std::span<const C2kPilot> pilots, Moment time);
 
 /// The pilots that the receiver's fingers follow, with the carrier against the interference. A

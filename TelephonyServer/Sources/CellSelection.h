@@ -37,7 +37,7 @@ class CellSelection {
   std::chrono::milliseconds _stronger{0};
 };
 
-/// The cells that a phone in soft handover is connected to: at most three, those that are not much
+/// The active set of a phone in soft handover: at most three cells, those that are not much
 /// weaker than the strongest. Cells join sooner than they leave.
 class SoftHandoverSet {
  public:

@@ -15,10 +15,10 @@
 
 namespace kestro {
 
-/// What a cell broadcasts about itself. Uplink and downlink share one frequency and take turns.
+/// What a cell broadcasts about itself. In TDD, uplink and downlink share its frequency.
 struct UtranCell {
   unsigned uarfcn = 0;
-  unsigned parameterId = 0;  ///< 0 to 127; it stands for the scrambling code
+  unsigned parameterId = 0;  ///< the cell parameter ID, 0 to 127, for the scrambling code
   std::uint32_t cellIdentity = 0;
   unsigned locationArea = 0;
   unsigned registrationArea = 0;  ///< URA
