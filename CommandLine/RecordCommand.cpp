@@ -48,6 +48,7 @@ class RecordTask : public LiveTask {
   }
 
   void stop() override {
+    _session.stop();
     if (const auto summary = _session.summary()) return _finish(kExitDone, "recorded " + *summary);
     _finish(kExitNothingDone, "nothing was recorded: no telephony server could be connected to");
   }

@@ -50,6 +50,8 @@ void RecordSession::start() {
   checkConnection();
 }
 
+void RecordSession::stop() { _isOver = true; }
+
 std::optional<std::string> RecordSession::summary() const {
   if (!_recording) return std::nullopt;
   return fmt::format("{} messages, {} bytes, {} dropped, in {}", _recording->messageCount(),
@@ -57,7 +59,7 @@ std::optional<std::string> RecordSession::summary() const {
 }
 
 std::unique_ptr<LogGenerator> RecordSession::recordTechnology(std::string_view technology) {
-  if (_hasFailed) return nullptr;
+  if (_isOver) return nullptr;
   if (const auto opened = openFile(technology); !opened) {
     fail(opened.error().message);
     return nullptr;
@@ -75,7 +77,7 @@ Result<void> RecordSession::openFile(std::string_view technology) {
 }
 
 void RecordSession::recordMessage(ByteView message) {
-  if (_hasFailed) return;
+  if (_isOver) return;
   const std::uint64_t leftOutBefore = _recording->leftOutCount();
   if (const auto written = _recording->write(_platform.clock().now(), message); !written) {
     return fail(written.error().message);
@@ -95,7 +97,7 @@ void RecordSession::checkConnection() {
 }
 
 void RecordSession::fail(const std::string& reason) {
-  if (std::exchange(_hasFailed, true)) return;
+  if (std::exchange(_isOver, true)) return;
   _failed(reason);
 }
 

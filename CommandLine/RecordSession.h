@@ -30,6 +30,9 @@ class RecordSession {
                 std::function<void(const std::string& reason)> failed);
 
   void start();
+  /// Records nothing from now on: what still comes while the program ends is in neither the file nor
+  /// the summary.
+  void stop();
 
   /// "123 messages, 4567 bytes, 0 dropped, in drive.pcap"; absent when no file was begun.
   [[nodiscard]] std::optional<std::string> summary() const;
@@ -50,7 +53,7 @@ class RecordSession {
   std::function<void(const std::string& reason)> _failed;
   std::optional<CaptureRecording> _recording;
   std::uint64_t _byteCount = 0;
-  bool _hasFailed = false;
+  bool _isOver = false;  ///< stopped or failed: nothing is recorded any more
   bool _wasConnected = true;
   std::shared_ptr<RecordSession*> _self;  ///< what generators find this by, while it lives
   std::shared_ptr<KestroModel> _model;

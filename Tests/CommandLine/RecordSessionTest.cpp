@@ -139,6 +139,17 @@ TEST_F(RecordSessionTest, GoesOnAfterALostConnection) {
                                    "recording IFX to " + file.path()));
 }
 
+TEST_F(RecordSessionTest, WhatComesAfterItsEndIsInNeitherTheFileNorTheSummary) {
+  start(file.path());
+  send(testing::bytesOf("a"));
+  session->stop();
+  send(testing::bytesOf("b"));
+  changeTechnology("LTE");
+  EXPECT_THAT(messagesIn(file.path()), ElementsAre("IFX: 0, a"));
+  EXPECT_EQ(session->summary(), "1 messages, 1 bytes, 0 dropped, in " + file.path());
+  EXPECT_FALSE(std::filesystem::exists(file.directory() + "/drive-2.pcap"));
+}
+
 TEST_F(RecordSessionTest, MessagesThatAreTooLongAreDroppedAndCounted) {
   start(file.path());
   send(Bytes(262'144, 'x'));

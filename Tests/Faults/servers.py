@@ -69,7 +69,8 @@ def server_killed(options):
         for recorder in clients[:2]:
             count = recorder.read().count
             require(recorder.recording.unread_bytes == 0, "a recording ends with a whole message")
-            require(f"recorded {count} messages" in recorder.errors(), "the count is true")
+            said = recorder.errors()
+            require(f"recorded {count} messages" in said, f"the count is true ({count}: {said})")
         return sum(recorder.recording.count for recorder in clients[:2])
 
     results = in_lanes(options.lanes, options.rounds, lane)
