@@ -42,12 +42,12 @@ constinit const std::span<const Field> kOneXActiveSetFields = kFields;
 OneXActiveSet::OneXActiveSet(PacketView packet, std::size_t start)
     : _packet(packet),
       _position{.here = start},
-      _pilotCount(readBits(kPilotCount, packet, _position)) {
+      _pilotCount(readBits(kPilotCount, packet, _position)),
+      _referencePN(readBits(kReferencePN, packet, _position)) {
   const std::size_t values = readBits(kPerPilotCount, packet, _position);
   _variableSize = kEnergyOffsetPerValue * values;
   const std::size_t size = kFixedPilotSize + kSizePerValue * values;
   _stride = (size + kPilotAlignment - 1) / kPilotAlignment * kPilotAlignment;
-  _referencePN = readBits(kReferencePN, packet, _position);
   const double length = readBits(kAccumulationLength, packet, _position);
   const double factor = readBits(kFactor, packet, _position);
   const int exponent = static_cast<int>(readBits(kExponent, packet, _position));
