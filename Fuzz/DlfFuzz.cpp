@@ -16,8 +16,8 @@ namespace {
 /// History entries with whatever the input holds as the packets between two refreshes.
 Array historyOf(Input& input) {
   Array history;
-  const unsigned count = input.byte() % (kMaximumHistoryEntries + 1);
-  for (unsigned i = 0; i < count; ++i) {
+  const std::size_t count = input.byte() % (kMaximumHistoryEntries + 1);
+  for (std::size_t i = 0; i < count; ++i) {
     const ByteView collected = input.bytes(input.number16());
     history.append(
         Dictionary{{kStateDisplayState, Value::data({collected.begin(), collected.end()})}});
