@@ -30,8 +30,8 @@ class RecordSession {
                 std::function<void(const std::string& reason)> failed);
 
   void start();
-  /// Records nothing from now on: what still comes while the program ends is in neither the file nor
-  /// the summary.
+  /// Records nothing from now on: what still comes while the program ends is in neither the file
+  /// nor the summary.
   void stop();
 
   /// "123 messages, 4567 bytes, 0 dropped, in drive.pcap"; absent when no file was begun.
