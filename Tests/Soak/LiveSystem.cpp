@@ -32,7 +32,7 @@ std::size_t countNodes(const KestroModelNode& node) {
 
 }  // namespace
 
-LiveSystem::LiveSystem(std::string_view technology, double speed)
+LiveSystem::LiveSystem(std::string_view technology, double speed, std::size_t premadeCount)
     : _technology(technology), _speed(speed) {
   const auto bundle = createBundle();
   for (const std::string& path : bundle->resourcesOfType("plist")) {
@@ -44,6 +44,9 @@ LiveSystem::LiveSystem(std::string_view technology, double speed)
   _model = KestroModel::create(
       _platform, [this] { redraw(); },
       [this](Platform&, std::string_view name) { return makeGenerator(name); });
+  if (premadeCount != 0) {
+    _premade = std::make_shared<PremadeMessages>(*openSimulation(), premadeCount);
+  }
 }
 
 std::unique_ptr<LogGenerator> LiveSystem::makeGenerator(std::string_view technology) {
@@ -76,17 +79,23 @@ LogChannelReply LiveSystem::requestChannel(std::string_view localPort) {
 
 void LiveSystem::start() { _model->startMonitor(); }
 
+std::unique_ptr<LogSource> LiveSystem::openSimulation() {
+  auto source = openSource({.kind = "simulation", .argument = {}, .technology = _technology},
+                           _platform, [](std::string_view) {});
+  require(source.has_value(), "the simulation opens");
+  return std::move(*source);
+}
+
 void LiveSystem::startServer() {
   const SourceReporter ignore = [](std::string_view) {};
-  auto source = openSource({.kind = "simulation", .argument = {}, .technology = _technology},
-                           _platform, ignore);
-  require(source.has_value(), "the simulation opens");
+  std::unique_ptr<LogSource> source =
+      _premade ? std::make_unique<PremadeSource>(_premade) : openSimulation();
   auto server = Server::open(_platform, kServerName, _technology, [] {});
   require(server.has_value(), "a server can take the name of one that is gone");
   _server = std::move(*server);
   _listener = std::make_unique<CountingListener>(*_server, _filter, _counts);
   _playback =
-      std::make_unique<Playback>(std::move(*source), PlaybackOptions{.speed = _speed, .loop = true},
+      std::make_unique<Playback>(std::move(source), PlaybackOptions{.speed = _speed, .loop = true},
                                  _platform.mainQueue(), _platform.clock(), *_listener, ignore);
   _playback->start();
 }

@@ -14,6 +14,7 @@
 #include "TelephonyServer/CodeFilter.h"
 #include "TelephonyServer/Playback.h"
 #include "TelephonyServer/Server.h"
+#include "Tests/Soak/PremadeSource.h"
 
 namespace kestro::soak {
 
@@ -56,8 +57,10 @@ struct BrokenPromise {
 
 class LiveSystem {
  public:
-  /// `technology` is a constant text; its simulation plays at `speed` times its pace.
-  LiveSystem(std::string_view technology, double speed);
+  /// `technology` is a constant text; its simulation plays at `speed` times its pace. Unless
+  /// `premadeCount` is 0, the drive's first so many messages are made now, and played round and
+  /// round.
+  LiveSystem(std::string_view technology, double speed, std::size_t premadeCount);
 
   /// Starts the model; the server is not there yet.
   void start();
@@ -80,6 +83,7 @@ class LiveSystem {
   [[nodiscard]] std::size_t historySize();
 
  private:
+  [[nodiscard]] std::unique_ptr<LogSource> openSimulation();
   void connectService();
   [[nodiscard]] std::unique_ptr<LogGenerator> makeGenerator(std::string_view technology);
   [[nodiscard]] LogChannelReply requestChannel(std::string_view localPort);
@@ -89,6 +93,7 @@ class LiveSystem {
   double _speed;
   std::unique_ptr<PropertyListCoding> _coding = createPropertyListCoding();
   QuietPlatform _platform{*_coding};
+  std::shared_ptr<const PremadeMessages> _premade;  ///< null: the simulation plays
   std::unique_ptr<Server> _server;
   std::unique_ptr<CountingListener> _listener;
   std::unique_ptr<Playback> _playback;

@@ -24,6 +24,7 @@ struct Options {
   std::uint64_t messages = 10'000'000;
   std::uint64_t faults = 0;
   double speed = 200;
+  std::size_t premade = 0;
 };
 
 constexpr std::size_t kMebibyte = std::size_t{1024} * 1024;
@@ -123,7 +124,7 @@ void checkUse(const Options& options, const Use& use) {
 }
 
 void run(const Options& options) {
-  LiveSystem system(technologyNamed(options.technology), options.speed);
+  LiveSystem system(technologyNamed(options.technology), options.speed, options.premade);
   system.start();
   system.startServer();
   const auto start = std::chrono::steady_clock::now();
@@ -155,6 +156,9 @@ int main(int argc, char** argv) {
                  "How many messages, after a short while to begin with");
   app.add_option("--faults", options.faults, "How often the server dies or stops on the way");
   app.add_option("--speed", options.speed, "Seconds of the drive in one second of the clock");
+  app.add_option("--premade", options.premade,
+                 "Make so many messages before the run, and play these round and round: the "
+                 "simulation's own time is not counted then");
   CLI11_PARSE(app, argc, argv);
   try {
     run(options);
