@@ -318,6 +318,12 @@ Array Value::array() const noexcept {
       detail::retained(static_cast<detail::ArrayObject*>(payload<detail::SharedObject*>())));
 }
 
+std::span<Value> Value::soleRow(const KeyList& keys) const noexcept {
+  if (!isOnlyReference() || _tag != kDictionary) return {};
+  auto* object = static_cast<detail::DictionaryObject*>(payload<detail::SharedObject*>());
+  return object->keys == keys._object ? std::span<Value>(object->values) : std::span<Value>();
+}
+
 Value Value::deepCopy() const {
   if (_tag == kDictionary) {
     Dictionary result = dictionary().copy();
@@ -530,10 +536,6 @@ void Dictionary::setValueAt(std::size_t index, Value value) noexcept {
 std::span<Value> Dictionary::valuesToRewrite() noexcept {
   if (_object == nullptr) return {};
   return _object->values;
-}
-
-void Dictionary::swapValues(std::vector<Value>& values) noexcept {
-  if (_object != nullptr) _object->values.swap(values);
 }
 
 void Dictionary::swapEntries(std::vector<Value>& keys, std::vector<Value>& values) {

@@ -145,6 +145,11 @@ class Value {
     return object->strong == 1 && object->weak == 0;
   }
 
+  /// The values of the dictionary that this value alone refers to, in the order of their keys and
+  /// to be written over, when its keys are the very list `keys`; otherwise none. Valid until a key
+  /// comes or goes.
+  [[nodiscard]] std::span<Value> soleRow(const KeyList& keys) const noexcept;
+
   /// A copy that shares no container with this value. Containers may be nested to any depth that
   /// the call stack bears; parsed ones are at most 128 levels deep.
   [[nodiscard]] Value deepCopy() const;
@@ -265,6 +270,7 @@ class KeyList {
 
  private:
   friend class Dictionary;
+  friend class Value;
   detail::KeyListObject* _object;
 };
 
@@ -340,8 +346,6 @@ class Dictionary {
   void setValueAt(std::size_t index, Value value) noexcept;
   /// The values in the order of their keys, to be written over. Valid until a key comes or goes.
   [[nodiscard]] std::span<Value> valuesToRewrite() noexcept;
-  /// Exchanges all values at once; there must be as many as keys.
-  void swapValues(std::vector<Value>& values) noexcept;
   /// Exchanges all entries at once; the keys must be distinct, and as many as the values. Keys that
   /// other dictionaries share stay theirs: `keys` is empty then.
   void swapEntries(std::vector<Value>& keys, std::vector<Value>& values);

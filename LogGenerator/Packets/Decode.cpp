@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "LogGenerator/Packets/Decode.h"
 
+#include <algorithm>
 #include <utility>
 
 namespace kestro {
@@ -121,22 +122,17 @@ bool BoundFields::rewrite(std::span<Value> values, PacketView packet,
 
 void BoundFields::makeRow(Value& row, PacketView packet, const RecordPosition& position,
                           const FieldSupplier* supplier) {
-  if (_allKeys != nullptr && row.isOnlyReference()) {
-    Dictionary earlier = row.dictionary();
-    if (earlier.hasKeyList(*_allKeys) &&
-        rewrite(earlier.valuesToRewrite(), packet, position, supplier)) {
-      return;
-    }
+  if (_allKeys != nullptr) {
+    const std::span<Value> earlier = row.soleRow(*_allKeys);
+    if (!earlier.empty() && rewrite(earlier, packet, position, supplier)) return;
   }
   const KeyList& keys = keysOf(readValues(packet, position, supplier));
-  if (row.isOnlyReference()) {
-    Dictionary earlier = row.dictionary();
-    if (earlier.hasKeyList(keys)) {
-      earlier.swapValues(_values);
-      return;
-    }
+  const std::span<Value> earlier = row.soleRow(keys);
+  if (earlier.empty()) {
+    row = Dictionary(keys, std::move(_values));
+  } else {
+    std::ranges::move(_values, earlier.begin());
   }
-  row = Dictionary(keys, std::move(_values));
 }
 
 const KeyList& BoundFields::keysOf(Presence present) {

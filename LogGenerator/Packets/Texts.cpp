@@ -55,11 +55,14 @@ struct KnownCache {
 
 /// "%d" or "%u" of the number's low 32 bits, without a detour through a buffer for longer texts.
 Value plainDecimal(const NumberFormat& format, std::int64_t number) {
-  const auto word = static_cast<std::uint32_t>(number);
-  const std::int64_t shown =
-      format.conversion == 'd' ? std::int64_t{static_cast<std::int32_t>(word)} : std::int64_t{word};
+  auto magnitude = static_cast<std::uint32_t>(number);
   char digits[16];
-  const auto end = std::to_chars(digits, digits + sizeof(digits), shown);
+  char* begin = digits;
+  if (format.conversion == 'd' && static_cast<std::int32_t>(magnitude) < 0) {
+    *begin++ = '-';
+    magnitude = 0U - magnitude;
+  }
+  const auto end = std::to_chars(begin, digits + sizeof(digits), magnitude);
   return std::string_view(digits, static_cast<std::size_t>(end.ptr - digits));
 }
 

@@ -339,14 +339,27 @@ TEST(DictionaryTest, RowsOfATableShareTheirKeysUntilOneChanges) {
   EXPECT_TRUE(first["RSRP"].isNull());
 }
 
-TEST(DictionaryTest, SwapsAllValuesAtOnce) {
+TEST(DictionaryTest, TheValuesOfARowAreForItsOnlyHolderToWriteOver) {
   const KeyList keys{"Cell", "RSRP"};
-  Dictionary row(keys, {"1", "-80"});
-  std::vector<Value> values = {"2", "-90"};
-  row.swapValues(values);
-  EXPECT_EQ(Value(row), Value(Dictionary{{"Cell", "2"}, {"RSRP", "-90"}}));
-  EXPECT_THAT(values, ElementsAre(Value("1"), Value("-80")));
-  EXPECT_TRUE(row.hasKeyList(keys));
+  Value row = Dictionary(keys, {"1", "-80"});
+  const std::span<Value> values = row.soleRow(keys);
+  ASSERT_EQ(values.size(), 2U);
+  values[1] = "-90";
+  EXPECT_EQ(row, Value(Dictionary{{"Cell", "1"}, {"RSRP", "-90"}}));
+  EXPECT_TRUE(row.soleRow(KeyList{"Cell", "RSRP"}).empty()) << "equal keys are another list";
+  {
+    const Value second = row;
+    EXPECT_TRUE(row.soleRow(keys).empty());
+  }
+  {
+    const WeakValue watcher(row);
+    EXPECT_TRUE(row.soleRow(keys).empty());
+  }
+  EXPECT_EQ(row.soleRow(keys).size(), 2U);
+  row.dictionary().set("RSRQ", "-9");
+  EXPECT_TRUE(row.soleRow(keys).empty());
+  EXPECT_TRUE(Value("text").soleRow(keys).empty());
+  EXPECT_TRUE(Value(Array()).soleRow(keys).empty());
 }
 
 TEST(DictionaryTest, RemovingFromARowLeavesTheOthersTheirKeys) {
