@@ -546,10 +546,6 @@ void Dictionary::swapEntries(std::vector<Value>& keys, std::vector<Value>& value
   _object->values.swap(values);
 }
 
-bool Dictionary::hasKeyList(const KeyList& keys) const noexcept {
-  return _object != nullptr && _object->keys == keys._object;
-}
-
 Dictionary Dictionary::copy() const {
   Dictionary result;
   if (_object == nullptr) return result;

@@ -349,8 +349,6 @@ class Dictionary {
   /// Exchanges all entries at once; the keys must be distinct, and as many as the values. Keys that
   /// other dictionaries share stay theirs: `keys` is empty then.
   void swapEntries(std::vector<Value>& keys, std::vector<Value>& values);
-  /// Whether this dictionary's keys are the very list `keys` (not merely equal ones).
-  [[nodiscard]] bool hasKeyList(const KeyList& keys) const noexcept;
 
   [[nodiscard]] Iterator begin() const { return {*this, 0}; }
   [[nodiscard]] Iterator end() const { return {*this, size()}; }
