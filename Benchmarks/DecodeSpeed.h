@@ -172,8 +172,19 @@ template <class Call>
   for (int round = 0; round < kCountedRounds; ++round) call();
 }
 
-/// Decodes the packets one after the other, round and round. Counts packets per second; "of_floor"
-/// is the time for one round over that of merely formatting its values.
+/// Calls `decode`, which decodes `packets` packets, again and again. Counts packets per second;
+/// "of_floor" is the time of one call over that of `format`, which formats the same packets'
+/// values.
+template <class Decode, class Format>
+void measure(benchmark::State& state, std::size_t packets, Decode&& decode, Format&& format) {
+  for (auto _ : state) decode();
+  state.SetItemsProcessed(state.iterations() * static_cast<std::int64_t>(packets));
+  state.counters["of_floor"] = leastNanoseconds(decode) / leastNanoseconds(format);
+  countedDecoding(decode);
+  countedFormatting(format);
+}
+
+/// Decodes the packets one after the other, round and round.
 template <class Generator>
 void decodePackets(benchmark::State& state, LiveDisplay<Generator>& display,
                    std::span<const BenchmarkPacket* const> packets) {
@@ -184,17 +195,10 @@ void decodePackets(benchmark::State& state, LiveDisplay<Generator>& display,
   const auto decode = [&] {
     for (const BenchmarkPacket* packet : packets) display.receive(packet->bytes);
   };
-  for (auto _ : state) decode();
-  state.SetItemsProcessed(state.iterations() * static_cast<std::int64_t>(packets.size()));
-  const bool showsNothing = std::ranges::all_of(
-      packets, [](const BenchmarkPacket* packet) { return packet->texts.empty(); });
-  if (showsNothing) return;
   const auto format = [&] {
     for (PlainFormatting& formatting : floors) benchmark::DoNotOptimize(formatting.format());
   };
-  state.counters["of_floor"] = leastNanoseconds(decode) / leastNanoseconds(format);
-  countedDecoding(decode);
-  countedFormatting(format);
+  measure(state, packets.size(), decode, format);
 }
 
 /// Whether every packet shows what it must, and the floor formats just that. Says what is wrong.

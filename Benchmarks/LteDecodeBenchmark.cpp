@@ -3,9 +3,11 @@
 // "of_floor" is the time over that of merely formatting the same values with formats that fmt has
 // compiled, into one buffer, in the same run. The system log takes errors only.
 #include <cstdlib>
-#include <random>
+#include <span>
+#include <vector>
 
 #include "Benchmarks/DecodeSpeed.h"
+#include "Benchmarks/MessageMix.h"
 #include "LogGenerator/Ondrel/LTE/LTEClassIndex.h"
 #include "LogGenerator/Ondrel/LTE/LTELogGenerator.h"
 #include "LogGenerator/Packets/Encode.h"
@@ -18,26 +20,8 @@ using Display = LiveDisplay<LTELogGenerator>;
 /// Raw values in the order in which the display shows them.
 using RawValues = std::vector<unsigned>;
 
-/// Formats a packet's values, row by row where it has records; returns the end.
-using Format = char* (*)(const RawValues& raw, char* end);
-
-struct Message {
-  Bytes bytes;
-  RawValues raw;
-  Format format;
-};
-
-/// Different values from packet to packet, the same in every run.
-class Draw {
- public:
-  unsigned upTo(unsigned highest) {
-    return std::uniform_int_distribution<unsigned>(0, highest)(_engine);
-  }
-  unsigned between(unsigned lowest, unsigned highest) { return lowest + upTo(highest - lowest); }
-
- private:
-  std::mt19937 _engine{20120304};
-};
+using Format = FormatOf<RawValues>;
+using Message = MessageOf<RawValues>;
 
 double steps(unsigned raw, double scale, double offset) { return raw * scale + offset; }
 int plus(unsigned raw, int addend, int multiplier = 1) {
@@ -69,7 +53,7 @@ char* formatServingCell(const RawValues& v, char* end) {
       plus(v[15], 0, 2), v[16] == 1 ? "True" : "False", v[17]);
 }
 
-Message servingCell(Draw& draw) {
+Message servingCell(Draw& draw, unsigned /*number*/) {
   RawValues raw = {4,
                    1300,
                    draw.upTo(503),
@@ -113,7 +97,7 @@ char* formatIntraFrequency(const RawValues& v, char* end) {
   return end;
 }
 
-Message intraFrequency(Draw& draw) {
+Message intraFrequency(Draw& draw, unsigned /*number*/) {
   const PacketReading& header = reading(kConnectedModeMeasurementSection);
   const RecordTable& measured = reading(kMeasuredNeighborCellsSection).lists[0].table;
   const RecordTable& detected = reading(kDetectedCellsSection).lists[0].table;
@@ -181,9 +165,9 @@ Message neighbors(Draw& draw, unsigned count,
   return finished(writer, std::move(raw), formatNeighbors);
 }
 
-Message fourNeighbors(Draw& draw) { return neighbors(draw, 4, drivenCell); }
-Message eightNeighbors(Draw& draw) { return neighbors(draw, 8, drivenCell); }
-Message anyNeighbors(Draw& draw) { return neighbors(draw, 8, anyCell); }
+Message fourNeighbors(Draw& draw, unsigned /*number*/) { return neighbors(draw, 4, drivenCell); }
+Message eightNeighbors(Draw& draw, unsigned /*number*/) { return neighbors(draw, 8, drivenCell); }
+Message anyNeighbors(Draw& draw, unsigned /*number*/) { return neighbors(draw, 8, anyCell); }
 
 // --- 0xB0C2, 0xB0C1 and 0xB186 -------------------------------------------------------------------
 
@@ -193,7 +177,7 @@ char* formatSystemInformation(const RawValues& v, char* end) {
                         static_cast<int>(v[5]), v[6], static_cast<int>(v[7]));
 }
 
-Message systemInformation(Draw& draw) {
+Message systemInformation(Draw& draw, unsigned /*number*/) {
   const unsigned blocks = draw.upTo(1) == 1 ? 50 : 100;
   RawValues raw = {
       draw.upTo(503),     1300, 19300, blocks, blocks, draw.upTo(0xFFFFFFF), draw.upTo(65535),
@@ -211,7 +195,7 @@ char* formatNumbers(const RawValues& v, char* end) {
   return end;
 }
 
-Message antennas(Draw& draw) {
+Message antennas(Draw& draw, unsigned /*number*/) {
   RawValues raw = {draw.between(1, 4)};
   const PacketReading& packet = *readingOf(kLTEServingCellInfoSection, kLteAntennasCode);
   PacketWriter writer(kLteAntennasCode, packet.minimumLength);
@@ -224,7 +208,7 @@ char* formatReselection(const RawValues& v, char* end) {
                         v[5]);
 }
 
-Message reselection(Draw& draw) {
+Message reselection(Draw& draw, unsigned /*number*/) {
   RawValues raw = {1, 1300, draw.upTo(503), draw.upTo(7), draw.upTo(65535), draw.upTo(503)};
   const PacketReading& header = reading(kReselectionCandidatesSection);
   const RecordTable& candidates = reading(kReselectionCandidatesListSection).lists[0].table;
@@ -241,14 +225,7 @@ Message reselection(Draw& draw) {
 
 // --- Measuring -----------------------------------------------------------------------------------
 
-/// One kind of packet, and its share of a drive in percent.
-struct Kind {
-  const char* name;
-  Message (*message)(Draw& draw);
-  int share;
-};
-
-constexpr Kind kKinds[] = {
+constexpr KindOf<RawValues> kKinds[] = {
     {"0xB17F", servingCell, 35},
     {"0xB179 (4 + 2 cells)", intraFrequency, 30},
     {"0xB180 (4 records)", fourNeighbors, 30},
@@ -259,87 +236,13 @@ constexpr Kind kKinds[] = {
     {"0xB186 (1 candidate)", reselection, 0},
 };
 
-constexpr int kMessagesOfAKind = 200;
-
-std::vector<Message> messagesOf(const Kind& kind) {
-  Draw draw;
-  std::vector<Message> messages;
-  for (int i = 0; i < kMessagesOfAKind; ++i) messages.push_back(kind.message(draw));
-  return messages;
-}
-
-/// Messages by the kinds' shares, in an order in which kinds take turns.
-std::vector<Message> drive() {
-  Draw draw;
-  std::vector<Message> messages;
-  int sent[std::size(kKinds)] = {};
-  for (int i = 1; i <= 2 * kMessagesOfAKind; ++i) {
-    std::size_t next = 0;
-    const auto owed = [&](std::size_t kind) { return kKinds[kind].share * i - 100 * sent[kind]; };
-    for (std::size_t kind = 1; kind < std::size(kKinds); ++kind) {
-      if (owed(kind) > owed(next)) next = kind;
-    }
-    ++sent[next];
-    messages.push_back(kKinds[next].message(draw));
-  }
-  return messages;
-}
-
-/// Whether every message alone shows what the floor formats.
-bool areShownRight(Display& display, std::span<const Message> messages, const char* name) {
-  std::string expected(4096, '\0');
-  for (const Message& message : messages) {
-    display.startAfresh();
-    display.receive(message.bytes);
-    std::string shown;
-    for (const std::string& text : display.texts()) shown += text;
-    const char* end = message.format(message.raw, expected.data());
-    const std::string_view wanted(expected.data(), static_cast<std::size_t>(end - expected.data()));
-    if (shown == wanted) continue;
-    fmt::print(stderr, "{} shows\n  {}\nnot\n  {}\n", name, shown, wanted);
-    return false;
-  }
-  return true;
-}
-
-/// Decodes the messages round and round.
-void decodeMessages(benchmark::State& state, Display& display, std::span<const Message> messages) {
-  display.startAfresh();
-  const auto decode = [&] {
-    for (const Message& message : messages) display.receive(message.bytes);
-  };
-  for (auto _ : state) decode();
-  state.SetItemsProcessed(state.iterations() * static_cast<std::int64_t>(messages.size()));
-  char buffer[4096];
-  const auto format = [&] {
-    for (const Message& message : messages) {
-      benchmark::DoNotOptimize(message.format(message.raw, buffer));
-    }
-  };
-  state.counters["of_floor"] = leastNanoseconds(decode) / leastNanoseconds(format);
-  countedDecoding(decode);
-  countedFormatting(format);
-}
-
-bool registerChecked(Display& display, const char* name, std::vector<Message> messages) {
-  if (!areShownRight(display, messages, name)) return false;
-  benchmark::RegisterBenchmark(name,
-                               [&display, messages = std::move(messages)](benchmark::State& state) {
-                                 decodeMessages(state, display, messages);
-                               });
-  return true;
-}
-
 }  // namespace
 }  // namespace kestro::benchmarks
 
 int main(int argc, char** argv) {
   using namespace kestro::benchmarks;  // NOLINT(google-build-using-namespace)
   Display display("LTE");
-  for (const Kind& kind : kKinds) {
-    if (!registerChecked(display, kind.name, messagesOf(kind))) return EXIT_FAILURE;
-  }
-  if (!registerChecked(display, "mixed drive", drive())) return EXIT_FAILURE;
+  if (!registerKinds(display, kKinds)) return EXIT_FAILURE;
   benchmark::Initialize(&argc, argv);
   benchmark::RunSpecifiedBenchmarks();
   return EXIT_SUCCESS;

@@ -6,9 +6,9 @@
 #include <benchmark/benchmark.h>
 #include <fmt/format.h>
 
+#include <cstddef>
 #include <cstdint>
 #include <random>
-#include <span>
 #include <string>
 #include <string_view>
 #include <utility>
@@ -26,14 +26,19 @@ struct ShownValues {
 };
 
 /// Formats a message's values in the order in which its display shows them; returns the end.
-using Format = char* (*)(const ShownValues& values, char* end);
+template <class Values>
+using FormatOf = char* (*)(const Values& values, char* end);
 
-struct Message {
+template <class Values>
+struct MessageOf {
   Bytes bytes;
-  ShownValues values;
-  Format format;
+  Values values;
+  FormatOf<Values> format;
   Bytes primer{};  ///< what must have come before, if anything
 };
+
+using Format = FormatOf<ShownValues>;
+using Message = MessageOf<ShownValues>;
 
 /// Different values from message to message, the same in every run.
 class Draw {
@@ -48,31 +53,36 @@ class Draw {
 };
 
 /// One kind of message, and its share of a drive in per cent. Messages are numbered from 1.
-struct Kind {
+template <class Values>
+struct KindOf {
   const char* name;
-  Message (*message)(Draw& draw, unsigned number);
+  MessageOf<Values> (*message)(Draw& draw, unsigned number);
   int share;
 };
+
+using Kind = KindOf<ShownValues>;
 
 inline constexpr unsigned kMessagesOfAKind = 200;
 inline constexpr std::size_t kLongestText = 16384;
 
-[[nodiscard]] inline std::vector<Message> messagesOf(const Kind& kind) {
+template <class Values>
+[[nodiscard]] std::vector<MessageOf<Values>> messagesOf(const KindOf<Values>& kind) {
   Draw draw;
-  std::vector<Message> messages;
+  std::vector<MessageOf<Values>> messages;
   for (unsigned i = 1; i <= kMessagesOfAKind; ++i) messages.push_back(kind.message(draw, i));
   return messages;
 }
 
 /// Messages by the kinds' shares, in an order in which kinds take turns.
-[[nodiscard]] inline std::vector<Message> driveOf(std::span<const Kind> kinds) {
+template <class Values, std::size_t kCount>
+[[nodiscard]] std::vector<MessageOf<Values>> driveOf(const KindOf<Values> (&kinds)[kCount]) {
   Draw draw;
-  std::vector<Message> messages;
-  std::vector<int> sent(kinds.size(), 0);
+  std::vector<MessageOf<Values>> messages;
+  int sent[kCount] = {};
   for (int i = 1; i <= 2 * static_cast<int>(kMessagesOfAKind); ++i) {
     std::size_t next = 0;
     const auto owed = [&](std::size_t kind) { return kinds[kind].share * i - 100 * sent[kind]; };
-    for (std::size_t kind = 1; kind < kinds.size(); ++kind) {
+    for (std::size_t kind = 1; kind < kCount; ++kind) {
       if (owed(kind) > owed(next)) next = kind;
     }
     ++sent[next];
@@ -82,11 +92,11 @@ inline constexpr std::size_t kLongestText = 16384;
 }
 
 /// Whether every message, after its primer alone, shows what the floor formats.
-template <class Display>
-[[nodiscard]] bool areShownRight(Display& display, std::span<const Message> messages,
+template <class Display, class Values>
+[[nodiscard]] bool areShownRight(Display& display, const std::vector<MessageOf<Values>>& messages,
                                  const char* name) {
   std::string expected(kLongestText, '\0');
-  for (const Message& message : messages) {
+  for (const MessageOf<Values>& message : messages) {
     display.startAfresh();
     if (!message.primer.empty()) display.receive(message.primer);
     display.receive(message.bytes);
@@ -101,31 +111,27 @@ template <class Display>
   return true;
 }
 
-/// Decodes the messages round and round. Counts messages per second; "of_floor" is the time for one
-/// round over that of merely formatting its values.
-template <class Display>
-void decodeMessages(benchmark::State& state, Display& display, std::span<const Message> messages) {
+/// Decodes the messages round and round.
+template <class Display, class Values>
+void decodeMessages(benchmark::State& state, Display& display,
+                    const std::vector<MessageOf<Values>>& messages) {
   display.startAfresh();
   const auto decode = [&] {
-    for (const Message& message : messages) display.receive(message.bytes);
+    for (const MessageOf<Values>& message : messages) display.receive(message.bytes);
   };
-  for (auto _ : state) decode();
-  state.SetItemsProcessed(state.iterations() * static_cast<std::int64_t>(messages.size()));
   std::string buffer(kLongestText, '\0');
   const auto format = [&] {
-    for (const Message& message : messages) {
+    for (const MessageOf<Values>& message : messages) {
       benchmark::DoNotOptimize(message.format(message.values, buffer.data()));
     }
   };
-  state.counters["of_floor"] = leastNanoseconds(decode) / leastNanoseconds(format);
-  countedDecoding(decode);
-  countedFormatting(format);
+  measure(state, messages.size(), decode, format);
 }
 
 /// Registers a benchmark of these messages, once they have shown what they must.
-template <class Display>
+template <class Display, class Values>
 [[nodiscard]] bool registerChecked(Display& display, const char* name,
-                                   std::vector<Message> messages) {
+                                   std::vector<MessageOf<Values>> messages) {
   if (!areShownRight(display, messages, name)) return false;
   benchmark::RegisterBenchmark(name,
                                [&display, messages = std::move(messages)](benchmark::State& state) {
@@ -135,9 +141,9 @@ template <class Display>
 }
 
 /// Registers one benchmark for each kind, and one for a drive of all of them.
-template <class Display>
-[[nodiscard]] bool registerKinds(Display& display, std::span<const Kind> kinds) {
-  for (const Kind& kind : kinds) {
+template <class Display, class Values, std::size_t kCount>
+[[nodiscard]] bool registerKinds(Display& display, const KindOf<Values> (&kinds)[kCount]) {
+  for (const KindOf<Values>& kind : kinds) {
     if (!registerChecked(display, kind.name, messagesOf(kind))) return false;
   }
   return registerChecked(display, "mixed drive", driveOf(kinds));
