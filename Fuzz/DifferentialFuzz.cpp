@@ -6,12 +6,11 @@
 
 #include "Fuzz/GeneratorChannel.h"
 #include "Fuzz/PlainReader/PlainReader.h"
+#include "Fuzz/Technology.h"
 #include "Platform/PropertyListDescription.h"
 
 namespace kestro::fuzz {
 namespace {
-
-constexpr std::string_view kTechnology = KESTRO_FUZZ_TECHNOLOGY;
 
 /// What the first byte of a step asks for; every other value is a packet of one of the codes.
 constexpr unsigned kRefresh = 0xFF;

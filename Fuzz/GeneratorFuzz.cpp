@@ -2,6 +2,7 @@
 // Messages, refreshes, saves and reconnections of one technology, in any order, with and without
 // its template.
 #include "Fuzz/GeneratorChannel.h"
+#include "Fuzz/Technology.h"
 
 namespace kestro::fuzz {
 namespace {
@@ -30,7 +31,7 @@ void takeStep(Input& input, GeneratorChannel& channel) {
 
 void tryInput(ByteView bytes) {
   Input input(bytes);
-  GeneratorChannel channel(KESTRO_FUZZ_TECHNOLOGY);
+  GeneratorChannel channel(kTechnology);
   const unsigned beginning = input.byte();
   if ((beginning & 1) == 0) channel.addTemplates();
   channel.start();

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 // Any property list as a technology's template, then messages into what became of it.
 #include "Fuzz/GeneratorChannel.h"
+#include "Fuzz/Technology.h"
 
 namespace kestro::fuzz {
 namespace {
@@ -15,7 +16,7 @@ void addTemplate(GeneratorChannel& channel, ByteView contents) {
 
 void tryInput(ByteView bytes) {
   Input input(bytes);
-  GeneratorChannel channel(KESTRO_FUZZ_TECHNOLOGY);
+  GeneratorChannel channel(kTechnology);
   addTemplate(channel, input.bytes(input.number16()));
   channel.start();
   channel.refresh();
