@@ -16,6 +16,7 @@ namespace {
 using std::chrono::microseconds;
 using ::testing::HasSubstr;
 using ::testing::StartsWith;
+using testing::TemporaryDirectory;
 
 constexpr std::size_t kHeaderLength = 24;
 constexpr std::size_t kFirstRecordLength = 16 + 3;

@@ -13,6 +13,7 @@ namespace {
 
 using ::testing::ElementsAre;
 using ::testing::HasSubstr;
+using testing::TemporaryDirectory;
 
 class CaptureRecordingTest : public ::testing::Test {
  protected:

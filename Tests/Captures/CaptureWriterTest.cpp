@@ -2,15 +2,14 @@
 // Writing captures: the bytes, the limits, and disks that refuse them.
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
-#include <sys/resource.h>
 
-#include <csignal>
 #include <string>
 
 #include "Captures/CaptureFormat.h"
 #include "Captures/CaptureReader.h"
 #include "Captures/CaptureWriter.h"
 #include "Tests/Captures/CaptureBytes.h"
+#include "Tests/Support/FileSizeLimit.h"
 #include "Tests/Support/TemporaryDirectory.h"
 
 namespace kestro {
@@ -18,7 +17,9 @@ namespace {
 
 using std::chrono::microseconds;
 using std::chrono::seconds;
+using testing::FileSizeLimit;
 using ::testing::HasSubstr;
+using testing::TemporaryDirectory;
 
 class CaptureWriterTest : public ::testing::Test {
  protected:
@@ -99,26 +100,6 @@ TEST_F(CaptureWriterTest, aFullDiskIsReportedAtOnce) {
   ASSERT_FALSE(writer.has_value());
   EXPECT_EQ(writer.error().message, "/dev/full: cannot write: No space left on device");
 }
-
-/// Lets no file of this process grow beyond `bytes`.
-class FileSizeLimit {
- public:
-  explicit FileSizeLimit(rlim_t bytes) : _handler(std::signal(SIGXFSZ, SIG_IGN)) {
-    getrlimit(RLIMIT_FSIZE, &_before);
-    const rlimit limit{.rlim_cur = bytes, .rlim_max = _before.rlim_max};
-    setrlimit(RLIMIT_FSIZE, &limit);
-  }
-  FileSizeLimit(const FileSizeLimit&) = delete;
-  FileSizeLimit& operator=(const FileSizeLimit&) = delete;
-  ~FileSizeLimit() {
-    setrlimit(RLIMIT_FSIZE, &_before);
-    std::signal(SIGXFSZ, _handler);
-  }
-
- private:
-  rlimit _before{};
-  void (*_handler)(int);
-};
 
 TEST_F(CaptureWriterTest, bytesRefusedLaterAreReportedFromThenOn) {
   auto writer = CaptureWriter::create(_path, "IFX");

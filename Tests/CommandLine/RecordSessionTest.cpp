@@ -1,14 +1,13 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
-#include <sys/resource.h>
 
-#include <csignal>
 #include <string>
 #include <vector>
 
 #include "Captures/CaptureReader.h"
 #include "CommandLine/RecordSession.h"
+#include "Tests/Support/FileSizeLimit.h"
 #include "Tests/Support/ModelFixture.h"
 #include "Tests/Support/TemporaryFile.h"
 
@@ -17,27 +16,8 @@ namespace {
 
 using namespace std::chrono_literals;
 using ::testing::ElementsAre;
+using testing::FileSizeLimit;
 using ::testing::IsEmpty;
-
-/// Makes files of this process grow no further, for as long as it lives.
-class FileSizeLimit {
- public:
-  explicit FileSizeLimit(rlim_t bytes) : _handlerBefore(std::signal(SIGXFSZ, SIG_IGN)) {
-    ::getrlimit(RLIMIT_FSIZE, &_before);
-    const rlimit limit{bytes, _before.rlim_max};
-    ::setrlimit(RLIMIT_FSIZE, &limit);
-  }
-  ~FileSizeLimit() {
-    ::setrlimit(RLIMIT_FSIZE, &_before);
-    std::signal(SIGXFSZ, _handlerBefore);
-  }
-  FileSizeLimit(const FileSizeLimit&) = delete;
-  FileSizeLimit& operator=(const FileSizeLimit&) = delete;
-
- private:
-  rlimit _before{};
-  void (*_handlerBefore)(int);
-};
 
 class RecordSessionTest : public testing::ModelFixture {
  protected:

@@ -1,40 +1,20 @@
 // SPDX-License-Identifier: MIT
 #include <gtest/gtest.h>
-#include <sys/resource.h>
 
-#include <csignal>
 #include <filesystem>
 #include <fstream>
 #include <iterator>
 
 #include "CommandLine/ReplaceFile.h"
+#include "Tests/Support/FileSizeLimit.h"
 #include "Tests/Support/TemporaryFile.h"
 
 namespace kestro {
 namespace {
 
 namespace fs = std::filesystem;
+using testing::FileSizeLimit;
 using testing::TemporaryFile;
-
-/// While it lives, files of this process end at `size` bytes, as on a full disk.
-class FileSizeLimit {
- public:
-  explicit FileSizeLimit(rlim_t size) : _earlier(::signal(SIGXFSZ, SIG_IGN)) {
-    ::getrlimit(RLIMIT_FSIZE, &_limit);
-    const rlimit limit = {.rlim_cur = size, .rlim_max = _limit.rlim_max};
-    ::setrlimit(RLIMIT_FSIZE, &limit);
-  }
-  ~FileSizeLimit() {
-    ::setrlimit(RLIMIT_FSIZE, &_limit);
-    ::signal(SIGXFSZ, _earlier);
-  }
-  FileSizeLimit(const FileSizeLimit&) = delete;
-  FileSizeLimit& operator=(const FileSizeLimit&) = delete;
-
- private:
-  rlimit _limit = {};
-  void (*_earlier)(int);
-};
 
 class ReplaceFileTest : public ::testing::Test {
  protected:

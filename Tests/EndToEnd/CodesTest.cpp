@@ -2,11 +2,10 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include <fstream>
-#include <iterator>
 #include <nlohmann/json.hpp>
 
 #include "Tests/EndToEnd/Process.h"
+#include "Tests/Support/TemporaryDirectory.h"
 
 namespace kestro::testing {
 namespace {
@@ -14,15 +13,11 @@ namespace {
 using ::testing::HasSubstr;
 using ::testing::SizeIs;
 
-std::string contentsOf(const std::string& path) {
-  std::ifstream stream(path, std::ios::binary);
-  return {std::istreambuf_iterator<char>(stream), {}};
-}
-
 TEST(Codes, TheDocumentIsWhatTheTablesSay) {
   const Outcome outcome = run({"kestro-cli", "codes", "--format=markdown"});
   EXPECT_EQ(outcome.status, 0);
-  const bool isSame = outcome.output == contentsOf(KESTRO_DOCUMENTATION_DIRECTORY "/log-codes.md");
+  const bool isSame =
+      outcome.output == TemporaryDirectory::text(KESTRO_DOCUMENTATION_DIRECTORY "/log-codes.md");
   EXPECT_TRUE(isSame) << "run: kestro-cli codes --format=markdown > Documentation/log-codes.md";
 }
 

@@ -25,11 +25,6 @@ using ::testing::StartsWith;
 /// An LTE message that only its time tells from others: type 1, a record of 13 bytes, code 0x4179.
 const std::string kMessage = "\x01\x0D\x00\x79\x41\0\0\0\0\0\0\0\0\x55"s;
 
-std::string contentsOf(const std::string& path) {
-  std::ifstream stream(path, std::ios::binary);
-  return {std::istreambuf_iterator<char>(stream), {}};
-}
-
 class SnapshotCommandTest : public ::testing::Test {
  protected:
   void SetUp() override { ::setenv("TZ", "UTC0", 1); }
@@ -112,13 +107,14 @@ TEST_F(SnapshotCommandTest, AnEmptyDescriptionMayBeWrittenBothWays) {
   EXPECT_EQ(
       run({"kestro-cli", "snapshot", "save", capture, "-o", snapshot, "--description", ""}).status,
       0);
-  EXPECT_THAT(contentsOf(snapshot), HasSubstr("<key>Description</key>\n\t<string></string>"));
+  EXPECT_THAT(TemporaryDirectory::text(snapshot),
+              HasSubstr("<key>Description</key>\n\t<string></string>"));
 }
 
 TEST_F(SnapshotCommandTest, ADescriptionThatIsNoUtf8DoesNotLoseTheSnapshot) {
   writeIfx({ifxMessage("1")});
   EXPECT_EQ(save("a\xFF\x1B!").status, 0);
-  EXPECT_THAT(contentsOf(snapshot), HasSubstr("<string>a\uFFFD\uFFFD!</string>"));
+  EXPECT_THAT(TemporaryDirectory::text(snapshot), HasSubstr("<string>a\uFFFD\uFFFD!</string>"));
 }
 
 TEST_F(SnapshotCommandTest, MessagesThatCannotBeDecodedAreNamedAndTheRestSaved) {
@@ -173,12 +169,12 @@ TEST_F(SnapshotCommandTest, AFullDiskIsAFailure) {
 
 TEST_F(SnapshotCommandTest, TheCaptureIsNotReplaced) {
   writeIfx({ifxMessage("1")});
-  const std::string before = contentsOf(capture);
+  const std::string before = TemporaryDirectory::text(capture);
   snapshot = directory.directory() + "/./a.pcap";
   const Outcome outcome = save();
   EXPECT_EQ(outcome.status, 1);
   EXPECT_EQ(outcome.errors, "kestro-cli: " + snapshot + ": the output would replace the input\n");
-  EXPECT_EQ(contentsOf(capture), before);
+  EXPECT_EQ(TemporaryDirectory::text(capture), before);
 }
 
 TEST_F(SnapshotCommandTest, WhatIsNoSnapshotIsRefusedWithOneLine) {
@@ -239,7 +235,7 @@ TEST_F(SnapshotCommandTest, ExportsTheLogAsItWasSaved) {
   const Outcome outcome = exportDlf();
   EXPECT_EQ(outcome.status, 0);
   EXPECT_EQ(outcome.errors, "");
-  const std::string log = contentsOf(dlf);
+  const std::string log = TemporaryDirectory::text(dlf);
   EXPECT_EQ(log.size(), 161U + 27U);
   EXPECT_THAT(log, StartsWith("\xA1\x00\xFD\x1F"s));
   EXPECT_THAT(log, EndsWith(kMessage.substr(1) + kMessage));
@@ -253,7 +249,7 @@ TEST_F(SnapshotCommandTest, ReframedEveryPacketFrames) {
   EXPECT_EQ(outcome.status, 0);
   EXPECT_EQ(outcome.errors, "");
   const std::string record = kMessage.substr(1);
-  EXPECT_EQ(contentsOf(dlf).substr(161), record + record + record + record);
+  EXPECT_EQ(TemporaryDirectory::text(dlf).substr(161), record + record + record + record);
 }
 
 TEST_F(SnapshotCommandTest, WhatDoesNotFrameIsNamedAndLeftOut) {
@@ -263,7 +259,7 @@ TEST_F(SnapshotCommandTest, WhatDoesNotFrameIsNamedAndLeftOut) {
   EXPECT_EQ(outcome.status, 3);
   EXPECT_EQ(outcome.errors, "kestro-cli: " + snapshot +
                                 ": entry 1: the last 4 bytes are no packets and are left out\n");
-  EXPECT_EQ(contentsOf(dlf).substr(161), kMessage.substr(1));
+  EXPECT_EQ(TemporaryDirectory::text(dlf).substr(161), kMessage.substr(1));
 }
 
 TEST_F(SnapshotCommandTest, ALogOfOtherPacketsIsNotReframed) {
@@ -272,7 +268,7 @@ TEST_F(SnapshotCommandTest, ALogOfOtherPacketsIsNotReframed) {
       "<dict><key>DisplayState</key><data>AQID</data></dict>"
       "<dict><key>DLF</key><data>AQID</data></dict></array></dict></plist>");
   EXPECT_EQ(exportDlf().status, 0);
-  EXPECT_EQ(contentsOf(dlf), "\x01\x02\x03");
+  EXPECT_EQ(TemporaryDirectory::text(dlf), "\x01\x02\x03");
   const Outcome outcome = exportDlf({"--reframe"});
   EXPECT_EQ(outcome.status, 1);
   EXPECT_EQ(outcome.errors,

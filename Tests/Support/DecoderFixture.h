@@ -16,15 +16,11 @@
 #include "Platform/PropertyListCoding.h"
 #include "Platform/Virtual/VirtualPlatform.h"
 #include "Tests/Support/PacketBytes.h"
+#include "Tests/Support/RecordedLines.h"
 
 namespace kestro::testing {
 
-using Line = RecordingSystemLog::Line;
 using Entries = std::vector<std::pair<std::string, std::string>>;
-
-/// The priorities that decoders use.
-inline Line errorLine(std::string text) { return {LogPriority::Error, std::move(text)}; }
-inline Line traceLine(std::string text) { return {LogPriority::Warning, std::move(text)}; }
 
 /// The keys and texts of a dictionary in their order; "(no text)" for other values.
 inline Entries entriesOf(const Dictionary& dictionary) {

@@ -1,29 +1,28 @@
 // SPDX-License-Identifier: MIT
-// A directory of a test's own, removed with everything in it.
+// A directory of a test's own.
 #pragma once
 
-#include <gtest/gtest.h>
 #include <unistd.h>
 
-#include <atomic>
+#include <cstdlib>
 #include <filesystem>
 #include <fstream>
 #include <ios>
 #include <iterator>
 #include <string>
 #include <string_view>
+#include <system_error>
 
 #include "Platform/Bytes.h"
 
-namespace kestro {
+namespace kestro::testing {
 
+/// A fresh directory of mode 0700; removed, with everything in it, at the end.
 class TemporaryDirectory {
  public:
   TemporaryDirectory() {
-    static std::atomic<unsigned> count{0};
-    _path = std::filesystem::path(::testing::TempDir()) /
-            ("kestro-test-" + std::to_string(::getpid()) + "-" + std::to_string(++count));
-    std::filesystem::create_directories(_path);
+    std::string name = std::filesystem::temp_directory_path() / "kestro-test-XXXXXX";
+    if (::mkdtemp(name.data()) != nullptr) _path = name;
   }
   TemporaryDirectory(const TemporaryDirectory&) = delete;
   TemporaryDirectory& operator=(const TemporaryDirectory&) = delete;
@@ -32,14 +31,16 @@ class TemporaryDirectory {
     std::filesystem::remove_all(_path, ignored);
   }
 
+  [[nodiscard]] const std::filesystem::path& path() const noexcept { return _path; }
   [[nodiscard]] std::string pathOf(std::string_view name) const { return (_path / name).string(); }
 
-  /// Writes a whole file and returns its path.
+  /// Writes a whole file, and makes the folders that it needs; returns its path.
   std::string write(std::string_view name, std::string_view contents) const {
-    const auto path = pathOf(name);
+    const std::filesystem::path path = _path / name;
+    std::filesystem::create_directories(path.parent_path());
     std::ofstream file(path, std::ios::binary);
     file.write(contents.data(), static_cast<std::streamsize>(contents.size()));
-    return path;
+    return path.string();
   }
   std::string write(std::string_view name, ByteView contents) const {
     return write(name,
@@ -50,9 +51,13 @@ class TemporaryDirectory {
     std::ifstream file(path, std::ios::binary);
     return {std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>()};
   }
+  [[nodiscard]] static std::string text(const std::string& path) {
+    const Bytes bytes = read(path);
+    return {bytes.begin(), bytes.end()};
+  }
 
  private:
   std::filesystem::path _path;
 };
 
-}  // namespace kestro
+}  // namespace kestro::testing

@@ -2,41 +2,23 @@
 // A file for one test.
 #pragma once
 
-#include <unistd.h>
-
-#include <cstdlib>
-#include <filesystem>
-#include <fstream>
-#include <iterator>
 #include <string>
+
+#include "Tests/Support/TemporaryDirectory.h"
 
 namespace kestro::testing {
 
 /// A fresh directory with the path of a file in it; both are removed at the end.
 class TemporaryFile {
  public:
-  explicit TemporaryFile(const std::string& name = "file") {
-    std::string pattern = (std::filesystem::temp_directory_path() / "kestro-test-XXXXXX").string();
-    _directory = ::mkdtemp(pattern.data()) == nullptr ? "" : pattern;
-    _path = _directory + "/" + name;
-  }
-  ~TemporaryFile() {
-    std::error_code error;
-    std::filesystem::remove_all(_directory, error);
-  }
-  TemporaryFile(const TemporaryFile&) = delete;
-  TemporaryFile& operator=(const TemporaryFile&) = delete;
+  explicit TemporaryFile(const std::string& name = "file") : _path(_directory.pathOf(name)) {}
 
-  [[nodiscard]] const std::string& directory() const noexcept { return _directory; }
+  [[nodiscard]] std::string directory() const { return _directory.path().string(); }
   [[nodiscard]] const std::string& path() const noexcept { return _path; }
-
-  [[nodiscard]] std::string contents() const {
-    std::ifstream stream(_path, std::ios::binary);
-    return {std::istreambuf_iterator<char>(stream), {}};
-  }
+  [[nodiscard]] std::string contents() const { return TemporaryDirectory::text(_path); }
 
  private:
-  std::string _directory;
+  TemporaryDirectory _directory;
   std::string _path;
 };
 

@@ -16,13 +16,9 @@
 #include "Platform/PropertyListCoding.h"
 #include "Platform/Virtual/VirtualPlatform.h"
 #include "Tests/Support/PacketBytes.h"
+#include "Tests/Support/RecordedLines.h"
 
 namespace kestro::testing {
-
-using Line = RecordingSystemLog::Line;
-
-inline Line errorLine(std::string text) { return {LogPriority::Error, std::move(text)}; }
-inline Line warningLine(std::string text) { return {LogPriority::Warning, std::move(text)}; }
 
 inline constexpr const char* kLookupNames[] = {"kChannel",         "k1xEVDODeviceState",
                                                "kBandClass",       "kRxAGC0",

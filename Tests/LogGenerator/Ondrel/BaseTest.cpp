@@ -97,14 +97,14 @@ TEST_F(ClassIndexTest, TheLaterDecoderOfASectionReplacesTheEarlier) {
 
 TEST_F(ClassIndexTest, LogsTheNumberOfEachDecodersCodes) {
   EXPECT_THAT(platform.systemLog().lines(),
-              ElementsAre(traceLine("Array Count: 3"), traceLine("Array Count: 1")));
+              ElementsAre(warningLine("Array Count: 3"), warningLine("Array Count: 1")));
 }
 
 TEST_F(ClassIndexTest, StatusLeavesTwoLines) {
   static_cast<void>(platform.systemLog().take());
   index->status();
   EXPECT_THAT(platform.systemLog().lines(),
-              ElementsAre(traceLine("Dictionary = 1"), traceLine("String = 0")));
+              ElementsAre(warningLine("Dictionary = 1"), warningLine("String = 0")));
 }
 
 TEST_F(ClassIndexTest, LeavesALineOnDestruction) {
@@ -115,7 +115,7 @@ TEST_F(ClassIndexTest, LeavesALineOnDestruction) {
 TEST_F(ClassIndexTest, BindingADecoderLogsItsSection) {
   static_cast<void>(platform.systemLog().take());
   index->first->updateSectionRef(Dictionary());
-  EXPECT_THAT(platform.systemLog().lines(), ElementsAre(traceLine("Cells")));
+  EXPECT_THAT(platform.systemLog().lines(), ElementsAre(warningLine("Cells")));
 }
 
 TEST(CodeDictionaryTest, KeepsTheOrderOfFirstRequests) {

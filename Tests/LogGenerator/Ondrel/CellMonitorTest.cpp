@@ -34,7 +34,7 @@ constexpr Section section(SectionKind kind, const PropertyListReading& list) {
       .name = "Cells", .logLine = "Cells", .kind = kind, .codes = kCodes, .propertyList = &list};
 }
 constexpr Section kListSection = section(SectionKind::List, kEach);
-constexpr Section kFirstSection = section(SectionKind::Dictionary, kFirst);
+constexpr Section kFirstCellSection = section(SectionKind::Dictionary, kFirst);
 constexpr Section kEachSection = section(SectionKind::Dictionary, kEach);
 
 Dictionary cell(std::string_view technology, std::string_view type) {
@@ -152,7 +152,7 @@ TEST_F(CellListTest, HasARowForEachCellOfTheKind) {
               ElementsAre(Pair("ARFCN", "9"), Pair("RSSI", "-80 dBm"), Pair("Level", "-40")));
   EXPECT_THAT(row(1),
               ElementsAre(Pair("ARFCN", "10"), Pair("RSSI", "-60 dBm"), Pair("Level", "-30")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Cells")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Cells")));
 }
 
 TEST_F(CellListTest, KeepsARowWithoutValuesAndReportsEachOnce) {
@@ -160,7 +160,7 @@ TEST_F(CellListTest, KeepsARowWithoutValuesAndReportsEachOnce) {
                                           "kTqCellMonitorCellTypeNeighbor")});
   ASSERT_THAT(list(), SizeIs(1));
   EXPECT_THAT(row(0), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Cells"), errorLine("Failed: ARFCN\n"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Cells"), errorLine("Failed: ARFCN\n"),
                                        errorLine("Failed: RSSI\n")));
 }
 
@@ -181,7 +181,7 @@ TEST_F(CellListTest, IsEmptiedWithoutAList) {
   takeLines();
   decode(packet(kCellMonitorCode).append(Bytes{0xFF, 0xFE}));
   EXPECT_THAT(list(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Cells"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Cells"),
                                        errorLine("Cell Info Array data could not be constructed"),
                                        errorLine("Failed to get Cell Array\n")));
 }
@@ -197,7 +197,7 @@ TEST_F(CellListTest, ReportsOtherCodes) {
   takeLines();
   decodeList(kSimFilesCode, Array{});
   EXPECT_THAT(list(), SizeIs(1));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Cells"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Cells"),
                                        errorLine("Received an unknown log message: 16711680")));
 }
 
@@ -242,7 +242,7 @@ TEST_F(CellListTest, IsCataloguedWithoutAPacket) {
 
 // --- Dictionary sections -------------------------------------------------------------------------
 
-class FirstCellTest : public DecoderFixture<CellMonitorTableDecoder<kFirstSection>> {};
+class FirstCellTest : public DecoderFixture<CellMonitorTableDecoder<kFirstCellSection>> {};
 
 TEST_F(FirstCellTest, ShowsTheFirstCellOfTheKind) {
   decodeList(kCellMonitorCode, Array{gsmNeighbor(9, -40), gsmNeighbor(10, -41)});

@@ -47,7 +47,7 @@ TEST_F(SimInfoTest, ShowsEveryFileInOrder) {
                           Pair("EF-ACTING HPLMN", "10"), Pair("EF-RAT MODE", "11"),
                           Pair("EF-PLMN NETWORK NAME", "12"), Pair("EF-OPERATOR PLMN LIST", "13"),
                           Pair("EF-OPLMNAcT", "14")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("SimInfo")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("SimInfo")));
 }
 
 TEST_F(SimInfoTest, KeepsFilesThatAPacketLacks) {
@@ -67,7 +67,7 @@ TEST_F(SimInfoTest, PassesValuesOfAnyTypeOn) {
 TEST_F(SimInfoTest, ThrowsForAPayloadThatIsNoPropertyList) {
   EXPECT_THROW(decode(packet(kSimFilesCode).append(Bytes{'x'})), UnknownDataException);
   EXPECT_THAT(takeLines(),
-              ElementsAre(traceLine("SimInfo"),
+              ElementsAre(warningLine("SimInfo"),
                           errorLine("SIM File dictionary data could not be constructed")));
 }
 
@@ -84,14 +84,14 @@ TEST_F(SimInfoTest, ARootThatIsNoDictionaryChangesNothing) {
   decodeList(kSimFilesCode, Array{Dictionary{{"kSimFile_ICCID", "2"}}});
   decodeList(kSimFilesCode, "kSimFile_ICCID");
   EXPECT_THAT(entries(), ElementsAre(Pair("EF-ICCID", "1")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("SimInfo"), traceLine("SimInfo")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("SimInfo"), warningLine("SimInfo")));
 }
 
 TEST_F(SimInfoTest, IsSilentOnAnotherCode) {
   decode(packet(kCellMonitorCode).append(Bytes{'x'}));
   decodeList(kCellMonitorCode, files());
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("SimInfo"), traceLine("SimInfo")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("SimInfo"), warningLine("SimInfo")));
 }
 
 TEST_F(SimInfoTest, IsExplainedByItsFileKeys) {
@@ -133,7 +133,7 @@ TEST_F(PDPContextListTest, ShowsTheElementsAsTheyAre) {
   const Array contexts{Dictionary{{"APN", "internet"}, {"State", Value::integer(1)}}, "text"};
   decodeList(kPacketDataContextsCode, contexts);
   EXPECT_EQ(Value(list()), Value(contexts));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("PDPContextList")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("PDPContextList")));
 }
 
 TEST_F(PDPContextListTest, IsReplacedAsAWhole) {
@@ -152,13 +152,13 @@ TEST_F(PDPContextListTest, KeepsItsContextsWithoutAnArray) {
   decode(packet(kPacketDataContextsCode));
   decode(packet(kPacketDataContextsCode).length(11));
   EXPECT_EQ(Value(list()), Value(Array{"a"}));
-  EXPECT_EQ(takeLines(), std::vector<Line>(4, traceLine("PDPContextList")));
+  EXPECT_EQ(takeLines(), std::vector<Line>(4, warningLine("PDPContextList")));
 }
 
 TEST_F(PDPContextListTest, DecodesWhateverCodeItIsGiven) {
   decode(packet(0x1234).append(*coding->binary(Array{"a"})));
   EXPECT_EQ(Value(list()), Value(Array{"a"}));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("PDPContextList")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("PDPContextList")));
 }
 
 TEST_F(PDPContextListTest, IsExplainedContextByContext) {

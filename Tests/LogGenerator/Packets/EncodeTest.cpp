@@ -13,7 +13,7 @@ using ::testing::ElementsAre;
 
 constexpr NamedValue kColours[] = {{0, "red"}, {3, "blue"}};
 
-constexpr Field kFields[] = {
+constexpr Field kPacketFields[] = {
     {"Level", u16(13).bits(0, 8), scaled(0.25, -140, "%4.2f dBm")},
     {"Priority", u16(13).bits(9, 12), decimal()},
     {"Power", s8(15), decimal("%d dBm", -30).absentAt(64, "Not Present")},
@@ -22,7 +22,7 @@ constexpr Field kFields[] = {
     {"Digits", {u8(19).bits(0, 3), u8(19).bits(4, 7)}, computed(nullptr)},
     {"Records", u8(20).bits(2, 4), hidden()},
 };
-static_assert(isLayout(kFields));
+static_assert(isLayout(kPacketFields));
 
 constexpr Field kRecordFields[] = {
     {"Cell", u16(0), decimal()},
@@ -51,12 +51,12 @@ class EncodeTest : public ::testing::Test {
 };
 
 TEST_F(EncodeTest, TheNumberOfAHiddenFieldIsItsRawValue) {
-  writer.fields(kFields).number("Records", 5);
+  writer.fields(kPacketFields).number("Records", 5);
   EXPECT_EQ(payload()[20 - 13], 5 << 2);
 }
 
 TEST_F(EncodeTest, ATextHasNoNumber) {
-  writer.fields(kFields).number("Colour", 3);
+  writer.fields(kPacketFields).number("Colour", 3);
   EXPECT_FALSE(writer.finish(Moment()));
 }
 
@@ -80,30 +80,30 @@ TEST_F(EncodeTest, MarksExtraPacketsAndStripsTheirOffset) {
 
 TEST_F(EncodeTest, PacksBitFieldsBesideEachOther) {
   // (-100.25 + 140) / 0.25 = 159 = 0x09F; 5 << 9 = 0xA00
-  writer.fields(kFields).number("Level", -100.25).raw("Priority", 5);
+  writer.fields(kPacketFields).number("Level", -100.25).raw("Priority", 5);
   EXPECT_THAT(payload(), ElementsAre(0x9F, 0x0A, 0, 0, 0, 0, 0, 0));
 }
 
 TEST_F(EncodeTest, RoundsToTheNearestRawValue) {
   // (-100.10 + 140) / 0.25 = 159.6
-  writer.fields(kFields).number("Level", -100.10);
+  writer.fields(kPacketFields).number("Level", -100.10);
   EXPECT_THAT(payload(), ElementsAre(160, 0, 0, 0, 0, 0, 0, 0));
 }
 
 TEST_F(EncodeTest, OverwritesEarlierBits) {
-  writer.fields(kFields).raw("Level", 511).raw("Level", 1);
+  writer.fields(kPacketFields).raw("Level", 511).raw("Level", 1);
   EXPECT_THAT(payload(), ElementsAre(1, 0, 0, 0, 0, 0, 0, 0));
 }
 
 TEST_F(EncodeTest, InvertsWholeNumbersNamesAndAbsentValues) {
-  writer.fields(kFields).number("Power", -40).text("Colour", "blue");
+  writer.fields(kPacketFields).number("Power", -40).text("Colour", "blue");
   EXPECT_THAT(payload(), ElementsAre(0, 0, 0xF6, 3, 0, 0, 0, 0));  // -40 + 30 = -10
-  writer.fields(kFields).text("Power", "Not Present");
+  writer.fields(kPacketFields).text("Power", "Not Present");
   EXPECT_THAT(payload(), ElementsAre(0, 0, 64, 3, 0, 0, 0, 0));
 }
 
 TEST_F(EncodeTest, WritesBigEndianPlacesAndSeveralPlacesOfOneField) {
-  writer.fields(kFields).raw("Area", 0x1234).raw("Digits", {0x5, 0x9});
+  writer.fields(kPacketFields).raw("Area", 0x1234).raw("Digits", {0x5, 0x9});
   EXPECT_THAT(payload(), ElementsAre(0, 0, 0, 0, 0x12, 0x34, 0x95, 0));
 }
 
@@ -115,27 +115,27 @@ TEST_F(EncodeTest, PlacesRecordsAndTwinsByTheCount) {
 }
 
 TEST_F(EncodeTest, YieldsNothingForAValueThatDoesNotFit) {
-  writer.fields(kFields).number("Level", 0);  // 560 needs more than 9 bits
+  writer.fields(kPacketFields).number("Level", 0);  // 560 needs more than 9 bits
   EXPECT_FALSE(writer.finish(Moment()));
 }
 
 TEST_F(EncodeTest, YieldsNothingForANegativeRawValueOfAnUnsignedPlace) {
-  writer.fields(kFields).number("Level", -140.25);
+  writer.fields(kPacketFields).number("Level", -140.25);
   EXPECT_FALSE(writer.finish(Moment()));
 }
 
 TEST_F(EncodeTest, YieldsNothingForAnUnknownKey) {
-  writer.fields(kFields).raw("Lvel", 1);
+  writer.fields(kPacketFields).raw("Lvel", 1);
   EXPECT_FALSE(writer.finish(Moment()));
 }
 
 TEST_F(EncodeTest, YieldsNothingForANameThatTheTableLacks) {
-  writer.fields(kFields).text("Colour", "green");
+  writer.fields(kPacketFields).text("Colour", "green");
   EXPECT_FALSE(writer.finish(Moment()));
 }
 
 TEST_F(EncodeTest, YieldsNothingForTheWrongNumberOfRawValues) {
-  writer.fields(kFields).raw("Digits", 5);
+  writer.fields(kPacketFields).raw("Digits", 5);
   EXPECT_FALSE(writer.finish(Moment()));
 }
 

@@ -18,7 +18,7 @@ void sum(std::span<const std::int64_t> raw, TextBuffer& text) {
   text.append("%d", raw[0] + raw[1]);
 }
 
-constexpr Field kFields[] = {
+constexpr Field kExplainedFields[] = {
     {"Count", u8(13), hidden()},
     {"Sum", {u8(14), u8(15)}, computed(sum)},
     {"Gone", removed()},
@@ -30,7 +30,7 @@ constexpr Field kRecordFields[] = {
 };
 constexpr ListReading kLists[] = {
     {.table = {.name = "cell", .count = u8(13), .base = 18, .stride = 2, .fields = kRecordFields}}};
-constexpr PacketReading kReadings[] = {{0x1234, "test packet", 16, kFields, kLists}};
+constexpr PacketReading kReadings[] = {{0x1234, "test packet", 16, kExplainedFields, kLists}};
 constexpr LogCode kCodes[] = {0x1234};
 constexpr Section kSection = {"Test", "Test", SectionKind::Dictionary, kReadings, kCodes};
 
@@ -130,7 +130,7 @@ TEST(CatalogueTest, ListsShownKeysOnce) {
 
 TEST(CatalogueTest, SaysWhereEachKeyComesFrom) {
   const CatalogueEntry entry = catalogueReading(kSection, kReadings[0]);
-  EXPECT_THAT(entry.keys[1].fields, ElementsAre(&kFields[3]));
+  EXPECT_THAT(entry.keys[1].fields, ElementsAre(&kExplainedFields[3]));
   EXPECT_EQ(entry.keys[1].table, nullptr);
   EXPECT_THAT(entry.keys[2].fields, ElementsAre(&kRecordFields[0]));
   EXPECT_EQ(entry.keys[2].table, &kLists[0].table);

@@ -3,7 +3,7 @@
 #include <gtest/gtest.h>
 
 #include "Platform/Linux/FileBundle.h"
-#include "Tests/Platform/Linux/TemporaryDirectory.h"
+#include "Tests/Support/TemporaryDirectory.h"
 
 namespace kestro {
 namespace {
@@ -11,6 +11,7 @@ namespace {
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 using ::testing::MatchesRegex;
+using testing::TemporaryDirectory;
 
 class FileBundleTest : public ::testing::Test {
  protected:
@@ -19,28 +20,28 @@ class FileBundleTest : public ::testing::Test {
 };
 
 TEST_F(FileBundleTest, ListsResourcesOfATypeInNameOrderWithTheirFolders) {
-  directory.makeFile("b.plist", "");
-  directory.makeFile("Templates/UTRAN.plist", "");
-  directory.makeFile("a.plist", "");
-  directory.makeFile("a.txt", "");
-  directory.makeFile("plist", "");
+  directory.write("b.plist", "");
+  directory.write("Templates/UTRAN.plist", "");
+  directory.write("a.plist", "");
+  directory.write("a.txt", "");
+  directory.write("plist", "");
   std::filesystem::create_directory(directory.path() / "folder.plist");
   EXPECT_THAT(bundle.resourcesOfType("plist"),
               ElementsAre("Templates/UTRAN.plist", "a.plist", "b.plist"));
 }
 
 TEST_F(FileBundleTest, ReadsAResource) {
-  directory.makeFile("LTE.plist", std::string("a\0b\xFF\n", 5));
+  directory.write("LTE.plist", std::string("a\0b\xFF\n", 5));
   EXPECT_EQ(bundle.resource("LTE", "plist"), (Bytes{'a', 0, 'b', 0xFF, '\n'}));
 }
 
 TEST_F(FileBundleTest, ReadsAnEmptyResource) {
-  directory.makeFile("empty.plist", "");
+  directory.write("empty.plist", "");
   EXPECT_EQ(bundle.resource("empty", "plist"), Bytes{});
 }
 
 TEST_F(FileBundleTest, ReadsAResourceOfAFolder) {
-  directory.makeFile("Templates/LTE.plist", "x");
+  directory.write("Templates/LTE.plist", "x");
   EXPECT_EQ(bundle.resource("Templates/LTE", "plist"), Bytes{'x'});
 }
 

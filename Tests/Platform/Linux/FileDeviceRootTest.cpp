@@ -1,19 +1,22 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
-#include <sys/resource.h>
 
-#include <csignal>
 #include <fstream>
 #include <iterator>
 
 #include "Platform/Linux/FileDeviceRoot.h"
-#include "Tests/Platform/Linux/TemporaryDirectory.h"
+#include "Tests/Support/FileSizeLimit.h"
+#include "Tests/Support/ScopedEnvironment.h"
+#include "Tests/Support/TemporaryDirectory.h"
 
 namespace kestro {
 namespace {
 
+using testing::FileSizeLimit;
 using ::testing::HasSubstr;
+using testing::ScopedEnvironment;
+using testing::TemporaryDirectory;
 
 class FileDeviceRootTest : public ::testing::Test {
  protected:
@@ -26,28 +29,8 @@ class FileDeviceRootTest : public ::testing::Test {
   FileDeviceRoot root{directory.path()};
 };
 
-/// While it lives, files of this process end at `size` bytes, as on a full disk.
-class FileSizeLimit {
- public:
-  explicit FileSizeLimit(rlim_t size) : _earlier(::signal(SIGXFSZ, SIG_IGN)) {
-    ::getrlimit(RLIMIT_FSIZE, &_limit);
-    const rlimit limit = {.rlim_cur = size, .rlim_max = _limit.rlim_max};
-    ::setrlimit(RLIMIT_FSIZE, &limit);
-  }
-  ~FileSizeLimit() {
-    ::setrlimit(RLIMIT_FSIZE, &_limit);
-    ::signal(SIGXFSZ, _earlier);
-  }
-  FileSizeLimit(const FileSizeLimit&) = delete;
-  FileSizeLimit& operator=(const FileSizeLimit&) = delete;
-
- private:
-  rlimit _limit = {};
-  void (*_earlier)(int);
-};
-
 TEST_F(FileDeviceRootTest, DevicePathsAreLookedUpUnderTheRoot) {
-  directory.makeFile("var/mobile/file", "x");
+  directory.write("var/mobile/file", "x");
   EXPECT_TRUE(root.exists("/var/mobile/file"));
   EXPECT_TRUE(root.exists("/var/mobile"));
   EXPECT_TRUE(root.exists("/"));
@@ -62,7 +45,7 @@ TEST_F(FileDeviceRootTest, WritesAWholeFile) {
 }
 
 TEST_F(FileDeviceRootTest, ReplacesALongerFileInPlace) {
-  directory.makeFile("file", "longer than what comes");
+  directory.write("file", "longer than what comes");
   std::filesystem::create_hard_link(directory.path() / "file", directory.path() / "link");
   EXPECT_TRUE(root.write("/file", Bytes{'x'}));
   EXPECT_EQ(contents("file"), "x");
@@ -141,7 +124,7 @@ TEST_F(FileDeviceRootTest, CreateDefaultLeavesAChosenRootAlone) {
 
 TEST_F(FileDeviceRootTest, CreateDefaultSaysWhatItCannotMake) {
   const ScopedEnvironment chosen("KESTRO_DEVICE_ROOT", nullptr);
-  const std::string file = directory.makeFile("file", "");
+  const std::string file = directory.write("file", "");
   const ScopedEnvironment data("XDG_DATA_HOME", file.c_str());
   EXPECT_THAT(FileDeviceRoot::createDefault().error().message, HasSubstr("Not a directory"));
 }

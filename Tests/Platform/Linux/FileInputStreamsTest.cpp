@@ -13,13 +13,14 @@
 #include "Platform/Linux/FileInputStreams.h"
 #include "Platform/Linux/LinuxPlatform.h"
 #include "Platform/MainQueue.h"
-#include "Tests/Platform/Linux/TemporaryDirectory.h"
+#include "Tests/Support/TemporaryDirectory.h"
 
 namespace kestro {
 namespace {
 
 using std::chrono::milliseconds;
 using ::testing::HasSubstr;
+using testing::TemporaryDirectory;
 
 class FileInputStreamsTest : public ::testing::Test {
  protected:
@@ -60,26 +61,26 @@ class FileInputStreamsTest : public ::testing::Test {
 TEST_F(FileInputStreamsTest, AFileArrivesWholeAndEnds) {
   std::string contents;
   for (int i = 0; i < 100'000; ++i) contents += std::to_string(i);
-  open(directory.makeFile("file", contents));
+  open(directory.write("file", contents));
   platform->run();
   EXPECT_EQ(received, contents);
   EXPECT_EQ(ended, "");
 }
 
 TEST_F(FileInputStreamsTest, NothingArrivesInsideTheOpen) {
-  open(directory.makeFile("file", "x"));
+  open(directory.write("file", "x"));
   EXPECT_EQ(received, "");
 }
 
 TEST_F(FileInputStreamsTest, AnEmptyFileEnds) {
-  open(directory.makeFile("file", ""));
+  open(directory.write("file", ""));
   platform->run();
   EXPECT_EQ(pieces, 0);
   EXPECT_EQ(ended, "");
 }
 
 TEST_F(FileInputStreamsTest, ALongFileLeavesTimersTheirTurn) {
-  open(directory.makeFile("file", std::string(std::size_t{8} * 1024 * 1024, 'x')));
+  open(directory.write("file", std::string(std::size_t{8} * 1024 * 1024, 'x')));
   int piecesAtTick = 0;
   platform->mainQueue().postAfter(milliseconds(1), [&] { piecesAtTick = pieces; });
   platform->run();
@@ -110,7 +111,7 @@ TEST_F(FileInputStreamsTest, APipeDeliversWhatIsWrittenUntilItsWriterIsGone) {
 TEST_F(FileInputStreamsTest, DashIsStandardInputAndLeavesItOpen) {
   const FileDescriptor earlier(::dup(STDIN_FILENO));
   const FileDescriptor file(
-      ::open(directory.makeFile("file", "from input").c_str(), O_RDONLY | O_CLOEXEC));
+      ::open(directory.write("file", "from input").c_str(), O_RDONLY | O_CLOEXEC));
   ::dup2(file.get(), STDIN_FILENO);
   open("-");
   platform->run();
@@ -122,7 +123,7 @@ TEST_F(FileInputStreamsTest, DashIsStandardInputAndLeavesItOpen) {
 }
 
 TEST_F(FileInputStreamsTest, ADestroyedStreamDeliversNoMore) {
-  open(directory.makeFile("file", "x"));
+  open(directory.write("file", "x"));
   stream.reset();
   runFor(milliseconds(20));
   EXPECT_EQ(received, "");
@@ -130,7 +131,7 @@ TEST_F(FileInputStreamsTest, ADestroyedStreamDeliversNoMore) {
 }
 
 TEST_F(FileInputStreamsTest, AStreamMayBeDestroyedInItsOwnHandlers) {
-  const std::string path = directory.makeFile("file", "x");
+  const std::string path = directory.write("file", "x");
   bool hasEnded = false;
   stream = *platform->inputStreams().open(
       path, [this](ByteView) { stream.reset(); }, [&](std::string_view) { hasEnded = true; });

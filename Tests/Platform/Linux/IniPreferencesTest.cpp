@@ -14,7 +14,8 @@
 #include "Platform/Linux/LinuxPlatform.h"
 #include "Platform/Virtual/VirtualServices.h"
 #include "Tests/Platform/Linux/ChildProcess.h"
-#include "Tests/Platform/Linux/TemporaryDirectory.h"
+#include "Tests/Support/ScopedEnvironment.h"
+#include "Tests/Support/TemporaryDirectory.h"
 
 namespace kestro {
 namespace {
@@ -23,6 +24,8 @@ using ::testing::ElementsAre;
 using ::testing::Field;
 using ::testing::HasSubstr;
 using ::testing::IsEmpty;
+using testing::ScopedEnvironment;
+using testing::TemporaryDirectory;
 
 constexpr std::string_view kKey = "LumoShowGSMRSSI";
 
@@ -33,7 +36,7 @@ class IniPreferencesTest : public ::testing::Test {
     return {std::istreambuf_iterator<char>(file), {}};
   }
   [[nodiscard]] std::optional<bool> storedAs(const std::string& line) const {
-    directory.makeFile("kestro/preferences/a.ini", "[General]\n" + line + "\n");
+    directory.write("kestro/preferences/a.ini", "[General]\n" + line + "\n");
     return preferences.boolean("a", "key");
   }
 
@@ -64,7 +67,7 @@ TEST_F(IniPreferencesTest, SynchronizeStoresTheDomainInItsFile) {
 }
 
 TEST_F(IniPreferencesTest, OtherKeysOfTheDomainAreKept) {
-  directory.makeFile("kestro/preferences/a.ini", "[General]\nother=text\nkey=false\n");
+  directory.write("kestro/preferences/a.ini", "[General]\nother=text\nkey=false\n");
   preferences.setBoolean("a", "key", true);
   preferences.synchronize("a");
   EXPECT_THAT(fileText("a.ini"), HasSubstr("other=text\n"));
@@ -84,7 +87,7 @@ TEST_F(IniPreferencesTest, WhatIsNoBooleanIsAbsent) {
 }
 
 TEST_F(IniPreferencesTest, AStoreThatCannotBeWrittenLeavesALogLine) {
-  const std::filesystem::path file = directory.makeFile("file", "");
+  const std::filesystem::path file = directory.write("file", "");
   IniPreferences nowhere(log, file / "below");
   nowhere.setBoolean("a", "key", true);
   nowhere.synchronize("a");

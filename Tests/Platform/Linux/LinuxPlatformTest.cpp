@@ -18,7 +18,7 @@
 #include "Platform/MainQueue.h"
 #include "Platform/TextSink.h"
 #include "Platform/Uuids.h"
-#include "Tests/Platform/Linux/TemporaryDirectory.h"
+#include "Tests/Support/TemporaryDirectory.h"
 
 namespace kestro {
 namespace {
@@ -27,6 +27,7 @@ using std::chrono::milliseconds;
 using std::chrono::steady_clock;
 using ::testing::ElementsAre;
 using ::testing::MatchesRegex;
+using testing::TemporaryDirectory;
 
 class LinuxPlatformTest : public ::testing::Test {
  protected:

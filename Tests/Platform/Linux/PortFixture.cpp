@@ -47,16 +47,6 @@ Bytes frame(std::uint8_t kind, std::uint32_t messageId, std::uint32_t sequence,
   return result;
 }
 
-TemporaryDirectory::TemporaryDirectory() {
-  std::string path = std::filesystem::temp_directory_path() / "kestro-test-XXXXXX";
-  if (::mkdtemp(path.data()) != nullptr) _path = path;
-}
-
-TemporaryDirectory::~TemporaryDirectory() {
-  std::error_code ignored;
-  std::filesystem::remove_all(_path, ignored);
-}
-
 RawPeer::RawPeer(FileDescriptor socket) : _socket(std::move(socket)) {
   const timeval patience{std::chrono::seconds(kPatience).count(), 0};
   ::setsockopt(_socket.get(), SOL_SOCKET, SO_RCVTIMEO, &patience, sizeof(patience));

@@ -22,6 +22,7 @@
 #include "Platform/Linux/MessagePorts.h"
 #include "Platform/MessagePort.h"
 #include "Platform/Virtual/VirtualServices.h"
+#include "Tests/Support/TemporaryDirectory.h"
 
 namespace kestro::testing {
 
@@ -36,19 +37,6 @@ Bytes joined(std::initializer_list<Bytes> pieces);
 /// A frame written out by hand: its header's bytes as the documentation has them, and a body.
 Bytes frame(std::uint8_t kind, std::uint32_t messageId, std::uint32_t sequence,
             std::string_view body);
-
-/// A directory of mode 0700 that ends with the object.
-class TemporaryDirectory {
- public:
-  TemporaryDirectory();
-  ~TemporaryDirectory();
-  TemporaryDirectory(const TemporaryDirectory&) = delete;
-  TemporaryDirectory& operator=(const TemporaryDirectory&) = delete;
-  [[nodiscard]] const std::filesystem::path& path() const noexcept { return _path; }
-
- private:
-  std::filesystem::path _path;
-};
 
 /// One end of a connection, as bytes; it blocks, at most 5 s a call.
 class RawPeer {

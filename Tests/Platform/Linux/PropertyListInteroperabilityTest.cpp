@@ -10,10 +10,12 @@
 #include "Platform/PropertyListCoding.h"
 #include "Tests/Platform/Linux/ChildProcess.h"
 #include "Tests/Platform/Linux/PropertyListBytes.h"
-#include "Tests/Platform/Linux/TemporaryDirectory.h"
+#include "Tests/Support/TemporaryDirectory.h"
 
 namespace kestro {
 namespace {
+
+using testing::TemporaryDirectory;
 
 /// The same list in both languages.
 Value sample() {

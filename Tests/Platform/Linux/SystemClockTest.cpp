@@ -4,12 +4,13 @@
 
 #include "Platform/Clock.h"
 #include "Platform/Linux/LinuxPlatform.h"
-#include "Tests/Platform/Linux/TemporaryDirectory.h"
+#include "Tests/Support/ScopedEnvironment.h"
 
 namespace kestro {
 namespace {
 
 using namespace std::chrono;
+using testing::ScopedEnvironment;
 
 /// Central European time: daylight saving from the last Sunday of March to that of October.
 constexpr const char* kCentralEurope = "CET-1CEST,M3.5.0,M10.5.0/3";

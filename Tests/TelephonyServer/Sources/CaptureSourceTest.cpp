@@ -18,6 +18,7 @@ using std::chrono::microseconds;
 using ::testing::ElementsAre;
 using ::testing::HasSubstr;
 using ::testing::IsEmpty;
+using testing::TemporaryDirectory;
 
 class CaptureSourceTest : public ::testing::Test {
  protected:

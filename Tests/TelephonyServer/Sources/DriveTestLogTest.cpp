@@ -17,6 +17,7 @@ using std::chrono::sys_days;
 using ::testing::Contains;
 using ::testing::ElementsAre;
 using ::testing::Not;
+using testing::TemporaryDirectory;
 
 using Column = DriveTestColumn;
 

@@ -19,6 +19,7 @@ using std::chrono::seconds;
 using ::testing::ElementsAre;
 using ::testing::HasSubstr;
 using ::testing::IsEmpty;
+using testing::TemporaryDirectory;
 
 /// One message a row: its level's text. No message for a level of 0, two for one of 1.
 class LevelEncoder : public DriveTestEncoder {

@@ -17,13 +17,15 @@ namespace {
 
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
+using testing::TemporaryDirectory;
 
-const std::string kColumns = "Timestamp,NetworkMode,RSRP,RSRQ,RSSI,CELLHEX,LACHEX,RAWCELLID\n";
+const std::string kGsmUmtsColumns =
+    "Timestamp,NetworkMode,RSRP,RSRQ,RSSI,CELLHEX,LACHEX,RAWCELLID\n";
 
 class GsmUmtsDriveTestTest : public ::testing::Test {
  protected:
   void show(const std::string& rows) {
-    auto log = DriveTestLog::open(_directory.write("log.csv", kColumns + rows));
+    auto log = DriveTestLog::open(_directory.write("log.csv", kGsmUmtsColumns + rows));
     ASSERT_TRUE(log.has_value()) << log.error().message;
     for (auto row = log->next(); row->has_value(); row = log->next()) {
       packets = _encoder.messages(**row);
@@ -74,10 +76,10 @@ TEST_F(GsmUmtsDriveTestTest, SendsNothingForLteRows) {
 
 TEST_F(GsmUmtsDriveTestTest, FollowsTheLogFromTechnologyToTechnology) {
   AutoDriveTestEncoder encoder(display.coding(), DriveTestFamily::Lte);
-  auto log = DriveTestLog::open(
-      _directory.write("log.csv", kColumns + "2020.01.02_03.04.05,5G,-89,-7,-82,1,9CBA,1000\n"
-                                             "2020.01.02_03.04.06,UMTS,-89,-7,-82,1,9CBA,1000\n"
-                                             "2020.01.02_03.04.07,LTE,-89,-7,-82,1,9CBA,1000\n"));
+  auto log = DriveTestLog::open(_directory.write(
+      "log.csv", kGsmUmtsColumns + "2020.01.02_03.04.05,5G,-89,-7,-82,1,9CBA,1000\n"
+                                   "2020.01.02_03.04.06,UMTS,-89,-7,-82,1,9CBA,1000\n"
+                                   "2020.01.02_03.04.07,LTE,-89,-7,-82,1,9CBA,1000\n"));
   std::vector<std::string_view> technologies = {encoder.technology()};
   for (auto row = log->next(); row->has_value(); row = log->next()) {
     EXPECT_FALSE(encoder.messages(**row).empty());

@@ -14,6 +14,8 @@
 namespace kestro {
 namespace {
 
+using testing::TemporaryDirectory;
+
 class IfxDriveTestTest : public ::testing::Test {
  protected:
   /// The message of a log's last row, as sent.
@@ -42,12 +44,12 @@ class IfxDriveTestTest : public ::testing::Test {
   IfxDriveTestEncoder _encoder{*_coding};
 };
 
-const std::string kColumns =
+const std::string kIfxColumns =
     "Timestamp,Longitude,Latitude,Speed,Operatorname,CellID,NetworkMode,RSRP,RSRQ,SNR,CQI,RSSI,"
     "DL_bitrate,UL_bitrate,State,CELLHEX,NODEHEX,LACHEX,RAWCELLID,NRxRSRP,NRxRSRQ\n";
 
 TEST_F(IfxDriveTestTest, anLteRowShowsTheLogsOwnNumbersWithTheirUnits) {
-  const auto display = shown(kColumns +
+  const auto display = shown(kIfxColumns +
                              "2020.01.02_03.04.05,-8.46,51.88,17,B,1,LTE,-90,-7,9.0,12,-72,36,6,D,"
                              "1,53E42,9CBA,87966209,-95.0,-16.0\n");
   const Dictionary expected{
@@ -76,7 +78,7 @@ TEST_F(IfxDriveTestTest, anLteRowShowsTheLogsOwnNumbersWithTheirUnits) {
 }
 
 TEST_F(IfxDriveTestTest, aUmtsRowNamesItsQuantitiesDifferently) {
-  const auto display = shown(kColumns +
+  const auto display = shown(kIfxColumns +
                              "2020.01.02_03.04.05,-,-,-,B,52212,HSPA+,-67,-2,-,-,-,2608,153,D,"
                              "CBF4,C,75AA,838644,-,-\n");
   EXPECT_EQ(display["03;Radio Quality"],
@@ -87,7 +89,7 @@ TEST_F(IfxDriveTestTest, aUmtsRowNamesItsQuantitiesDifferently) {
 }
 
 TEST_F(IfxDriveTestTest, aGsmRowShowsItsLevelOnly) {
-  const auto display = shown(kColumns +
+  const auto display = shown(kIfxColumns +
                              "2020.01.02_03.04.05,-,-,-,B,34124,EDGE,-51,0,-,-,-,0,3,D,"
                              "854C,-,3FE,34124,-,-\n");
   EXPECT_EQ(display["03;Radio Quality"],

@@ -18,16 +18,17 @@ namespace {
 
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
+using testing::TemporaryDirectory;
 using ::testing::UnorderedElementsAre;
 
-const std::string kColumns =
+const std::string kLteColumns =
     "Timestamp,NetworkMode,RSRP,RSRQ,RSSI,LACHEX,RAWCELLID,NRxRSRP,NRxRSRQ\n";
 
 class LteDriveTestTest : public ::testing::Test {
  protected:
   /// Shows every row of a log; the codes that the last one sent.
   void show(const std::string& rows) {
-    auto log = DriveTestLog::open(_directory.write("log.csv", kColumns + rows));
+    auto log = DriveTestLog::open(_directory.write("log.csv", kLteColumns + rows));
     ASSERT_TRUE(log.has_value()) << log.error().message;
     for (auto row = log->next(); row->has_value(); row = log->next()) {
       codes.clear();

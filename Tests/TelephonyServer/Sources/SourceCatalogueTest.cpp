@@ -16,6 +16,7 @@ namespace kestro {
 namespace {
 
 using ::testing::HasSubstr;
+using testing::TemporaryDirectory;
 
 class SourceCatalogueTest : public ::testing::Test {
  protected:

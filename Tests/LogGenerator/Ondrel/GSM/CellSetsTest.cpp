@@ -36,7 +36,7 @@ TEST_F(ActiveSetTest, ShowsAMemberCell) {
   ASSERT_THAT(list(), SizeIs(1));
   EXPECT_THAT(row(0), ElementsAre(Pair("Scrambling Code", "401"), Pair("RSCP", "-74 dB"),
                                   Pair("Energy Per Chip", "-8 dB")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("ActiveSet")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("ActiveSet")));
 }
 
 TEST_F(ActiveSetTest, ReadsThirteenBitsOfScramblingCode) {
@@ -114,7 +114,7 @@ TEST_F(ActiveSetTest, NeedsSixteenBytes) {
   takeLines();
   decode(setInformation(0).length(15));
   EXPECT_THAT(list(), SizeIs(1));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("ActiveSet")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("ActiveSet")));
 }
 
 TEST_F(ActiveSetTest, ReadsZerosPastTheEnd) {
@@ -129,7 +129,7 @@ TEST_F(ActiveSetTest, ReportsOtherCodes) {
   takeLines();
   decode(setInformation(0).bytes(), 0x4005);
   EXPECT_THAT(list(), SizeIs(1));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("ActiveSet"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("ActiveSet"),
                                        errorLine("Received an unknown log message: 16389")));
 }
 
@@ -170,7 +170,7 @@ TYPED_TEST(EmptySetTest, IsEmptyWhateverCellsAPacketHas) {
     this->list().append("old");
     this->decode(setInformation(count).u8(24, 0x20).u8(39, 0x40));
     EXPECT_THAT(this->list(), IsEmpty()) << count;
-    EXPECT_THAT(this->takeLines(), ElementsAre(traceLine(this->names().className)));
+    EXPECT_THAT(this->takeLines(), ElementsAre(warningLine(this->names().className)));
   }
 }
 
@@ -186,7 +186,7 @@ TYPED_TEST(EmptySetTest, NeedsSixteenBytes) {
   this->list().append("old");
   this->decode(setInformation(0).length(15));
   EXPECT_THAT(this->list(), SizeIs(1));
-  EXPECT_THAT(this->takeLines(), ElementsAre(traceLine(this->names().className)));
+  EXPECT_THAT(this->takeLines(), ElementsAre(warningLine(this->names().className)));
 }
 
 TYPED_TEST(EmptySetTest, ReportsOtherCodes) {
@@ -194,7 +194,7 @@ TYPED_TEST(EmptySetTest, ReportsOtherCodes) {
   this->decode(setInformation(0).bytes(), 0xFF0001);
   EXPECT_THAT(this->list(), SizeIs(1));
   EXPECT_THAT(this->takeLines(),
-              ElementsAre(traceLine(this->names().className),
+              ElementsAre(warningLine(this->names().className),
                           errorLine("Received an unknown log message: 16711681")));
 }
 
@@ -244,7 +244,7 @@ TEST_F(UMTSSetTest, ShowsARankedCell) {
               ElementsAre(Pair("Downlink Frequency", "10712"), Pair("Scrambling Code", "321"),
                           Pair("RSCP", "-91 dB"), Pair("Rank Cell RSCP", "-91 dB"),
                           Pair("Energy Per Chip", "-7.500000 dB"), Pair("Ranking Value", "-13")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("UMTSSet")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("UMTSSet")));
 }
 
 TEST_F(UMTSSetTest, ReadsEachFieldsSign) {
@@ -282,7 +282,7 @@ TEST_F(UMTSSetTest, NeedsFifteenBytes) {
   takeLines();
   decode(packet(0x4005).length(14));
   EXPECT_THAT(list(), SizeIs(1));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("UMTSSet")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("UMTSSet")));
   decode(packet(0x4005).length(15));
   EXPECT_THAT(list(), IsEmpty());
 }
@@ -290,7 +290,7 @@ TEST_F(UMTSSetTest, NeedsFifteenBytes) {
 TEST_F(UMTSSetTest, ReportsOtherCodes) {
   decode(ranking().bytes(), 0x417A);
   EXPECT_THAT(list(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("UMTSSet"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("UMTSSet"),
                                        errorLine("Received an unknown log message: 16762")));
 }
 
@@ -301,7 +301,7 @@ TEST_F(UMTSSetTest, ShowsAListedNeighbour) {
   ASSERT_THAT(list(), SizeIs(1));
   EXPECT_THAT(row(0), ElementsAre(Pair("UARFCN", "10712"), Pair("Scrambling Code", "321"),
                                   Pair("RSCP", "-95 dBm"), Pair("Energy Per Chip", "-9 dB")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("UMTSSet")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("UMTSSet")));
 }
 
 TEST_F(UMTSSetTest, ShowsNoLevelThatWasNotMeasured) {
@@ -328,7 +328,7 @@ TEST_F(UMTSSetTest, NamesEveryValueThatANeighbourLacks) {
   ASSERT_THAT(list(), SizeIs(1));
   EXPECT_THAT(row(0), IsEmpty());
   EXPECT_THAT(takeLines(),
-              ElementsAre(traceLine("UMTSSet"), errorLine("UMTSSet: Failed to retrieve UARFCN\n"),
+              ElementsAre(warningLine("UMTSSet"), errorLine("UMTSSet: Failed to retrieve UARFCN\n"),
                           errorLine("UMTSSet: Failed to retrieve Scrambling Code\n"),
                           errorLine("UMTSSet: Failed to retrieve RSCP\n"),
                           errorLine("UMTSSet: Failed to retrieve Energy Per Chip\n")));
@@ -353,7 +353,7 @@ TEST_F(UMTSSetTest, PassesOverOtherCells) {
                    neighbourWithout("kTqCellMonitorCellRadioAccessTechnology"),
                    neighbourWithout("kTqCellMonitorCellType"), "no cell", Value::integer(1)});
   EXPECT_THAT(list(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("UMTSSet")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("UMTSSet")));
 }
 
 TEST_F(UMTSSetTest, IsEmptiedByAListThatDoesNotParse) {
@@ -361,7 +361,7 @@ TEST_F(UMTSSetTest, IsEmptiedByAListThatDoesNotParse) {
   takeLines();
   decode(packet(0xFF0001).length(20, 'x'));
   EXPECT_THAT(list(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("UMTSSet"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("UMTSSet"),
                                        errorLine("Cell Info Array data could not be constructed"),
                                        errorLine("Failed to get Cell Array\n")));
 }
@@ -372,7 +372,7 @@ TEST_F(UMTSSetTest, IsEmptiedByAListThatIsNoArray) {
   decodeList(0xFF0001, neighbour());
   EXPECT_THAT(list(), IsEmpty());
   EXPECT_THAT(takeLines(),
-              ElementsAre(traceLine("UMTSSet"), errorLine("Failed to get Cell Array\n")));
+              ElementsAre(warningLine("UMTSSet"), errorLine("Failed to get Cell Array\n")));
 }
 
 TEST_F(UMTSSetTest, IsEmptiedByAnEmptyList) {
@@ -380,7 +380,7 @@ TEST_F(UMTSSetTest, IsEmptiedByAnEmptyList) {
   takeLines();
   decodeList(0xFF0001, Array());
   EXPECT_THAT(list(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("UMTSSet")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("UMTSSet")));
 }
 
 }  // namespace

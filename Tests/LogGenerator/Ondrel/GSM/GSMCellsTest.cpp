@@ -54,7 +54,7 @@ TEST_F(GSMServingCellTest, ShowsTheIdentityFirst) {
   decode(identity());
   EXPECT_THAT(entries(),
               ElementsAre(Pair("Cell ID", "54321"), Pair("ARFCN", "77"), Pair("BSIC", "44")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("GSMServingCell")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("GSMServingCell")));
 }
 
 TEST_F(GSMServingCellTest, ReadsTheIdentityUnsigned) {
@@ -66,7 +66,7 @@ TEST_F(GSMServingCellTest, ReadsTheIdentityUnsigned) {
 TEST_F(GSMServingCellTest, NeedsTwentySixBytesOfIdentity) {
   decode(identity().length(25));
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("GSMServingCell")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("GSMServingCell")));
 }
 
 TEST_F(GSMServingCellTest, ShowsTheMeasurements) {
@@ -96,7 +96,7 @@ TEST_F(GSMServingCellTest, ShowsTheLowByteOfTheDedicatedChannel) {
 TEST_F(GSMServingCellTest, NeedsSeventeenBytesOfDedicatedChannel) {
   decode(packet(0x5076).u16(13, 0x0123).length(16));
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("GSMServingCell")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("GSMServingCell")));
 }
 
 TEST_F(GSMServingCellTest, KeepsWhatAPacketDoesNotCarry) {
@@ -113,7 +113,7 @@ TEST_F(GSMServingCellTest, KeepsWhatAPacketDoesNotCarry) {
 TEST_F(GSMServingCellTest, ReportsOtherCodes) {
   decode(identity().bytes(), 0x51FF);
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("GSMServingCell"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("GSMServingCell"),
                                        errorLine("Received an unknown log message: 20991")));
 }
 
@@ -121,7 +121,7 @@ TEST_F(GSMServingCellTest, ShowsTheFirstListedServingCell) {
   decodeList(0xFF0001, Array{gsmCell("kTqCellMonitorCellTypeNeighbor"), serving(),
                              changed(serving(), "kTqCellMonitorARFCN", Value::integer(1))});
   EXPECT_THAT(entries(), ElementsAre(Pair("Cell ID", "54321"), Pair("ARFCN", "77")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("GSMServingCell")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("GSMServingCell")));
 }
 
 TEST_F(GSMServingCellTest, ReadsListedNumbersSigned) {
@@ -139,7 +139,7 @@ TEST_F(GSMServingCellTest, KeepsWhatAListedCellLacks) {
   decodeList(0xFF0001, Array{cell});
   EXPECT_THAT(entries(),
               ElementsAre(Pair("Cell ID", "54321"), Pair("ARFCN", "77"), Pair("BSIC", "44")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("GSMServingCell"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("GSMServingCell"),
                                        errorLine("GSMServingCell: Failed to retrieve Cell ID\n"),
                                        errorLine("GSMServingCell: Failed to retrieve ARFCN\n")));
 }
@@ -150,7 +150,7 @@ TEST_F(GSMServingCellTest, NeedsATechnologyAndATypeOfAListedCell) {
                              changed(serving(), "kTqCellMonitorCellRadioAccessTechnology",
                                      "kTqCellMonitorRadioAccessTechnologyUMTS")});
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("GSMServingCell")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("GSMServingCell")));
 }
 
 TEST_F(GSMServingCellTest, ReportsALostList) {
@@ -158,12 +158,12 @@ TEST_F(GSMServingCellTest, ReportsALostList) {
   takeLines();
   decode(packet(0xFF0001));
   EXPECT_THAT(entries(), SizeIs(3));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("GSMServingCell"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("GSMServingCell"),
                                        errorLine("Cell Info Array data could not be constructed"),
                                        errorLine("Failed to get Cell Array\n")));
   decodeList(0xFF0001, "text");
   EXPECT_THAT(takeLines(),
-              ElementsAre(traceLine("GSMServingCell"), errorLine("Failed to get Cell Array\n")));
+              ElementsAre(warningLine("GSMServingCell"), errorLine("Failed to get Cell Array\n")));
 }
 
 // --- NeighboringCells ----------------------------------------------------------------------------
@@ -206,7 +206,7 @@ TEST_F(NeighboringCellsTest, ShowsNeighbours) {
   EXPECT_THAT(row(0), ElementsAre(Pair("ARFCN", "77"), Pair("RSSI", "31"), Pair("C1 Value", "14")));
   EXPECT_THAT(row(1),
               ElementsAre(Pair("ARFCN", "512"), Pair("RSSI", "32"), Pair("C1 Value", "15")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("NeighboringCells")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("NeighboringCells")));
 }
 
 TEST_F(NeighboringCellsTest, ReadsTheWidestValues) {
@@ -255,7 +255,7 @@ TEST_F(NeighboringCellsTest, ABSICListDoesNotTouchTheDisplay) {
   decode(bsics({}));
   EXPECT_THAT(list(), SizeIs(1));
   EXPECT_THAT(takeLines(),
-              ElementsAre(traceLine("NeighboringCells"), traceLine("NeighboringCells")));
+              ElementsAre(warningLine("NeighboringCells"), warningLine("NeighboringCells")));
 }
 
 TEST_F(NeighboringCellsTest, ABSICListNeedsFifteenBytes) {
@@ -285,7 +285,7 @@ TEST_F(NeighboringCellsTest, ReportsOtherCodes) {
   takeLines();
   decode(neighbours({}).bytes(), 0x5134);
   EXPECT_THAT(list(), SizeIs(1));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("NeighboringCells"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("NeighboringCells"),
                                        errorLine("Received an unknown log message: 20788")));
 }
 
@@ -295,7 +295,7 @@ TEST_F(NeighboringCellsTest, ShowsListedNeighboursWithTwiceTheirLevel) {
   ASSERT_THAT(list(), SizeIs(2));
   EXPECT_THAT(row(0), ElementsAre(Pair("ARFCN", "77"), Pair("RSSI", "-80 dBm")));
   EXPECT_THAT(row(1), ElementsAre(Pair("ARFCN", "512"), Pair("RSSI", "-80 dBm")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("NeighboringCells")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("NeighboringCells")));
 }
 
 TEST_F(NeighboringCellsTest, ShowsNoBSICOfListedNeighbours) {
@@ -319,7 +319,7 @@ TEST_F(NeighboringCellsTest, NamesEveryValueThatAListedNeighbourLacks) {
   decodeList(0xFF0001, Array{cell});
   ASSERT_THAT(list(), SizeIs(1));
   EXPECT_THAT(row(0), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("NeighboringCells"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("NeighboringCells"),
                                        errorLine("NeighboringCells: Failed to retrieve ARFCN\n"),
                                        errorLine("NeighboringCells: Failed to retrieve RSSI\n")));
 }
@@ -336,15 +336,15 @@ TEST_F(NeighboringCellsTest, IsEmptiedByALostList) {
   takeLines();
   decode(packet(0xFF0001).length(14));
   EXPECT_THAT(list(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("NeighboringCells"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("NeighboringCells"),
                                        errorLine("Cell Info Array data could not be constructed"),
                                        errorLine("Failed to get Cell Array\n")));
   decode(neighbours({77}));
   takeLines();
   decodeList(0xFF0001, Dictionary());
   EXPECT_THAT(list(), IsEmpty());
-  EXPECT_THAT(takeLines(),
-              ElementsAre(traceLine("NeighboringCells"), errorLine("Failed to get Cell Array\n")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("NeighboringCells"),
+                                       errorLine("Failed to get Cell Array\n")));
 }
 
 // --- GSMSet --------------------------------------------------------------------------------------
@@ -364,7 +364,7 @@ TEST_F(GSMSetTest, ShowsRankedCells) {
                                   Pair("Ranking Value", "-3")));
   EXPECT_THAT(row(1), ElementsAre(Pair("ARFCN", "78"), Pair("BSIC", "0"), Pair("RSSI", "0 dBm"),
                                   Pair("Ranking Value", "0")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("GSMSet")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("GSMSet")));
 }
 
 TEST_F(GSMSetTest, ReadsEachFieldsSign) {
@@ -397,7 +397,7 @@ TEST_F(GSMSetTest, NeedsFifteenBytes) {
 TEST_F(GSMSetTest, ReportsOtherCodes) {
   decode(packet(0x4005).u8(14, 1).length(22).bytes(), 0xFF0001);
   EXPECT_THAT(list(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("GSMSet"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("GSMSet"),
                                        errorLine("Received an unknown log message: 16711681")));
 }
 
@@ -422,7 +422,7 @@ TEST_F(MobileAllocationTest, ShowsSequenceNumberAndFrequencies) {
   EXPECT_THAT(keysOf(section()), ElementsAre("HSN", "ARFCNs"));
   EXPECT_EQ(text("HSN"), "33");
   EXPECT_THAT(frequencies(), ElementsAre("514", "65535", "512"));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("MobileAllocation")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("MobileAllocation")));
 }
 
 TEST_F(MobileAllocationTest, ShowsAnEmptyListForNoFrequency) {
@@ -441,13 +441,13 @@ TEST_F(MobileAllocationTest, ASequenceNumberOfZeroIsNoBound) {
 TEST_F(MobileAllocationTest, NeedsFifteenBytes) {
   decode(packet(0x51F8).u8(13, 33).length(14));
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("MobileAllocation")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("MobileAllocation")));
 }
 
 TEST_F(MobileAllocationTest, ReportsOtherCodes) {
   decode(packet(0x51F8).length(15).bytes(), 0x51F6);
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("MobileAllocation"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("MobileAllocation"),
                                        errorLine("Received an unknown log message: 20982")));
 }
 

@@ -42,7 +42,7 @@ TEST_F(BLERTest, ShowsWindowAndChannels) {
                               Pair("CRC Received in Error", "217")),
                   ElementsAre(Pair("Transport Channel ID", "31"), Pair("CRC Received", "5"),
                               Pair("CRC Received in Error", "4"))));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("BLER")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("BLER")));
 }
 
 TEST_F(BLERTest, ShowsCountsSigned) {
@@ -69,14 +69,14 @@ TEST_F(BLERTest, AWindowOfZeroIsNoBound) {
 TEST_F(BLERTest, NeedsSixteenBytes) {
   decode(channels(1, 500).length(15));
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("BLER")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("BLER")));
 }
 
 TEST_F(BLERTest, ReportsOtherCodes) {
   decode(channels(0, 500).bytes(), 0x4221);
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(),
-              ElementsAre(traceLine("BLER"), errorLine("Received an unknown log message: 16929")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("BLER"),
+                                       errorLine("Received an unknown log message: 16929")));
 }
 
 // --- HSDPAInformation ----------------------------------------------------------------------------
@@ -99,7 +99,7 @@ TEST_F(HSDPAInformationTest, ShowsTheHeader) {
   decode(statistics(0, 0).u8(13, 3).u8(14, 100).u8(15, 0x0B));
   EXPECT_THAT(entries(), ElementsAre(Pair("Version", "3"), Pair("Sub Frames", "868"),
                                      Pair("Carrier Info", "Dual Carrier")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("HSDPAInformation")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("HSDPAInformation")));
 }
 
 TEST_F(HSDPAInformationTest, NamesEveryCarrierType) {
@@ -169,13 +169,13 @@ TEST_F(HSDPAInformationTest, KeepsAListThatAPacketDoesNotCarry) {
 TEST_F(HSDPAInformationTest, NeedsEighteenBytes) {
   decode(statistics(0, 0).length(17));
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("HSDPAInformation")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("HSDPAInformation")));
 }
 
 TEST_F(HSDPAInformationTest, ReportsOtherCodes) {
   decode(statistics(0, 0).bytes(), 0x4116);
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("HSDPAInformation"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("HSDPAInformation"),
                                        errorLine("Received an unknown log message: 16662")));
 }
 

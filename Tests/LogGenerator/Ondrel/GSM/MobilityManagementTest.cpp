@@ -59,7 +59,7 @@ TEST_F(ProcessCOTest, HasItsNameAndCodes) {
 TEST_F(ProcessCOTest, ShowsTheMMStateAlone) {
   decode(states(0x7131, 19, 8, 1));
   EXPECT_THAT(entries(), ElementsAre(Pair("MM State", "MM_IDLE")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("ProcessCO")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("ProcessCO")));
 }
 
 TEST_F(ProcessCOTest, NamesEveryMMState) {
@@ -94,13 +94,13 @@ TEST_F(ProcessCOTest, NeedsSixteenBytes) {
   decode(states(0x7131, 19).length(15));
   decode(states(0x7132, 1).length(15));
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("ProcessCO"), traceLine("ProcessCO")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("ProcessCO"), warningLine("ProcessCO")));
 }
 
 TEST_F(ProcessCOTest, ReportsOtherCodes) {
   decode(states(0x7130, 1));
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("ProcessCO"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("ProcessCO"),
                                        errorLine("Received an unknown log message: 28976")));
 }
 
@@ -118,7 +118,7 @@ TEST_F(ProcessCSTest, ShowsStateSubStateAndUpdateStatus) {
   EXPECT_THAT(entries(),
               ElementsAre(Pair("MM State", "MM_IDLE"), Pair("MM Sub State", "MM_NORMAL_SERVICE"),
                           Pair("LU Reject Cause", "NOT_UPDATED")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("ProcessCS")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("ProcessCS")));
 }
 
 TEST_F(ProcessCSTest, NamesEverySubState) {
@@ -159,7 +159,7 @@ TEST_F(ProcessCSTest, NeedsSixteenBytes) {
 
 TEST_F(ProcessCSTest, ReportsOtherCodes) {
   decode(states(0x7135, 1));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("ProcessCS"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("ProcessCS"),
                                        errorLine("Received an unknown log message: 28981")));
 }
 
@@ -177,7 +177,7 @@ TEST_F(ProcessPSTest, ShowsTheGMMStates) {
   EXPECT_THAT(entries(), ElementsAre(Pair("MM State", "GMM_REGISTERED"),
                                      Pair("MM Sub State", "GMM_ATTEMPING_TO_UPDATE"),
                                      Pair("Attach Reject Cause", "GMM_GU1_UPDATED")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("ProcessPS")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("ProcessPS")));
 }
 
 TEST_F(ProcessPSTest, NamesEveryState) {
@@ -246,7 +246,7 @@ TEST_F(ProcessPSTest, NeedsSixteenBytes) {
 TEST_F(ProcessPSTest, ReportsOtherCodes) {
   decode(states(0x7131, 1));
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("ProcessPS"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("ProcessPS"),
                                        errorLine("Received an unknown log message: 28977")));
 }
 
@@ -278,7 +278,7 @@ TEST_F(ServingPLMNTest, ShowsTheNetworkAndItsAreas) {
               ElementsAre(Pair("Mobile Country Code", "310"), Pair("Mobile Network Code", "260"),
                           Pair("Location Area Code", "4660"), Pair("Routing Area Code", "17"),
                           Pair("Service Type", "CS_PS_SERVICE")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("ServingPLMN")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("ServingPLMN")));
 }
 
 TEST_F(ServingPLMNTest, PrintsAFillerAsANumber) {
@@ -323,7 +323,7 @@ TEST_F(ServingPLMNTest, NamesEverySelectionMode) {
 TEST_F(ServingPLMNTest, NeedsThirtyTwoBytesOfNetwork) {
   decode(network(0x21, 0x36, 0x54).length(31));
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("ServingPLMN")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("ServingPLMN")));
 }
 
 TEST_F(ServingPLMNTest, NeedsSixteenBytesOfSelectionMode) {
@@ -334,7 +334,7 @@ TEST_F(ServingPLMNTest, NeedsSixteenBytesOfSelectionMode) {
 TEST_F(ServingPLMNTest, ReportsOtherCodes) {
   decode(states(0x7131, 0));
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("ServingPLMN"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("ServingPLMN"),
                                        errorLine("Received an unknown log message: 28977")));
 }
 
@@ -343,7 +343,7 @@ TEST_F(ServingPLMNTest, ShowsTheFirstListedServingCell) {
   EXPECT_THAT(entries(),
               ElementsAre(Pair("Mobile Country Code", "262"), Pair("Mobile Network Code", "2"),
                           Pair("Location Area Code", "4660")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("ServingPLMN")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("ServingPLMN")));
 }
 
 TEST_F(ServingPLMNTest, TakesAGSMCellToo) {
@@ -362,7 +362,7 @@ TEST_F(ServingPLMNTest, PassesOverNeighboursAndCellsOfNoKind) {
   unknown.remove("kTqCellMonitorCellRadioAccessTechnology");
   decodeList(0xFF0001, Array{neighbour, untyped, unknown, "no cell"});
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("ServingPLMN")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("ServingPLMN")));
 }
 
 TEST_F(ServingPLMNTest, KeepsWhatAListedCellLacks) {
@@ -375,7 +375,7 @@ TEST_F(ServingPLMNTest, KeepsWhatAListedCellLacks) {
   decodeList(0xFF0001, Array{cell});
   EXPECT_EQ(text("Mobile Country Code"), "123");
   EXPECT_EQ(text("Mobile Network Code"), "456");
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("ServingPLMN"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("ServingPLMN"),
                                        errorLine("ServingPLMN: Failed to retrieve MCC\n"),
                                        errorLine("ServingPLMN: Failed to retrieve MNC\n"),
                                        errorLine("ServingPLMN: Failed to retrieve LAC\n")));
@@ -383,19 +383,19 @@ TEST_F(ServingPLMNTest, KeepsWhatAListedCellLacks) {
 
 TEST_F(ServingPLMNTest, ReportsALostList) {
   decode(packet(0xFF0001).length(30, 'x'));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("ServingPLMN"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("ServingPLMN"),
                                        errorLine("Cell Info Array data could not be constructed"),
                                        errorLine("Failed to get Cell Array\n")));
   decodeList(0xFF0001, umts());
   EXPECT_THAT(takeLines(),
-              ElementsAre(traceLine("ServingPLMN"), errorLine("Failed to get Cell Array\n")));
+              ElementsAre(warningLine("ServingPLMN"), errorLine("Failed to get Cell Array\n")));
   EXPECT_THAT(entries(), IsEmpty());
 }
 
 TEST_F(ServingPLMNTest, IsSilentAboutAnEmptyList) {
   decodeList(0xFF0001, Array());
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("ServingPLMN")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("ServingPLMN")));
 }
 
 // --- EquivalentPLMNList --------------------------------------------------------------------------
@@ -415,7 +415,7 @@ TEST_F(EquivalentPLMNListTest, ReadsSixInterleavedDigits) {
   ASSERT_THAT(list(), SizeIs(1));
   EXPECT_THAT(row(0),
               ElementsAre(Pair("Mobile Country Code", "262"), Pair("Mobile Network Code", "457")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("EquivalentPLMNList")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("EquivalentPLMNList")));
 }
 
 TEST_F(EquivalentPLMNListTest, StepsByThreeBytes) {
@@ -454,7 +454,7 @@ TEST_F(EquivalentPLMNListTest, NeedsSeventeenBytes) {
 TEST_F(EquivalentPLMNListTest, ReportsOtherCodes) {
   decode(networks(1).bytes(), 0x7135);
   EXPECT_THAT(list(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("EquivalentPLMNList"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("EquivalentPLMNList"),
                                        errorLine("Received an unknown log message: 28981")));
 }
 

@@ -165,7 +165,7 @@ TEST_F(Ondrel_GSMLogGeneratorTest, SpeaksItsTechnology) {
 TEST_F(Ondrel_GSMLogGeneratorTest, LeavesALineBeforeItsIndexIsMade) {
   const auto log = platform.systemLog().take();
   EXPECT_EQ(log.front(), errorLine("Creating Ondrel_GSMLogGenerator object"));
-  EXPECT_EQ(log[1], traceLine("Array Count: 1"));
+  EXPECT_EQ(log[1], warningLine("Array Count: 1"));
   EXPECT_THAT(log[1 + rows().size()].text,
               StartsWith("Creating OndrelLogGenerator2 object with 0x"));
 }
@@ -174,7 +174,7 @@ TEST_F(Ondrel_GSMLogGeneratorTest, LeavesItsDestructionLineTwice) {
   const std::string line = "Ondrel_GSMLogGenerator is destructed " + addressText(generator.get());
   lines();
   generator.reset();
-  EXPECT_THAT(platform.systemLog().take(), ElementsAre(traceLine(line), traceLine(line)));
+  EXPECT_THAT(platform.systemLog().take(), ElementsAre(warningLine(line), warningLine(line)));
 }
 
 TEST_F(Ondrel_GSMLogGeneratorTest, AsksForTheCodesOfAllDecoders) {

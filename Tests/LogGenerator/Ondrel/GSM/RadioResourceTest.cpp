@@ -27,7 +27,7 @@ TEST_F(GSMRRInfoTest, ShowsTheState) {
   decode(state(5).u8(14, 1).u8(15, 255).u8(16, 3));
   EXPECT_THAT(entries(), ElementsAre(Pair("RR State", "RR_IDLE"), Pair("RR Sub State", "1"),
                                      Pair("RR Status", "255"), Pair("RR Mode", "3")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("GSMRRInfo")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("GSMRRInfo")));
 }
 
 TEST_F(GSMRRInfoTest, NamesEveryState) {
@@ -67,7 +67,7 @@ TEST_F(GSMRRInfoTest, NamesEveryState) {
 TEST_F(GSMRRInfoTest, NeedsSeventeenBytesOfState) {
   decode(state(5).length(16));
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("GSMRRInfo")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("GSMRRInfo")));
 }
 
 TEST_F(GSMRRInfoTest, ShowsDiscontinuousReception) {
@@ -128,7 +128,7 @@ TEST_F(GSMRRInfoTest, ReportsOtherCodes) {
         {0x51F7, "Received an unknown log message: 20983"}}) {
     decode(measurements().bytes(), code);
     EXPECT_THAT(entries(), IsEmpty());
-    EXPECT_THAT(takeLines(), ElementsAre(traceLine("GSMRRInfo"), errorLine(line)));
+    EXPECT_THAT(takeLines(), ElementsAre(warningLine("GSMRRInfo"), errorLine(line)));
   }
 }
 

@@ -56,7 +56,7 @@ TYPED_TEST(UnwantingSectionTest, LeavesItsNameWhateverTheCode) {
   this->section().set("kept", "text");
   for (const LogCode code : {0x417AU, 0x4005U, 0xFF0001U}) {
     this->decode(packet(code).length(200, 0xFF));
-    EXPECT_THAT(this->takeLines(), ElementsAre(traceLine(this->names().className)));
+    EXPECT_THAT(this->takeLines(), ElementsAre(warningLine(this->names().className)));
   }
   EXPECT_EQ(this->list().size() + this->section().size(), 1U);
 }
@@ -76,14 +76,14 @@ TEST_F(GPRSInformationTest, AcceptsItsPacketsInSilence) {
   section().set("kept", "text");
   for (const LogCode code : {0x51F5, 0x7135, 0x51F6, 0x51FB, 0x51FD, 0x51F4, 0x5137}) {
     decode(packet(code).length(60, 0xFF));
-    EXPECT_THAT(takeLines(), ElementsAre(traceLine("GPRSInformation"))) << code;
+    EXPECT_THAT(takeLines(), ElementsAre(warningLine("GPRSInformation"))) << code;
   }
   EXPECT_THAT(keysOf(section()), ElementsAre("kept"));
 }
 
 TEST_F(GPRSInformationTest, ReportsOtherCodes) {
   decode(packet(0x51F8).length(60));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("GPRSInformation"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("GPRSInformation"),
                                        errorLine("Received an unknown log message: 20984")));
 }
 
@@ -100,14 +100,14 @@ TEST_F(UMTSRRInfoTest, AcceptsItsPacketsInSilence) {
   section().set("kept", "text");
   for (const LogCode code : {0x4125, 0x4031, 0x4127, 0x4157, 0xFF0001}) {
     decode(packet(code).length(60, 0xFF));
-    EXPECT_THAT(takeLines(), ElementsAre(traceLine("UMTSRRInfo"))) << code;
+    EXPECT_THAT(takeLines(), ElementsAre(warningLine("UMTSRRInfo"))) << code;
   }
   EXPECT_THAT(keysOf(section()), ElementsAre("kept"));
 }
 
 TEST_F(UMTSRRInfoTest, ReportsOtherCodes) {
   decode(packet(0xFF0002));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("UMTSRRInfo"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("UMTSRRInfo"),
                                        errorLine("Received an unknown log message: 16711682")));
 }
 

@@ -113,8 +113,8 @@ TEST_F(LTELogGeneratorTest, LogsItsDestructionBeforeItsBases) {
   const std::string address = addressText(generator.get());
   generator.reset();
   EXPECT_THAT(platform.systemLog().lines(),
-              ElementsAre(traceLine("LTELogGenerator is destructed " + address),
-                          traceLine("Ondrel_GSMLogGenerator is destructed " + address)));
+              ElementsAre(warningLine("LTELogGenerator is destructed " + address),
+                          warningLine("Ondrel_GSMLogGenerator is destructed " + address)));
 }
 
 TEST_F(LTELogGeneratorTest, AsksForItsCodes) {
@@ -150,14 +150,14 @@ TEST_F(LTELogGeneratorTest, NeighborAndReselectionPacketsUpdateTwoSectionsInOrde
   EXPECT_THAT(section("02;Neighbors", kSections[6]).array(), SizeIs(1));
   const auto neighborLines = platform.systemLog().take();
   ASSERT_THAT(neighborLines, SizeIs(9));  // the list's own lines follow: a count, a cell, 5 levels
-  EXPECT_EQ(neighborLines[0], traceLine("Neighbor Measurements"));
-  EXPECT_EQ(neighborLines[1], traceLine("Neighbor Cells List"));
+  EXPECT_EQ(neighborLines[0], warningLine("Neighbor Measurements"));
+  EXPECT_EQ(neighborLines[1], warningLine("Neighbor Cells List"));
 
   receive(packet(0xB186).u8(13, 3).u16(19, 1).u16(21, 6).length(29));
   EXPECT_EQ(section("03;Reselection", kSections[7]).dictionary()["Version"], Value("3"));
   EXPECT_THAT(section("03;Reselection", kSections[8]).array(), SizeIs(1));
-  EXPECT_THAT(platform.systemLog().take(), ElementsAre(traceLine("Reselection Candidates"),
-                                                       traceLine("Reselection Candidates List")));
+  EXPECT_THAT(platform.systemLog().take(), ElementsAre(warningLine("Reselection Candidates"),
+                                                       warningLine("Reselection Candidates List")));
 }
 
 TEST_F(LTELogGeneratorTest, CodesOfNoDecoderAreCollectedInSilence) {
@@ -199,21 +199,21 @@ std::vector<Placed> placedSections(const Dictionary& display) {
 
 TEST_F(LTELogGeneratorTest, TheTemplateHoldsEverySectionWhereAnEngineerLooksForIt) {
   EXPECT_FALSE(generator->generateLogUsingState(state).isDictionary());
-  constexpr ValueType kDictionary = ValueType::Dictionary;
-  constexpr ValueType kArray = ValueType::Array;
+  constexpr ValueType kDictionaryValue = ValueType::Dictionary;
+  constexpr ValueType kArrayValue = ValueType::Array;
   EXPECT_EQ(display()["_sorted"], Value("_sorted"));
   EXPECT_EQ(placedSections(display()),
-            (std::vector<Placed>{{"01;Serving Cell", kSections[0], kDictionary},
-                                 {"01;Serving Cell", kSections[4], kDictionary},
-                                 {"01;Serving Cell", kSections[1], kDictionary},
-                                 {"02;Neighbors", kSections[2], kArray},
-                                 {"02;Neighbors", kSections[3], kArray},
-                                 {"02;Neighbors", kSections[5], kDictionary},
-                                 {"02;Neighbors", kSections[6], kArray},
-                                 {"03;Reselection", kSections[7], kDictionary},
-                                 {"03;Reselection", kSections[8], kArray},
-                                 {"04;SIM", kSections[9], kDictionary},
-                                 {"05;Packet Data", kSections[10], kArray}}));
+            (std::vector<Placed>{{"01;Serving Cell", kSections[0], kDictionaryValue},
+                                 {"01;Serving Cell", kSections[4], kDictionaryValue},
+                                 {"01;Serving Cell", kSections[1], kDictionaryValue},
+                                 {"02;Neighbors", kSections[2], kArrayValue},
+                                 {"02;Neighbors", kSections[3], kArrayValue},
+                                 {"02;Neighbors", kSections[5], kDictionaryValue},
+                                 {"02;Neighbors", kSections[6], kArrayValue},
+                                 {"03;Reselection", kSections[7], kDictionaryValue},
+                                 {"03;Reselection", kSections[8], kArrayValue},
+                                 {"04;SIM", kSections[9], kDictionaryValue},
+                                 {"05;Packet Data", kSections[10], kArrayValue}}));
 }
 
 TEST_F(LTELogGeneratorTest, CataloguesEveryCodeOfEverySection) {

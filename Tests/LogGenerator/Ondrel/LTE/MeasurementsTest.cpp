@@ -49,7 +49,7 @@ TEST_F(ConnectedModeMeasurementMiscTest, ShowsTheServingCell) {
                   Pair("Subframe Number", "9876"), Pair("Serving Filtered RSRP", "-98.75 dBm"),
                   Pair("Serving Filtered RSRQ", "-9.62 dB")));
   EXPECT_THAT(takeLines(),
-              ElementsAre(traceLine("Connected mode LTE Intra-frequency Measurement")));
+              ElementsAre(warningLine("Connected mode LTE Intra-frequency Measurement")));
 }
 
 TEST_F(ConnectedModeMeasurementMiscTest, ShowsTheLowestLevels) {
@@ -73,14 +73,15 @@ TEST_F(ConnectedModeMeasurementMiscTest, NeedsTwentyNineBytes) {
   decode(intraFrequency().length(28));
   EXPECT_THAT(entries(), IsEmpty());
   EXPECT_THAT(takeLines(),
-              ElementsAre(traceLine("Connected mode LTE Intra-frequency Measurement")));
+              ElementsAre(warningLine("Connected mode LTE Intra-frequency Measurement")));
 }
 
 TEST_F(ConnectedModeMeasurementMiscTest, ReportsOtherCodes) {
   decode(intraFrequency().bytes(), 0xB17F);
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Connected mode LTE Intra-frequency Measurement"),
-                                       errorLine("Received an unknown log message: 45439")));
+  EXPECT_THAT(takeLines(),
+              ElementsAre(warningLine("Connected mode LTE Intra-frequency Measurement"),
+                          errorLine("Received an unknown log message: 45439")));
 }
 
 class MeasuredNeighborCellsTest : public DecoderFixture<MeasuredNeighborCells> {};
@@ -99,7 +100,7 @@ TEST_F(MeasuredNeighborCellsTest, ShowsEveryNeighbor) {
   EXPECT_THAT(row(1),
               ElementsAre(Pair("Physical Cell ID", "503"), Pair("Filtered RSRP", "-140.00 dBm"),
                           Pair("Filtered RSRQ", "-20.00 dB")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Measured Neighbor Cells")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Measured Neighbor Cells")));
 }
 
 TEST_F(MeasuredNeighborCellsTest, RoundsTiesToTheEvenDigit) {
@@ -143,7 +144,7 @@ TEST_F(MeasuredNeighborCellsTest, ReportsOtherCodes) {
   takeLines();
   decode(intraFrequency().bytes(), 0xFFB179);
   EXPECT_THAT(list(), SizeIs(2));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Measured Neighbor Cells"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Measured Neighbor Cells"),
                                        errorLine("Received an unknown log message: 16757113")));
 }
 
@@ -160,7 +161,7 @@ TEST_F(DetectedCellsTest, ShowsTheCellsBehindTheMeasuredOnes) {
   EXPECT_THAT(row(0), ElementsAre(Pair("Physical Cell ID", "21")));
   EXPECT_THAT(row(1), ElementsAre(Pair("Physical Cell ID", "22")));
   EXPECT_THAT(row(2), ElementsAre(Pair("Physical Cell ID", "65535")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Detected Cells")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Detected Cells")));
 }
 
 TEST_F(DetectedCellsTest, FollowsTheHeaderWithoutMeasuredCells) {
@@ -191,7 +192,7 @@ TEST_F(DetectedCellsTest, ReportsOtherCodes) {
   takeLines();
   decode(intraFrequency().bytes(), 0xB17A);
   EXPECT_THAT(list(), SizeIs(3));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Detected Cells"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Detected Cells"),
                                        errorLine("Received an unknown log message: 45434")));
 }
 
@@ -233,7 +234,7 @@ TEST_F(ServingCellMeasurementTest, ShowsEveryFieldInOrder) {
                   Pair("Num of Consecutive DRX Cycles of S < 0", "9"),
                   Pair("S Intra Search", "62 dB"), Pair("S Non Intra Search", "4 dBm"),
                   Pair("Measurement Rules Updated", "True"), Pair("Measurement Rules", "6")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Serving Cell Measurements")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Serving Cell Measurements")));
 }
 
 TEST_F(ServingCellMeasurementTest, ShowsTheLowestValues) {
@@ -295,7 +296,7 @@ TEST_F(ServingCellMeasurementTest, SearchThresholdsAreNotPresentAtThirtyTwo) {
 TEST_F(ServingCellMeasurementTest, NeedsThirtyThreeBytes) {
   decode(measurement().length(32));
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Serving Cell Measurements")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Serving Cell Measurements")));
 }
 
 TEST_F(ServingCellMeasurementTest, OverwritesItsKeysInPlace) {
@@ -309,7 +310,7 @@ TEST_F(ServingCellMeasurementTest, OverwritesItsKeysInPlace) {
 TEST_F(ServingCellMeasurementTest, ReportsOtherCodes) {
   decode(measurement().bytes(), 0xB180);
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Serving Cell Measurements"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Serving Cell Measurements"),
                                        errorLine("Received an unknown log message: 45440")));
 }
 
@@ -345,7 +346,7 @@ TEST_F(NeighborMeasurementMiscTest, ShowsTheHeader) {
   decode(neighbors());
   EXPECT_THAT(entries(), ElementsAre(Pair("Version", "2"), Pair("E-ARFCN", "6300"),
                                      Pair("Qrxlevmin", "-116 dBm")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Neighbor Measurements")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Neighbor Measurements")));
 }
 
 TEST_F(NeighborMeasurementMiscTest, ReadsSixBitsOfTheMinimumLevel) {
@@ -362,7 +363,7 @@ TEST_F(NeighborMeasurementMiscTest, NeedsTwentyOneBytes) {
 
 TEST_F(NeighborMeasurementMiscTest, ReportsOtherCodes) {
   decode(neighbors().bytes(), 0xB179);
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Neighbor Measurements"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Neighbor Measurements"),
                                        errorLine("Received an unknown log message: 45433")));
 }
 
@@ -399,14 +400,14 @@ TEST_F(NeighborCellsListTest, LogsEveryRecord) {
   EXPECT_THAT(
       takeLines(),
       ElementsAre(
-          traceLine("Neighbor Cells List"),
-          traceLine("Number of neighboring cells being reported: 2\n"),
-          traceLine("Physical Cell ID: 301\n"), traceLine("Measured RSSI: -90.000000\n"),
-          traceLine("Measured RSSI: -95.000000\n"), traceLine("Measured RSSI: -94.500000\n"),
-          traceLine("Measured RSSI: -12.500000\n"), traceLine("Measured RSSI: -12.250000\n"),
-          traceLine("Physical Cell ID: 511\n"), traceLine("Measured RSSI: -12.500000\n"),
-          traceLine("Measured RSSI: 115.500000\n"), traceLine("Measured RSSI: 115.500000\n"),
-          traceLine("Measured RSSI: 1.750000\n"), traceLine("Measured RSSI: 1.750000\n")));
+          warningLine("Neighbor Cells List"),
+          warningLine("Number of neighboring cells being reported: 2\n"),
+          warningLine("Physical Cell ID: 301\n"), warningLine("Measured RSSI: -90.000000\n"),
+          warningLine("Measured RSSI: -95.000000\n"), warningLine("Measured RSSI: -94.500000\n"),
+          warningLine("Measured RSSI: -12.500000\n"), warningLine("Measured RSSI: -12.250000\n"),
+          warningLine("Physical Cell ID: 511\n"), warningLine("Measured RSSI: -12.500000\n"),
+          warningLine("Measured RSSI: 115.500000\n"), warningLine("Measured RSSI: 115.500000\n"),
+          warningLine("Measured RSSI: 1.750000\n"), warningLine("Measured RSSI: 1.750000\n")));
 }
 
 TEST_F(NeighborCellsListTest, LogsNothingBelowTheLogsThreshold) {
@@ -455,13 +456,13 @@ TEST_F(NeighborCellsListTest, NeedsTwentyOneBytes) {
   takeLines();
   decode(neighbors().length(20));
   EXPECT_THAT(list(), SizeIs(2));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Neighbor Cells List")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Neighbor Cells List")));
 }
 
 TEST_F(NeighborCellsListTest, ReportsOtherCodes) {
   decode(neighbors().bytes(), 0xB181);
   EXPECT_THAT(list(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Neighbor Cells List"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Neighbor Cells List"),
                                        errorLine("Received an unknown log message: 45441")));
 }
 

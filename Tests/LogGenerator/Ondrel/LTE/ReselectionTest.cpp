@@ -36,13 +36,13 @@ TEST_F(ReselectionCandidatesMiscTest, ShowsTheHeader) {
   decode(candidate(0));
   EXPECT_THAT(entries(), ElementsAre(Pair("Version", "3"), Pair("Serving EARFCN", "1300"),
                                      Pair("Serving Cell ID", "301")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Reselection Candidates")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Reselection Candidates")));
 }
 
 TEST_F(ReselectionCandidatesMiscTest, NeedsTwentyOneBytes) {
   decode(candidate(0).length(20));
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Reselection Candidates")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Reselection Candidates")));
   decode(candidate(0).length(21));
   EXPECT_EQ(text("Version"), "3");
 }
@@ -50,7 +50,7 @@ TEST_F(ReselectionCandidatesMiscTest, NeedsTwentyOneBytes) {
 TEST_F(ReselectionCandidatesMiscTest, ReportsOtherCodes) {
   decode(candidate(0).bytes(), 0xB187);
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Reselection Candidates"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Reselection Candidates"),
                                        errorLine("Received an unknown log message: 45447")));
 }
 
@@ -68,7 +68,7 @@ TEST_F(ReselectionCandidatesListTest, ShowsAnLteCandidate) {
   EXPECT_THAT(row(0),
               ElementsAre(Pair("Candidate Priority", "6"), Pair("Candidate RAT Type", "LTE"),
                           Pair("E ARFCN", "4660"), Pair("Cell ID", "343")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Reselection Candidates List")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Reselection Candidates List")));
 }
 
 TEST_F(ReselectionCandidatesListTest, ShowsAUtranCandidate) {
@@ -177,7 +177,7 @@ TEST_F(ReselectionCandidatesListTest, NeedsTwentyOneBytes) {
 TEST_F(ReselectionCandidatesListTest, ReportsOtherCodes) {
   decode(candidate(0).bytes(), 0xB185);
   EXPECT_THAT(list(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Reselection Candidates List"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Reselection Candidates List"),
                                        errorLine("Received an unknown log message: 45445")));
 }
 

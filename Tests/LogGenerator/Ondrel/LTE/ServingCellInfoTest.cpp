@@ -9,10 +9,6 @@ using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 using ::testing::Pair;
 
-Line missing(const char* what) {
-  return errorLine(std::string("Serving Cell Info: Failed to retrieve ") + what + "\n");
-}
-
 class LTEServingCellInfoTest : public DecoderFixture<LTEServingCellInfo> {
  protected:
   static PacketBytes systemInformation() {
@@ -51,7 +47,7 @@ TEST_F(LTEServingCellInfoTest, ShowsTheSystemInformation) {
                           Pair("Upload Frequency", "19300"), Pair("Download Bandwidth", "10 MHz"),
                           Pair("Upload Bandwidth", "5 MHz"), Pair("Cell Identity", "27447297"),
                           Pair("Tracking Area Code", "12345"), Pair("Freq Band Indicator", "3")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("LTE Serving Cell Info")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("LTE Serving Cell Info")));
 }
 
 TEST_F(LTEServingCellInfoTest, ReadsTheWidestValues) {
@@ -66,7 +62,7 @@ TEST_F(LTEServingCellInfoTest, ReadsTheWidestValues) {
 TEST_F(LTEServingCellInfoTest, NeedsThirtyEightBytesOfSystemInformation) {
   decode(systemInformation().length(37));
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("LTE Serving Cell Info")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("LTE Serving Cell Info")));
 }
 
 TEST_F(LTEServingCellInfoTest, NamesEveryBandwidth) {
@@ -88,20 +84,20 @@ TEST_F(LTEServingCellInfoTest, NamesEveryBandwidth) {
 TEST_F(LTEServingCellInfoTest, ShowsTheAntennasAndReportsThePacketAllTheSame) {
   decode(packet(0xB0C1).u8(20, 2).length(22));
   EXPECT_THAT(entries(), ElementsAre(Pair("Num Tx Antennas", "2")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("LTE Serving Cell Info"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("LTE Serving Cell Info"),
                                        errorLine("Received an unknown log message: 45249")));
 }
 
 TEST_F(LTEServingCellInfoTest, NeedsTwentyTwoBytesOfAntennas) {
   decode(packet(0xB0C1).u8(20, 2).length(21));
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("LTE Serving Cell Info")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("LTE Serving Cell Info")));
 }
 
 TEST_F(LTEServingCellInfoTest, ReportsOtherCodes) {
   decode(packet(0xB0C3).length(60));
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("LTE Serving Cell Info"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("LTE Serving Cell Info"),
                                        errorLine("Received an unknown log message: 45251")));
 }
 
@@ -110,7 +106,7 @@ TEST_F(LTEServingCellInfoTest, ShowsTheServingCellOfTheCellMonitor) {
   EXPECT_THAT(entries(), ElementsAre(Pair("Tracking Area Code", "7"), Pair("Cell Identity", "2"),
                                      Pair("Physical Cell ID", "40"),
                                      Pair("Freq Band Indicator", "20"), Pair("UARFCN", "1850")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("LTE Serving Cell Info")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("LTE Serving Cell Info")));
 }
 
 TEST_F(LTEServingCellInfoTest, SystemInformationTakesTheChannelOfTheCellMonitorAway) {
@@ -142,9 +138,12 @@ TEST_F(LTEServingCellInfoTest, ReportsEveryValueThatItMisses) {
     cell.remove(key);
   }
   decodeList(kCellMonitorCode, Array{cell});
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("LTE Serving Cell Info"), missing("TAC"),
-                                       missing("Cell ID"), missing("Physical Cell ID"),
-                                       missing("Freq Band Indicator"), missing("UARFCN")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("LTE Serving Cell Info"),
+                                       failedToRetrieve("Serving Cell Info", "TAC"),
+                                       failedToRetrieve("Serving Cell Info", "Cell ID"),
+                                       failedToRetrieve("Serving Cell Info", "Physical Cell ID"),
+                                       failedToRetrieve("Serving Cell Info", "Freq Band Indicator"),
+                                       failedToRetrieve("Serving Cell Info", "UARFCN")));
   EXPECT_EQ(text("Tracking Area Code"), "12345");
 }
 
@@ -154,7 +153,8 @@ TEST_F(LTEServingCellInfoTest, GoesOnAfterAValueThatItMisses) {
   decodeList(kCellMonitorCode, Array{cell});
   EXPECT_THAT(keysOf(section()), ElementsAre("Tracking Area Code", "Physical Cell ID",
                                              "Freq Band Indicator", "UARFCN"));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("LTE Serving Cell Info"), missing("Cell ID")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("LTE Serving Cell Info"),
+                                       failedToRetrieve("Serving Cell Info", "Cell ID")));
 }
 
 TEST_F(LTEServingCellInfoTest, TakesTheFirstServingCell) {
@@ -176,13 +176,13 @@ TEST_F(LTEServingCellInfoTest, IsSilentWithoutAServingCell) {
   decodeList(kCellMonitorCode, Array{neighbor, untyped});
   decodeList(kCellMonitorCode, Array{});
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(),
-              ElementsAre(traceLine("LTE Serving Cell Info"), traceLine("LTE Serving Cell Info")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("LTE Serving Cell Info"),
+                                       warningLine("LTE Serving Cell Info")));
 }
 
 TEST_F(LTEServingCellInfoTest, ReportsAPayloadThatIsNoPropertyList) {
   decode(packet(kCellMonitorCode).append(Bytes{'x', 'y', 'z'}));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("LTE Serving Cell Info"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("LTE Serving Cell Info"),
                                        errorLine("Cell Info Array data could not be constructed"),
                                        errorLine("Failed to get Cell Array\n")));
 }
@@ -190,14 +190,14 @@ TEST_F(LTEServingCellInfoTest, ReportsAPayloadThatIsNoPropertyList) {
 TEST_F(LTEServingCellInfoTest, ReportsARootThatIsNoArray) {
   decodeList(kCellMonitorCode, servingCell());
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("LTE Serving Cell Info"),
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("LTE Serving Cell Info"),
                                        errorLine("Failed to get Cell Array\n")));
 }
 
 TEST_F(LTEServingCellInfoTest, APacketOfNoMoreThanTheHeaderCarriesNoList) {
   for (const std::size_t size : {11U, 12U, 13U}) {
     decode(packet(kCellMonitorCode).length(size));
-    EXPECT_THAT(takeLines(), ElementsAre(traceLine("LTE Serving Cell Info"),
+    EXPECT_THAT(takeLines(), ElementsAre(warningLine("LTE Serving Cell Info"),
                                          errorLine("Cell Info Array data could not be constructed"),
                                          errorLine("Failed to get Cell Array\n")));
   }

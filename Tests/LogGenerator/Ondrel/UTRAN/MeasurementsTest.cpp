@@ -37,7 +37,7 @@ TEST_F(UTRANNeighborsTest, ShowsANeighbor) {
   EXPECT_THAT(row(0), ElementsAre(Pair("UARFCN", "10167"), Pair("Cell ID", "20"),
                                   Pair("Filter RSCP", "0.503906"), Pair("Status", "ASET"),
                                   Pair("inJDCS", "FALSE")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("NeighbhorMeasurements List")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("NeighbhorMeasurements List")));
 }
 
 TEST_F(UTRANNeighborsTest, ReadsTheWidestFields) {
@@ -115,7 +115,7 @@ TEST_F(UTRANNeighborsTest, NeedsTwentyOneBytes) {
 TEST_F(UTRANNeighborsTest, IgnoresOtherCodesSilently) {
   decode(oneNeighbor().bytes(), 0xD00E);
   EXPECT_THAT(list(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("NeighbhorMeasurements List")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("NeighbhorMeasurements List")));
 }
 
 // --- 0xD00E: GSM neighbours ----------------------------------------------------------------------
@@ -159,7 +159,7 @@ TEST_F(GSMNeighborsTest, IsEmptiedByEveryPacket) {
   list().append("before");
   decode(twoNeighbors());
   EXPECT_THAT(list(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("GSM Neighbor Cell List")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("GSM Neighbor Cell List")));
 }
 
 TEST_F(GSMNeighborsTest, IsEmptiedByACountOfZeroToo) {
@@ -192,7 +192,7 @@ TEST_F(GSMNeighborsTest, IgnoresOtherCodesSilently) {
   list().append("before");
   decode(twoNeighbors().bytes(), 0xD00C);
   EXPECT_THAT(list(), SizeIs(1));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("GSM Neighbor Cell List")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("GSM Neighbor Cell List")));
 }
 
 // --- 0xD00C: transport channels ------------------------------------------------------------------
@@ -291,7 +291,7 @@ TEST_F(CCTRCHSIRTest, ShowsAChannelWithItsSixRatios) {
   EXPECT_THAT(row(0),
               ElementsAre(Pair("CCTRCH ID", "9"), Pair("TSNUM", "6"), Pair("SIR", "(no text)")));
   EXPECT_THAT(sir(0), ElementsAre("1", "2", "3", "4", "5", "255"));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("CCTRCH SIR Measurement")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("CCTRCH SIR Measurement")));
 }
 
 TEST_F(CCTRCHSIRTest, MovesByThirtyFourBytesForEachTransportChannel) {
@@ -332,7 +332,7 @@ TEST_F(CCTRCHSIRTest, NeedsSeventeenBytes) {
 TEST_F(CCTRCHSIRTest, IgnoresOtherCodesSilently) {
   decode(oneOfEach().bytes(), 0xD00E);
   EXPECT_THAT(list(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("CCTRCH SIR Measurement")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("CCTRCH SIR Measurement")));
 }
 
 }  // namespace

@@ -30,7 +30,7 @@ TEST_F(RRCStateTest, HasItsNameAndCode) {
 TEST_F(RRCStateTest, ShowsTheMode) {
   decode(state(1, 3));
   EXPECT_THAT(entries(), ElementsAre(Pair("State", "Cell DCH")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("RRC Info")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("RRC Info")));
   EXPECT_THAT(consoleLines(),
               ElementsAre("Display Dict = { State = \"Cell DCH\"; }, rrc mode = 3 Cell DCH"));
 }
@@ -79,8 +79,8 @@ TEST_F(RRCStateTest, APacketWithoutItsModeIsReportedAndShown) {
   decode(state(1, 0).length(14));
   EXPECT_THAT(entries(), ElementsAre(Pair("State", "Unknown RRC Mode")));
   EXPECT_THAT(takeLines(),
-              ElementsAre(traceLine("RRC Info"),
-                          traceLine("LogCode_0xD0E0 is length is 14 expected size 15")));
+              ElementsAre(warningLine("RRC Info"),
+                          warningLine("LogCode_0xD0E0 is length is 14 expected size 15")));
   EXPECT_EQ(consoleLines().back(),
             "Display Dict = { State = \"Unknown RRC Mode\"; }, rrc mode = 255 Unknown RRC Mode");
 }
@@ -91,9 +91,10 @@ TEST_F(RRCStateTest, NoLengthIsTooShort) {
     takeLines();
     decode(state(1, 3).length(length).bytes(), 0xD0E0);
     EXPECT_EQ(text("State"), "Unknown RRC Mode") << length;
-    EXPECT_THAT(takeLines(), ElementsAre(traceLine("RRC Info"),
-                                         traceLine("LogCode_0xD0E0 is length is " +
-                                                   std::to_string(length) + " expected size 15")));
+    EXPECT_THAT(takeLines(),
+                ElementsAre(warningLine("RRC Info"),
+                            warningLine("LogCode_0xD0E0 is length is " + std::to_string(length) +
+                                        " expected size 15")));
   }
 }
 
@@ -106,7 +107,7 @@ TEST_F(RRCStateTest, TakesLongerPackets) {
 TEST_F(RRCStateTest, IgnoresOtherCodesSilently) {
   decode(state(1, 3).bytes(), 0xD0E1);
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("RRC Info")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("RRC Info")));
   EXPECT_THAT(consoleLines(), IsEmpty());
 }
 

@@ -9,10 +9,6 @@ using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 using ::testing::Pair;
 
-Line missing(const char* what) {
-  return errorLine(std::string("Serving Cell Info: Failed to retrieve ") + what + "\n");
-}
-
 class UTRANServingCellInfoTest : public DecoderFixture<UTRANServingCellInfo> {
  protected:
   static PacketBytes systemInformation() {
@@ -49,7 +45,7 @@ TEST_F(UTRANServingCellInfoTest, ShowsTheSystemInformation) {
               ElementsAre(Pair("Cell Access Restrictions", "17"), Pair("Cell ID", "268435455"),
                           Pair("Downlink UARFCN", "10650"), Pair("Uplink UARFCN", "9700"),
                           Pair("URA ID", "200"), Pair("Allowed Access", "All Calls")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Serving Cell Info")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Serving Cell Info")));
 }
 
 TEST_F(UTRANServingCellInfoTest, ReadsTheWidestValues) {
@@ -75,7 +71,7 @@ TEST_F(UTRANServingCellInfoTest, ReadsTheAllowedAccessFromTheLowestBit) {
 TEST_F(UTRANServingCellInfoTest, NeedsTwentySixBytesOfSystemInformation) {
   decode(systemInformation().length(25));
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Serving Cell Info")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Serving Cell Info")));
 }
 
 TEST_F(UTRANServingCellInfoTest, ShowsTheServingCellOfTheCellMonitor) {
@@ -84,7 +80,7 @@ TEST_F(UTRANServingCellInfoTest, ShowsTheServingCellOfTheCellMonitor) {
               ElementsAre(Pair("Local Area Code", "4321"), Pair("Cell ID", "5"),
                           Pair("Freq Band Indicator", "1"), Pair("Cell Scrambling Code", "77"),
                           Pair("Uplink UARFCN", "10054"), Pair("Downlink UARFCN", "10054")));
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Serving Cell Info")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Serving Cell Info")));
 }
 
 TEST_F(UTRANServingCellInfoTest, TheLastOfSeveralServingCellsRemains) {
@@ -95,7 +91,8 @@ TEST_F(UTRANServingCellInfoTest, TheLastOfSeveralServingCellsRemains) {
   EXPECT_EQ(text("Cell ID"), "6");
   EXPECT_EQ(text("Cell Scrambling Code"), "78");
   EXPECT_EQ(text("Local Area Code"), "4321");
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Serving Cell Info"), missing("LAC")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Serving Cell Info"),
+                                       failedToRetrieve("Serving Cell Info", "LAC")));
 }
 
 TEST_F(UTRANServingCellInfoTest, IgnoresCellsOfAnotherKind) {
@@ -109,7 +106,7 @@ TEST_F(UTRANServingCellInfoTest, IgnoresCellsOfAnotherKind) {
   withoutTechnology.remove("kTqCellMonitorCellRadioAccessTechnology");
   decodeList(kCellMonitorCode, Array{neighbor, other, withoutType, withoutTechnology, "no cell"});
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Serving Cell Info")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Serving Cell Info")));
 }
 
 TEST_F(UTRANServingCellInfoTest, ReportsEveryValueThatItMisses) {
@@ -121,9 +118,13 @@ TEST_F(UTRANServingCellInfoTest, ReportsEveryValueThatItMisses) {
                               {"kTqCellMonitorCellType", "kTqCellMonitorCellTypeServing"},
                               {"kTqCellMonitorLAC", "7"},
                               {"kTqCellMonitorSCN", Value::real(1.5)}}});
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Serving Cell Info"), missing("LAC"),
-                                       missing("Cell ID"), missing("Freq Band Indicator"),
-                                       missing("Cell Scrambling Code"), missing("UARFCN")));
+  EXPECT_THAT(
+      takeLines(),
+      ElementsAre(warningLine("Serving Cell Info"), failedToRetrieve("Serving Cell Info", "LAC"),
+                  failedToRetrieve("Serving Cell Info", "Cell ID"),
+                  failedToRetrieve("Serving Cell Info", "Freq Band Indicator"),
+                  failedToRetrieve("Serving Cell Info", "Cell Scrambling Code"),
+                  failedToRetrieve("Serving Cell Info", "UARFCN")));
   EXPECT_EQ(text("Cell ID"), "268435455");
   EXPECT_EQ(text("Uplink UARFCN"), "9700");
   EXPECT_FALSE(section().contains("Local Area Code"));
@@ -150,8 +151,8 @@ TEST_F(UTRANServingCellInfoTest, ReportsAPayloadThatIsNoPropertyList) {
   decode(packet(kCellMonitorCode).length(20, 0x55));
   decode(packet(kCellMonitorCode));
   const Line unparsable = errorLine("Cell Info Array data could not be constructed");
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Serving Cell Info"), unparsable,
-                                       traceLine("Serving Cell Info"), unparsable));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Serving Cell Info"), unparsable,
+                                       warningLine("Serving Cell Info"), unparsable));
   EXPECT_THAT(entries(), IsEmpty());
 }
 
@@ -160,13 +161,13 @@ TEST_F(UTRANServingCellInfoTest, PassesOverAnEmptyListAndOverARootThatIsNone) {
   decodeList(kCellMonitorCode, servingCell(5));
   EXPECT_THAT(entries(), IsEmpty());
   EXPECT_THAT(takeLines(),
-              ElementsAre(traceLine("Serving Cell Info"), traceLine("Serving Cell Info")));
+              ElementsAre(warningLine("Serving Cell Info"), warningLine("Serving Cell Info")));
 }
 
 TEST_F(UTRANServingCellInfoTest, IgnoresOtherCodesSilently) {
   decode(systemInformation().bytes(), 0xD0E0);
   EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(traceLine("Serving Cell Info")));
+  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Serving Cell Info")));
 }
 
 }  // namespace
