@@ -3,6 +3,8 @@
 
 option(KESTRO_BUILD_TESTS "Build the tests" ON)
 option(KESTRO_BUILD_BENCHMARKS "Build the benchmarks" ON)
+option(KESTRO_UNITY "Compile a library's sources several at a time" OFF)
+option(KESTRO_UNITY_TESTS "Compile a test program's sources several at a time" OFF)
 option(KESTRO_LIBFUZZER "Instrument everything for libFuzzer (clang only)" OFF)
 set(KESTRO_SANITIZERS "" CACHE STRING "Sanitizers to build with, for instance address,undefined")
 
@@ -12,6 +14,10 @@ set(CMAKE_RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/bin)
 
 # Line numbers and names are enough for back traces and profiles, at half the cost of -g.
 set(CMAKE_CXX_FLAGS_RELWITHDEBINFO "-O2 -g1 -DNDEBUG")
+
+# Compiling is mostly reading the same headers again. Sources that are compiled at one time must not
+# give one name to different things, not even in unnamed namespaces.
+set(CMAKE_UNITY_BUILD_BATCH_SIZE 6)
 
 find_program(KESTRO_CCACHE ccache)
 if(KESTRO_CCACHE AND NOT CMAKE_CXX_COMPILER_LAUNCHER)

@@ -4,7 +4,7 @@
 
 # kestro_library(NAME [SOURCES_IN DIR...] [HEADERS FILE...] [LINK ...] [PRIVATE_LINK ...])
 # HEADERS are what others may include; every header of the folders unless given. With the tests
-# (those under sanitizers apart) each of them is compiled on its own.
+# (those under sanitizers apart) it is seen that each of them can be compiled alone.
 function(kestro_library name)
   cmake_parse_arguments(ARG "" "" "SOURCES_IN;HEADERS;LINK;PRIVATE_LINK" ${ARGN})
   set(sources)
@@ -24,6 +24,7 @@ function(kestro_library name)
   else()
     add_library(${name} STATIC ${sources})
     target_link_libraries(${name} PUBLIC KestroOptions ${ARG_LINK} PRIVATE ${ARG_PRIVATE_LINK})
+    set_target_properties(${name} PROPERTIES UNITY_BUILD ${KESTRO_UNITY})
     if(NOT KESTRO_SANITIZERS)  # it takes optimised code
       target_compile_options(${name} PRIVATE $<$<CONFIG:RelWithDebInfo>:-D_FORTIFY_SOURCE=2>)
     endif()
@@ -33,11 +34,16 @@ function(kestro_library name)
   endif()
 endfunction()
 
-# kestro_check_headers(LIBRARY HEADER...): compiles every header alone, with no more in reach than
-# the library gives to those who link it.
+# kestro_check_headers(LIBRARY HEADER...): compiles headers alone, with no more in reach than the
+# library gives to those who link it: those that no source begins with (a header's own source does,
+# see Tests/Structure) and so compiles alone already.
 function(kestro_check_headers library)
   set(units)
   foreach(header IN LISTS ARGN)
+    cmake_path(REPLACE_EXTENSION header LAST_ONLY .cpp OUTPUT_VARIABLE source)
+    if(EXISTS ${source})
+      continue()
+    endif()
     cmake_path(RELATIVE_PATH header BASE_DIRECTORY ${PROJECT_SOURCE_DIR})
     set(unit ${CMAKE_CURRENT_BINARY_DIR}/Headers/${header}.cpp)
     file(CONFIGURE OUTPUT ${unit} CONTENT "#include \"@header@\"\n#include \"@header@\"\n" @ONLY)
@@ -63,6 +69,7 @@ function(kestro_tests name)
   endif()
   add_executable(${name} ${sources})
   target_link_libraries(${name} PRIVATE KestroOptions ${ARG_LINK} GTest::gmock)
+  set_target_properties(${name} PROPERTIES UNITY_BUILD ${KESTRO_UNITY_TESTS})
   # What is tested is optimised; the tests themselves would only take twice as long to compile.
   target_compile_options(${name} PRIVATE -O0)
   set(timeout 120)

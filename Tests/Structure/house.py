@@ -160,3 +160,24 @@ def wrong_arrows(root):
             if fault:
                 faults.append(f"{path}:{number}: {header}: {fault}")
     return faults
+
+
+def headers_not_first(root):
+    """Every header whose own source does not begin with it, each as "source: header". One that its
+    source begins with needs no more to be compiled than it includes itself."""
+    root = pathlib.Path(root)
+    faults = []
+    for path in sources(root):
+        header = str(pathlib.PurePosixPath(path).with_suffix(".h"))
+        if not path.endswith(".cpp") or not (root / header).is_file():
+            continue
+        if next((first for _, first in includes(root / path)), None) != header:
+            faults.append(f"{path}: {header}")
+    return faults
+
+
+def headers_without_guard(root):
+    """Every header that may be included twice with effect."""
+    root = pathlib.Path(root)
+    return [path for path in sources(root) if path.endswith(".h")
+            and "#pragma once" not in (root / path).read_text(encoding="utf-8").splitlines()]

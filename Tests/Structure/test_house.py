@@ -14,6 +14,12 @@ class Tree(unittest.TestCase):
     def test_every_include_follows_the_house(self):
         self.assertEqual(house.wrong_arrows(ROOT), [])
 
+    def test_every_source_begins_with_its_own_header(self):
+        self.assertEqual(house.headers_not_first(ROOT), [])
+
+    def test_every_header_is_taken_once(self):
+        self.assertEqual(house.headers_without_guard(ROOT), [])
+
     def test_the_check_reads_the_sources(self):
         found = list(house.sources(ROOT))
         self.assertIn("Platform/PropertyList.cpp", found)
@@ -135,6 +141,27 @@ class Check(unittest.TestCase):
             '"Tree.h"',
             "neither a path from the root nor a library that the house knows",
         )
+
+    def test_a_source_that_begins_otherwise_is_found(self):
+        self.write("Platform/Clock.cpp", "<chrono>", '"Platform/Clock.h"')
+        self.assertEqual(house.headers_not_first(self.root),
+                         ["Platform/Clock.cpp: Platform/Clock.h"])
+
+    def test_a_source_that_leaves_its_header_out_is_found(self):
+        self.write("Platform/Clock.cpp")
+        self.assertEqual(house.headers_not_first(self.root),
+                         ["Platform/Clock.cpp: Platform/Clock.h"])
+
+    def test_a_source_without_a_header_may_begin_as_it_likes(self):
+        self.write("Platform/Linux/main.cpp", "<chrono>")
+        self.write("Platform/Clock.cpp", '"Platform/Clock.h"', "<chrono>")
+        self.assertEqual(house.headers_not_first(self.root), [])
+
+    def test_a_header_that_may_be_taken_twice_is_found(self):
+        for header in self.root.rglob("*.h"):
+            header.write_text("#pragma once\n", encoding="utf-8")
+        self.write("Platform/Clock.h", "<chrono>")
+        self.assertEqual(house.headers_without_guard(self.root), ["Platform/Clock.h"])
 
     def test_a_source_in_an_unknown_folder_is_refused(self):
         self.write("Cellar/A.cpp")
