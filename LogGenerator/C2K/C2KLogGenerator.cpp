@@ -13,16 +13,14 @@
 #include "LogGenerator/C2K/OneXStatus.h"
 #include "LogGenerator/C2K/OneXSystemParameters.h"
 #include "LogGenerator/DisplayKeys.h"
+#include "LogGenerator/DisplayTemplate.h"
 #include "LogGenerator/Packets/PacketHeader.h"
-#include "Platform/Bundle.h"
-#include "Platform/PropertyListCoding.h"
 #include "Platform/SystemLog.h"
 
 namespace kestro {
 namespace {
 
 constexpr std::string_view kTemplateName = "C2KTemplate";
-constexpr std::string_view kTemplateExtension = "plist";
 
 std::vector<std::unique_ptr<C2KParser>> makeParsers() {
   std::vector<std::unique_ptr<C2KParser>> parsers;
@@ -176,7 +174,7 @@ Value C2KLogGenerator::generateLogUsingState(Dictionary& state) {
 Value C2KLogGenerator::getDisplayFromState(Dictionary& state) {
   const Value& known = _displayKey.in(state);
   if (!known.isNull()) return known;
-  const Value displayTemplate = templateOfState(state);
+  const Value displayTemplate = templateOfState(platform(), kTemplateName, state);
   if (displayTemplate.isNull()) {
     platform().systemLog().write(LogPriority::Error, "Cannot load C2K template for display");
     return {};
@@ -209,23 +207,8 @@ void C2KLogGenerator::processTemplateStoreDisplayIntoDictStoreLookupIntoDict(
   platform().systemLog().write(LogPriority::Warning, "Processing the template");
 }
 
-Value C2KLogGenerator::templateOfState(Dictionary& state) {
-  Value known = state[kStateTemplate];
-  if (!known.isNull()) return known;
-  Value loaded = loadTemplate();
-  if (!loaded.isNull()) state.set(kStateTemplate, loaded);
-  return loaded;
-}
-
-Value C2KLogGenerator::loadTemplate() const {
-  const auto contents = platform().bundle().resource(kTemplateName, kTemplateExtension);
-  if (!contents) return {};
-  Result<Value> parsed = platform().propertyListCoding().parse(*contents);
-  return parsed && parsed->isDictionary() ? *parsed : Value();
-}
-
 const TemplatePlaces& C2KLogGenerator::places() const {
-  if (!_places) _places.emplace(loadTemplate().dictionary());
+  if (!_places) _places.emplace(loadTemplate(platform(), kTemplateName).dictionary());
   return *_places;
 }
 

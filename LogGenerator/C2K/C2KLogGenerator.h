@@ -50,8 +50,6 @@ class C2KLogGenerator : public OndrelLogGenerator {
 
  private:
   [[nodiscard]] C2KParser* parserOf(LogCode code) const noexcept;
-  [[nodiscard]] Value templateOfState(Dictionary& state);
-  [[nodiscard]] Value loadTemplate() const;
   /// Where the resource's template shows values, whatever template the state holds.
   [[nodiscard]] const TemplatePlaces& places() const;
 

@@ -19,7 +19,7 @@ constexpr Place kDeviceState = u8(36);
 /// In earlier states there is no transmitter and no second receiver.
 constexpr Condition kHasAccess = between(kDeviceState, 4, 255);
 
-constexpr Field kFields[] = {
+constexpr Field kEVDOStatusFields[] = {
     {"kChannel", u16(13).bits(0, 10), decimal()},
     {"k1xEVDODeviceState", kDeviceState, namedElse(kDeviceStates, "[Reserved %d]")},
     {"kBandClass", u8(14).bits(3, 7), bandClass()},
@@ -31,12 +31,12 @@ constexpr Field kFields[] = {
     {"kUATI24", u24(38), decimal("0x%06x")},
     {"kColorCode", u8(41), decimal()},
 };
-static_assert(isLayout(kFields));
+static_assert(isLayout(kEVDOStatusFields));
 
 }  // namespace
 
 constinit const PacketReading kEVDOStatusReading = {
-    .code = 0x1183, .packetName = "EV-DO status", .minimumLength = 50, .fields = kFields};
+    .code = 0x1183, .packetName = "EV-DO status", .minimumLength = 50, .fields = kEVDOStatusFields};
 
 void EVDOStatus::parse(PacketView packet, C2KOutput& output) {
   if (!hasRightLength(packet)) {

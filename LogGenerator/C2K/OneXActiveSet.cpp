@@ -15,7 +15,7 @@ constexpr Place kPilotCount = u8(8);
 constexpr Place kPerPilotCount = u8(9);
 constexpr Place kReferencePN = u16(10);
 
-constexpr Field kFields[] = {
+constexpr Field kActiveSetFields[] = {
     {"Accumulation Length", kAccumulationLength, hidden()},
     {"Energy Factor", kFactor, hidden()},
     {"Energy Exponent", kExponent, hidden()},
@@ -23,7 +23,7 @@ constexpr Field kFields[] = {
     {"Values per Pilot", kPerPilotCount, hidden()},
     {"Reference PN Offset", kReferencePN, hidden()},
 };
-static_assert(isLayout(kFields));
+static_assert(isLayout(kActiveSetFields));
 
 /// A pilot's record: so many bytes, and so many for each of its values before the energy, then
 /// filled up to a multiple of the alignment.
@@ -37,7 +37,7 @@ constexpr double kWeakestEnergy = 0.00001;
 
 }  // namespace
 
-constinit const std::span<const Field> kOneXActiveSetFields = kFields;
+constinit const std::span<const Field> kOneXActiveSetFields = kActiveSetFields;
 
 OneXActiveSet::OneXActiveSet(PacketView packet, std::size_t start)
     : _packet(packet),
@@ -89,7 +89,7 @@ void OneXActiveSet::addTo(PilotList& list) const {
 void OneXActiveSet::explain(std::string_view section, std::string_view list,
                             const ExplainVisitor& visit) const {
   const Explainer explainer(section, _packet, visit);
-  explainer.fields(kFields, _position);
+  explainer.fields(kActiveSetFields, _position);
   for (std::size_t i = 0; i < _pilotCount; ++i) {
     explainPilot(explainer, {.section = section, .list = list, .row = i, .key = {}}, visit);
   }

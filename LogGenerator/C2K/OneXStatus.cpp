@@ -23,13 +23,13 @@ constexpr NamedValue kStateNames[] = {
     {11, "Powerup state [11]"},
 };
 
-constexpr Place kState = u8(4).ofTwin();
-constexpr Condition kInTraffic = equals(kState, 8);
+constexpr Place kOneXState = u8(4).ofTwin();
+constexpr Condition kInTraffic = equals(kOneXState, 8);
 
 constexpr TextRule receivePower() { return scaled(0.334, -63.248, "%+.2f dBm"); }
 
-constexpr Field kFields[] = {
-    {"k1xDeviceState", kState, namedElse(kStateNames, "[Bad Value %d]")},
+constexpr Field kOneXFields[] = {
+    {"k1xDeviceState", kOneXState, namedElse(kStateNames, "[Bad Value %d]")},
     {"k1xRx0BandClass", u8(4), bandClass()},
     {"k1xRx0ChanNum", u16(6), decimal()},
     {"k1xRxAGC0", s8(10), receivePower()},
@@ -40,7 +40,7 @@ constexpr Field kFields[] = {
         .when(kInTraffic)
         .elseText(kNotAvailable),
 };
-static_assert(isLayout(kFields));
+static_assert(isLayout(kOneXFields));
 
 constexpr std::string_view kActiveSetName = "k1xActiveSetInfo";
 
@@ -52,17 +52,17 @@ constexpr std::string_view kFromEarlierPackets = "(from the packets before)";
 constinit const PacketReading kOneXStatusReading = {
     .code = 0x119C, .packetName = "1x status", .minimumLength = 17};
 
-constinit const std::span<const Field> kOneXStatusFields = kFields;
+constinit const std::span<const Field> kOneXStatusFields = kOneXFields;
 
 OneXStatus::OneXStatus()
     : C2KParser(kOneXStatusReading),
-      _fields(kFields),
+      _fields(kOneXFields),
       _activeSet(kActiveSetName),
       _errorRate(kFrameErrorRateName) {}
 
 std::vector<std::string_view> OneXStatus::lookupNames() const {
   std::vector<std::string_view> names;
-  for (const Field& field : kFields) names.push_back(field.key);
+  for (const Field& field : kOneXFields) names.push_back(field.key);
   names.push_back(kActiveSetName);
   names.push_back(kFrameErrorRateName);
   return names;
@@ -103,12 +103,12 @@ void OneXStatus::explain(PacketView packet, const ExplainVisitor& visit) const {
   if (!found.areComplete()) return;
   const std::string_view section = reading().packetName;
   const Explainer explainer(section, packet, visit);
-  explainer.fields(kFields, found.position());
+  explainer.fields(kOneXFields, found.position());
   OneXActiveSet(packet, *found.activeSet).explain(section, kActiveSetName, visit);
   if (holds(kInTraffic, packet, found.position())) return;
   visit({.section = section,
          .key = kFrameErrorRateName,
-         .sources = {explainer.source(kState, found.position())},
+         .sources = {explainer.source(kOneXState, found.position())},
          .text = kFromEarlierPackets});
 }
 

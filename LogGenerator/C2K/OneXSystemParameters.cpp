@@ -36,7 +36,7 @@ void writeIdentity(std::span<const std::int64_t> raw, TextBuffer& text) {
 }
 
 // The base station's identity lies past the minimum length.
-constexpr Field kFields[] = {
+constexpr Field kSystemParametersFields[] = {
     {"Version", kVersion, hidden()},
     {"k1xRoamingHome", s32(42), namedElse(kRoamingIndicators, "ERI - %d")},
     {"kSystemId", {kSystemType, u16(50)}, computed(writeIdentity)},
@@ -45,14 +45,16 @@ constexpr Field kFields[] = {
     {"kBaseId", u16(184), decimal()},
     {"kProtocolRevision", u8(133), decimal()},
 };
-static_assert(isLayout(kFields));
+static_assert(isLayout(kSystemParametersFields));
 
 std::int64_t versionOf(PacketView packet) { return readNumber(kVersion, packet, {}); }
 
 }  // namespace
 
-constinit const PacketReading kOneXSystemParametersReading = {
-    .code = 0x134F, .packetName = "1x system parameters", .minimumLength = 171, .fields = kFields};
+constinit const PacketReading kOneXSystemParametersReading = {.code = 0x134F,
+                                                              .packetName = "1x system parameters",
+                                                              .minimumLength = 171,
+                                                              .fields = kSystemParametersFields};
 
 void OneXSystemParameters::parse(PacketView packet, C2KOutput& output) {
   if (!isLongEnough(packet, output.log)) return;

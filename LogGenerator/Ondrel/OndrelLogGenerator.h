@@ -8,9 +8,6 @@
 
 namespace kestro {
 
-/// The state's key of the display template, once it was loaded.
-inline constexpr std::string_view kStateTemplate = "Template";
-
 /// Keys and texts of the element that save contents gain for the DLF log.
 inline constexpr std::string_view kSaveContentsDlf = "DLF";
 

@@ -4,15 +4,12 @@
 #include <array>
 #include <charconv>
 
+#include "LogGenerator/DisplayTemplate.h"
 #include "LogGenerator/Packets/PacketHeader.h"
-#include "Platform/Bundle.h"
-#include "Platform/PropertyListCoding.h"
 #include "Platform/SystemLog.h"
 
 namespace kestro {
 namespace {
-
-constexpr std::string_view kTemplateExtension = "plist";
 
 LogCode codeOfKey(std::string_view key) {
   LogCode code = 0;
@@ -133,7 +130,7 @@ Value OndrelLogGenerator2::getDisplayFromState(Dictionary& state) {
 }
 
 void OndrelLogGenerator2::buildDisplay(Dictionary& state) {
-  const Value displayTemplate = templateOfState(state);
+  const Value displayTemplate = templateOfState(platform(), _pListName, state);
   if (displayTemplate.isNull()) {
     platform().systemLog().write(LogPriority::Error, "Cannot load template for display");
     return;
@@ -148,25 +145,10 @@ void OndrelLogGenerator2::buildDisplay(Dictionary& state) {
   _boundDisplay = WeakValue(display);
 }
 
-Value OndrelLogGenerator2::templateOfState(Dictionary& state) {
-  Value known = state[kStateTemplate];
-  if (!known.isNull()) return known;
-  Value loaded = loadTemplate();
-  if (!loaded.isNull()) state.set(kStateTemplate, loaded);
-  return loaded;
-}
-
-Value OndrelLogGenerator2::loadTemplate() const {
-  const auto contents = platform().bundle().resource(_pListName, kTemplateExtension);
-  if (!contents) return {};
-  Result<Value> parsed = platform().propertyListCoding().parse(*contents);
-  return parsed && parsed->isDictionary() ? *parsed : Value();
-}
-
 const OndrelLogGenerator2::SectionGroups& OndrelLogGenerator2::sectionGroups() const {
   if (_sectionGroups) return *_sectionGroups;
   _sectionGroups.emplace();
-  for (const auto& [group, sections] : loadTemplate().dictionary()) {
+  for (const auto& [group, sections] : loadTemplate(platform(), _pListName).dictionary()) {
     if (!group.isText()) continue;
     for (const auto& [section, value] : sections.dictionary()) {
       if (decoderOf(section) == nullptr) continue;

@@ -54,9 +54,6 @@ class OndrelLogGenerator2 : public OndrelLogGenerator {
   using SectionGroups = std::map<std::string, std::string, std::less<>>;
 
   [[nodiscard]] Value processDictionary(const Dictionary& dictionary);
-  /// The state's template, loaded from the resource on first use; null when that fails.
-  [[nodiscard]] Value templateOfState(Dictionary& state);
-  [[nodiscard]] Value loadTemplate() const;
   /// The outermost groups of the resource's template by the sections in them, whatever template
   /// the state holds.
   [[nodiscard]] const SectionGroups& sectionGroups() const;

@@ -23,15 +23,12 @@ constexpr double kFastest = 3.072e6;
 constexpr double kSlowest = 38'400;
 constexpr double kFastestReverse = 1.8432e6;
 
-std::vector<unsigned> allSites() {
-  std::vector<unsigned> sites;
-  for (unsigned site = 0; site < RingRoad::kSites; ++site) sites.push_back(site);
-  return sites;
-}
-
 /// A part of each sector's power is its pilot.
 CdmaCarrier::Parameters oneXParameters(std::uint64_t seed) {
-  return {.radio = {.seed = hashed(seed, 31), .frequency = 881, .power = 44, .sites = allSites()},
+  return {.radio = {.seed = hashed(seed, 31),
+                    .frequency = 881,
+                    .power = 44,
+                    .sites = RingRoad::allSites()},
           .channel = {.bandClass = 0, .number = 283},
           .traffic = 5.5,
           .hysteresis = 3};
@@ -39,7 +36,10 @@ CdmaCarrier::Parameters oneXParameters(std::uint64_t seed) {
 
 /// Pilots come in bursts of full power.
 CdmaCarrier::Parameters evdoParameters(std::uint64_t seed) {
-  return {.radio = {.seed = hashed(seed, 32), .frequency = 881, .power = 50, .sites = allSites()},
+  return {.radio = {.seed = hashed(seed, 32),
+                    .frequency = 881,
+                    .power = 50,
+                    .sites = RingRoad::allSites()},
           .channel = {.bandClass = 0, .number = 201},
           .traffic = 0,
           .hysteresis = 2};

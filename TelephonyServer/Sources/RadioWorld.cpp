@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <cmath>
 #include <numbers>
+#include <numeric>
 #include <utility>
 
 namespace kestro {
@@ -37,6 +38,12 @@ double sectorLoss(double angle) {
 }
 
 }  // namespace
+
+std::vector<unsigned> RingRoad::allSites() {
+  std::vector<unsigned> sites(kSites);
+  std::iota(sites.begin(), sites.end(), 0U);
+  return sites;
+}
 
 Location RingRoad::locationAt(double distance) noexcept {
   return onCircle(kRadius, distance / kLength * kTurn);

@@ -23,6 +23,8 @@ struct RingRoad {
   static constexpr double kLength = 24'000;  ///< metres
   static constexpr unsigned kSites = 16;     ///< masts beside it, at even distances
 
+  /// The numbers of all masts.
+  [[nodiscard]] static std::vector<unsigned> allSites();
   /// The place `distance` metres along the road.
   [[nodiscard]] static Location locationAt(double distance) noexcept;
   /// Where mast number `site` stands, a little off the road.

@@ -27,12 +27,6 @@ std::vector<unsigned> sitesWithUmts() {
   return sites;
 }
 
-std::vector<unsigned> allSites() {
-  std::vector<unsigned> sites;
-  for (unsigned site = 0; site < RingRoad::kSites; ++site) sites.push_back(site);
-  return sites;
-}
-
 RadioLayerParameters umtsParameters(std::uint64_t seed) {
   return {.seed = hashed(seed, 1), .frequency = 2100, .power = 44, .sites = sitesWithUmts()};
 }
@@ -42,7 +36,7 @@ RadioLayerParameters gsmParameters(std::uint64_t seed) {
           .frequency = 900,
           .power = 47,
           .shadowDeviation = 5,
-          .sites = allSites()};
+          .sites = RingRoad::allSites()};
 }
 
 /// What a cell of this quality can carry, kbit/s.

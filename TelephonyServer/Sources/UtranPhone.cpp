@@ -35,14 +35,8 @@ constexpr unsigned kCommonTimeslot = 0;
 constexpr unsigned kSignallingTimeslot = 4;
 constexpr unsigned kDataTimeslot = 5;
 
-std::vector<unsigned> allSites() {
-  std::vector<unsigned> sites;
-  for (unsigned site = 0; site < RingRoad::kSites; ++site) sites.push_back(site);
-  return sites;
-}
-
 RadioLayerParameters radioParameters(std::uint64_t seed) {
-  return {.seed = hashed(seed, 21), .frequency = 2012, .power = 44, .sites = allSites()};
+  return {.seed = hashed(seed, 21), .frequency = 2012, .power = 44, .sites = RingRoad::allSites()};
 }
 
 RadioLayerParameters gsmParameters(std::uint64_t seed) {
@@ -50,7 +44,7 @@ RadioLayerParameters gsmParameters(std::uint64_t seed) {
           .frequency = 900,
           .power = 47,
           .shadowDeviation = 5,
-          .sites = allSites()};
+          .sites = RingRoad::allSites()};
 }
 
 /// Of a channel that is received so well.

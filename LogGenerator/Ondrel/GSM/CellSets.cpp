@@ -96,7 +96,7 @@ constexpr Section setSection(std::string_view name, std::string_view logLine,
 
 static_assert(isLayout(IdleModeRanking::kCounts));
 
-constexpr Field kRankedCell[] = {
+constexpr Field kRankedUMTSCell[] = {
     {"Downlink Frequency", s16(0), decimal()},
     {"Scrambling Code", u16(2), decimal()},
     {"RSCP", s8(4), decimal("%d dB", -21)},
@@ -104,27 +104,27 @@ constexpr Field kRankedCell[] = {
     {"Energy Per Chip", s8(7), scaled(0.5, 0, "%f dB")},
     {"Ranking Value", s16(8), decimal()},
 };
-static_assert(isLayout(kRankedCell));
+static_assert(isLayout(kRankedUMTSCell));
 
-constexpr ListReading kRankedCells[] = {{.table = {
-                                             .name = "UMTS cell",
-                                             .count = IdleModeRanking::kUMTSCellCount,
-                                             .base = IdleModeRanking::kFirstCell,
-                                             .stride = 10,
-                                             .fields = kRankedCell,
-                                         }}};
+constexpr ListReading kRankedUMTSCells[] = {{.table = {
+                                                 .name = "UMTS cell",
+                                                 .count = IdleModeRanking::kUMTSCellCount,
+                                                 .base = IdleModeRanking::kFirstCell,
+                                                 .stride = 10,
+                                                 .fields = kRankedUMTSCell,
+                                             }}};
 
 constexpr PacketReading kUMTSSetReadings[] = {
     {.code = IdleModeRanking::kCode,
      .packetName = IdleModeRanking::kName,
      .minimumLength = IdleModeRanking::kMinimumLength,
      .fields = IdleModeRanking::kCounts,
-     .lists = kRankedCells},
+     .lists = kRankedUMTSCells},
 };
 
 // --- The cell monitor's UMTS neighbours ----------------------------------------------------------
 
-constexpr ListedValue kNeighbourValues[] = {
+constexpr ListedValue kUMTSNeighbourValues[] = {
     {.listKey = kTqCellMonitorUARFCN,
      .key = "UARFCN",
      .text = decimal(),
@@ -149,7 +149,7 @@ constexpr PropertyListReading kNeighbours = {
     .part = ListedPart::EachCell,
     .cells = {.technologies = {kTqCellMonitorRadioAccessTechnologyUMTS},
               .type = kTqCellMonitorCellTypeNeighbor},
-    .values = kNeighbourValues,
+    .values = kUMTSNeighbourValues,
     .missingListLine = kMissingCellArrayLine,
 };
 

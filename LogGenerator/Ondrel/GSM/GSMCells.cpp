@@ -78,21 +78,21 @@ static_assert(isLayout(kDedicatedChannel));
 
 // --- 0x4005: idle-mode cell ranking, at least 15 bytes -------------------------------------------
 
-constexpr Field kRankedCell[] = {
+constexpr Field kRankedGSMCell[] = {
     {"ARFCN", u16(0), decimal()},
     {"BSIC", u16(2), decimal()},
     {"RSSI", s8(4), decimal("%d dBm")},
     {"Ranking Value", s16(5), decimal()},
 };
-static_assert(isLayout(kRankedCell));
+static_assert(isLayout(kRankedGSMCell));
 
-constexpr ListReading kRankedCells[] = {{.table = {
-                                             .name = "GSM cell",
-                                             .count = IdleModeRanking::kGSMCellCount,
-                                             .base = IdleModeRanking::kFirstCell,
-                                             .stride = 7,
-                                             .fields = kRankedCell,
-                                         }}};
+constexpr ListReading kRankedGSMCells[] = {{.table = {
+                                                .name = "GSM cell",
+                                                .count = IdleModeRanking::kGSMCellCount,
+                                                .base = IdleModeRanking::kFirstCell,
+                                                .stride = 7,
+                                                .fields = kRankedGSMCell,
+                                            }}};
 
 // --- 0x51F8: mobile allocation, at least 15 bytes ------------------------------------------------
 
@@ -113,7 +113,7 @@ constexpr ListReading kFrequencies[] = {{
 
 // --- The cell monitor's GSM cells ----------------------------------------------------------------
 
-constexpr ListedValue kServingCellValues[] = {
+constexpr ListedValue kGSMServingCellValues[] = {
     {.listKey = kTqCellMonitorCellId,
      .key = "Cell ID",
      .text = decimal(),
@@ -130,12 +130,12 @@ constexpr PropertyListReading kListedServingCell = {
     .part = ListedPart::FirstCell,
     .cells = {.technologies = {kTqCellMonitorRadioAccessTechnologyGSM},
               .type = kTqCellMonitorCellTypeServing},
-    .values = kServingCellValues,
+    .values = kGSMServingCellValues,
     .missingListLine = kMissingCellArrayLine,
 };
 
 // The list has half the level.
-constexpr ListedValue kNeighbourValues[] = {
+constexpr ListedValue kGSMNeighbourValues[] = {
     {.listKey = kTqCellMonitorARFCN,
      .key = "ARFCN",
      .text = decimal(),
@@ -152,7 +152,7 @@ constexpr PropertyListReading kListedNeighbours = {
     .part = ListedPart::EachCell,
     .cells = {.technologies = {kTqCellMonitorRadioAccessTechnologyGSM},
               .type = kTqCellMonitorCellTypeNeighbor},
-    .values = kNeighbourValues,
+    .values = kGSMNeighbourValues,
     .missingListLine = kMissingCellArrayLine,
 };
 
@@ -193,7 +193,7 @@ constexpr PacketReading kGSMSetReadings[] = {
      .packetName = IdleModeRanking::kName,
      .minimumLength = IdleModeRanking::kMinimumLength,
      .fields = IdleModeRanking::kCounts,
-     .lists = kRankedCells},
+     .lists = kRankedGSMCells},
 };
 constexpr auto kGSMSetCodes = codesOf(kGSMSetReadings);
 

@@ -168,7 +168,7 @@ constexpr ListReading kEquivalentPLMNs[] = {{.table = {
 
 // --- The cell monitor's serving cell -------------------------------------------------------------
 
-constexpr ListedValue kServingCellValues[] = {
+constexpr ListedValue kServingPLMNValues[] = {
     {.listKey = kTqCellMonitorMCC,
      .key = "Mobile Country Code",
      .text = decimal(),
@@ -183,14 +183,14 @@ constexpr ListedValue kServingCellValues[] = {
      .failureLine = "ServingPLMN: Failed to retrieve LAC\n"},
 };
 
-constexpr PropertyListReading kServingCell = {
+constexpr PropertyListReading kServingPLMNOfMonitor = {
     .code = kCellMonitorCode,
     .packetName = kCellMonitorListName,
     .part = ListedPart::FirstCell,
     .cells = {.technologies = {kTqCellMonitorRadioAccessTechnologyUMTS,
                                kTqCellMonitorRadioAccessTechnologyGSM},
               .type = kTqCellMonitorCellTypeServing},
-    .values = kServingCellValues,
+    .values = kServingPLMNValues,
     .missingListLine = kMissingCellArrayLine,
 };
 
@@ -271,7 +271,7 @@ constexpr Section kServingPLMNSection = {
     .kind = SectionKind::Dictionary,
     .readings = kServingPLMNReadings,
     .codes = kServingPLMNCodes,
-    .propertyList = &kServingCell,
+    .propertyList = &kServingPLMNOfMonitor,
 };
 
 constexpr Section kEquivalentPLMNListSection = {

@@ -34,13 +34,13 @@ constexpr NamedValue kRRStates[] = {
     {21, "RR_W2G_INTERRAT_CC_ORDER_ PROGRESS"},
 };
 
-constexpr Field kState[] = {
+constexpr Field kRRState[] = {
     {"RR State", u8(13), named(kRRStates, "Unknown")},
     {"RR Sub State", u8(14), decimal()},
     {"RR Status", u8(15), decimal()},
     {"RR Mode", u8(16), decimal()},
 };
-static_assert(isLayout(kState));
+static_assert(isLayout(kRRState));
 
 // --- 0x51F6: discontinuous reception, at least 24 bytes ------------------------------------------
 
@@ -63,8 +63,8 @@ constexpr Field kServingMeasurements[] = {
 };
 static_assert(isLayout(kServingMeasurements));
 
-constexpr PacketReading kReadings[] = {
-    {.code = 0x512C, .packetName = "RR state", .minimumLength = 17, .fields = kState},
+constexpr PacketReading kRRReadings[] = {
+    {.code = 0x512C, .packetName = "RR state", .minimumLength = 17, .fields = kRRState},
     {.code = GSMMeasurements::kCode,
      .packetName = GSMMeasurements::kName,
      .minimumLength = GSMMeasurements::kMinimumLength,
@@ -78,7 +78,7 @@ constexpr PacketReading kReadings[] = {
      .minimumLength = 24,
      .fields = kDiscontinuousReception},
 };
-constexpr auto kCodes = codesOf(kReadings);
+constexpr auto kRRCodes = codesOf(kRRReadings);
 
 }  // namespace
 
@@ -86,8 +86,8 @@ constexpr Section kGSMRRInfoSection = {
     .name = "GSM RR Info",
     .logLine = "GSMRRInfo",
     .kind = SectionKind::Dictionary,
-    .readings = kReadings,
-    .codes = kCodes,
+    .readings = kRRReadings,
+    .codes = kRRCodes,
 };
 
 }  // namespace kestro

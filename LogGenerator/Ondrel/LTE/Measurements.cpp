@@ -10,7 +10,7 @@ namespace {
 constexpr std::string_view kPhysicalCellId = "Physical Cell ID";
 constexpr std::string_view kNotPresent = "Not Present";
 
-constexpr NamedValue kFlagNames[] = {{0, "False"}, {1, "True"}};
+constexpr NamedValue kTrueFalse[] = {{0, "False"}, {1, "True"}};
 
 // Levels come in steps of 1/4 or 1/2 dB, qualities in steps of 1/8 or 1/4 dB.
 constexpr TextRule quarterDbm() { return scaled(0.25, -140, "%4.2f dBm"); }
@@ -83,7 +83,7 @@ constexpr PacketReading kDetectedCellsReading = intraFrequency({}, kDetectedCell
 
 // --- 0xB17F: serving-cell measurement ------------------------------------------------------------
 
-constexpr Field kServingCell[] = {
+constexpr Field kServingCellMeasurement[] = {
     {"Version", u8(13), decimal()},
     {"E-ARFCN", u16(17), decimal()},
     {kPhysicalCellId, u16(19).bits(0, 8), decimal()},
@@ -101,16 +101,16 @@ constexpr Field kServingCell[] = {
     {"Num of Consecutive DRX Cycles of S < 0", u32(29).bits(7, 12), decimal()},
     {"S Intra Search", u32(29).bits(13, 18), decimal("%d dB", 0, 2).absentAt(32, kNotPresent)},
     {"S Non Intra Search", u32(29).bits(19, 24), decimal("%d dBm", 0, 2).absentAt(32, kNotPresent)},
-    {"Measurement Rules Updated", u32(29).bit(25), named(kFlagNames, "True")},
+    {"Measurement Rules Updated", u32(29).bit(25), named(kTrueFalse, "True")},
     {"Measurement Rules", u32(29).bits(26, 29), decimal()},
 };
-static_assert(isLayout(kServingCell));
+static_assert(isLayout(kServingCellMeasurement));
 
 constexpr PacketReading kServingCellReading = {
     .code = kLteServingCellCode,
     .packetName = "LTE serving-cell measurement",
     .minimumLength = 33,
-    .fields = kServingCell,
+    .fields = kServingCellMeasurement,
 };
 
 // --- 0xB180: neighbour measurements: a header and 1 to 32 records --------------------------------

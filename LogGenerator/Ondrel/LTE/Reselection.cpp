@@ -13,7 +13,7 @@ constexpr Field kHeader[] = {
 };
 static_assert(isLayout(kHeader));
 
-constexpr NamedValue kTechnologyNames[] = {
+constexpr NamedValue kCandidateTechnologies[] = {
     {0, "LTE"}, {1, "UTRAN"}, {2, "GERAN"}, {3, "CDMA1XRTT"}, {4, "CDMAHRPD"},
 };
 
@@ -25,7 +25,7 @@ constexpr Condition kIsCdma = between(kTechnology, 3, 4);
 
 constexpr Field kCandidate[] = {
     {"Candidate Priority", u16(0), decimal()},
-    {"Candidate RAT Type", kTechnology, named(kTechnologyNames, "??")},
+    {"Candidate RAT Type", kTechnology, named(kCandidateTechnologies, "??")},
     Field{"E ARFCN", u16(4), decimal()}.when(kIsLte),
     Field{"Cell ID", u16(6).bits(7, 15), decimal()}.when(kIsLte),
     Field{"U ARFCN", u16(4), decimal()}.when(kIsUtran),

@@ -9,7 +9,7 @@ constexpr NamedValue kBandwidths[] = {
     {6, "1.4 MHz"}, {15, "3 MHz"}, {25, "5 MHz"}, {50, "10 MHz"}, {75, "15 MHz"}, {100, "20 MHz"},
 };
 
-constexpr Field kSystemInformation[] = {
+constexpr Field kLTESystemInformation[] = {
     {"Physical Cell ID", u16(14), decimal()},
     {"Download Frequency", u16(16), decimal()},
     {"Upload Frequency", u16(18), decimal()},
@@ -20,14 +20,14 @@ constexpr Field kSystemInformation[] = {
     {"Tracking Area Code", u16(26), decimal()},
     {"Freq Band Indicator", u32(28), decimal()},
 };
-static_assert(isLayout(kSystemInformation));
+static_assert(isLayout(kLTESystemInformation));
 
 constexpr Field kAntennas[] = {
     {"Num Tx Antennas", u8(20), decimal()},
 };
 static_assert(isLayout(kAntennas));
 
-constexpr ListedValue kServingCellValues[] = {
+constexpr ListedValue kLTEServingCellValues[] = {
     {kTqCellMonitorTAC, "Tracking Area Code", decimal(),
      "Serving Cell Info: Failed to retrieve TAC\n"},
     {kTqCellMonitorCellId, "Cell Identity", decimal(),
@@ -44,21 +44,21 @@ constexpr PropertyListReading kCellMonitor = {
     .packetName = kCellMonitorListName,
     .part = ListedPart::FirstCell,
     .cells = {{kTqCellMonitorRadioAccessTechnologyLTE}, kTqCellMonitorCellTypeServing},
-    .values = kServingCellValues,
+    .values = kLTEServingCellValues,
     .missingListLine = kMissingCellArrayLine,
 };
 
-constexpr PacketReading kReadings[] = {
+constexpr PacketReading kLTEReadings[] = {
     {.code = kLteSystemInformationCode,
      .packetName = "LTE serving-cell system information",
      .minimumLength = 38,
-     .fields = kSystemInformation},
+     .fields = kLTESystemInformation},
     {.code = kLteAntennasCode,
      .packetName = "LTE transmit antennas",
      .minimumLength = 22,
      .fields = kAntennas},
 };
-constexpr auto kCodes = codesOf(kReadings, kCellMonitorCode);
+constexpr auto kLTECodes = codesOf(kLTEReadings, kCellMonitorCode);
 
 }  // namespace
 
@@ -66,8 +66,8 @@ constinit const Section kLTEServingCellInfoSection = {
     .name = "Serving Cell Info",
     .logLine = "LTE Serving Cell Info",
     .kind = SectionKind::Dictionary,
-    .readings = kReadings,
-    .codes = kCodes,
+    .readings = kLTEReadings,
+    .codes = kLTECodes,
     .propertyList = &kCellMonitor,
 };
 

@@ -7,7 +7,7 @@ namespace {
 // --- 0xD00A: UTRAN neighbours, at least 21 bytes; the records stand far behind -------------------
 
 constexpr NamedValue kSetNames[] = {{0, "ASET"}, {1, "MSET"}, {2, "DSET"}};
-constexpr NamedValue kFlagNames[] = {{0, "FALSE"}, {1, "TRUE"}};
+constexpr NamedValue kJDCSNames[] = {{0, "FALSE"}, {1, "TRUE"}};
 
 constexpr Place kSet = u8(3).bits(5, 6);
 
@@ -16,7 +16,7 @@ constexpr Field kNeighbor[] = {
     {"Cell ID", u16(1).bits(6, 12), decimal()},
     {"Filter RSCP", u16(2).bits(5, 12), scaled(0.00390625, 0, "%f")},
     Field("Status", kSet, named(kSetNames, "")).when(between(kSet, 0, 2)),
-    {"inJDCS", u8(3).bit(7), named(kFlagNames, "TRUE")},
+    {"inJDCS", u8(3).bit(7), named(kJDCSNames, "TRUE")},
 };
 static_assert(isLayout(kNeighbor));
 

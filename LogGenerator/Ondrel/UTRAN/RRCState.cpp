@@ -37,7 +37,7 @@ constexpr Field kMissingRRCState[] = {
 };
 static_assert(isLayout(kMissingRRCState));
 
-constexpr PacketReading kReadings[] = {
+constexpr PacketReading kRRCReadings[] = {
     {.code = kUtranRRCStateCode,
      .packetName = "UTRAN RRC state",
      .minimumLength = kLength,
@@ -61,8 +61,8 @@ int modeOf(PacketView packet) {
 constinit const Section kRRCStateSection = {.name = "RRC Info",
                                             .logLine = "RRC Info",
                                             .kind = SectionKind::Dictionary,
-                                            .readings = kReadings,
-                                            .codes = {&kReadings[0].code, 1},
+                                            .readings = kRRCReadings,
+                                            .codes = {&kRRCReadings[0].code, 1},
                                             .reportsUnknownCodes = false};
 
 void RRC_State::didRead(const PacketReading& /*reading*/, PacketView packet) {

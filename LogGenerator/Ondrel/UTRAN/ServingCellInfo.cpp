@@ -8,7 +8,7 @@ namespace {
 
 constexpr NamedValue kAccessNames[] = {{0, "All Calls"}, {1, "Emergency Calls Only"}};
 
-constexpr Field kSystemInformation[] = {
+constexpr Field kUTRANSystemInformation[] = {
     {"Cell Access Restrictions", u8(14), decimal()},
     {"Cell ID", u32(21), decimal()},
     {"Downlink UARFCN", u16(19), decimal()},
@@ -16,11 +16,11 @@ constexpr Field kSystemInformation[] = {
     {"URA ID", u8(15), decimal()},
     {"Allowed Access", u8(25).bit(0), named(kAccessNames, "All Calls")},
 };
-static_assert(isLayout(kSystemInformation));
+static_assert(isLayout(kUTRANSystemInformation));
 
 // --- The cell monitor's serving cells ------------------------------------------------------------
 
-constexpr ListedValue kServingCellValues[] = {
+constexpr ListedValue kUTRANServingCellValues[] = {
     {kTqCellMonitorLAC, "Local Area Code", decimal(),
      "Serving Cell Info: Failed to retrieve LAC\n"},
     {kTqCellMonitorCellId, "Cell ID", decimal(), "Serving Cell Info: Failed to retrieve Cell ID\n"},
@@ -40,24 +40,24 @@ constexpr PropertyListReading kServingCells = {
     .part = ListedPart::EachCell,
     .cells = {.technologies = {kTqCellMonitorRadioAccessTechnologyUTRAN2},
               .type = kTqCellMonitorCellTypeServing},
-    .values = kServingCellValues,
+    .values = kUTRANServingCellValues,
 };
 
-constexpr PacketReading kReadings[] = {
+constexpr PacketReading kUTRANReadings[] = {
     {.code = kUtranSystemInformationCode,
      .packetName = "UTRAN system information",
      .minimumLength = 26,
-     .fields = kSystemInformation},
+     .fields = kUTRANSystemInformation},
 };
-constexpr auto kCodes = codesOf(kReadings, kCellMonitorCode);
+constexpr auto kUTRANCodes = codesOf(kUTRANReadings, kCellMonitorCode);
 
 }  // namespace
 
 constinit const Section kUTRANServingCellInfoSection = {.name = "Serving Cell Info",
                                                         .logLine = "Serving Cell Info",
                                                         .kind = SectionKind::Dictionary,
-                                                        .readings = kReadings,
-                                                        .codes = kCodes,
+                                                        .readings = kUTRANReadings,
+                                                        .codes = kUTRANCodes,
                                                         .reportsUnknownCodes = false,
                                                         .propertyList = &kServingCells};
 

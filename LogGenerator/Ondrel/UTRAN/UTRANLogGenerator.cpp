@@ -5,6 +5,7 @@
 #include <optional>
 #include <string>
 
+#include "LogGenerator/DisplayTemplate.h"
 #include "LogGenerator/Ondrel/UTRAN/UTRANClassIndex.h"
 #include "Platform/Bundle.h"
 #include "Platform/Platform.h"
@@ -13,7 +14,6 @@
 namespace kestro {
 namespace {
 
-constexpr std::string_view kTemplateExtension = "plist";
 constexpr std::string_view kTechnologyName = "UTRAN";
 
 char upperCase(char c) { return c >= 'a' && c <= 'z' ? static_cast<char>(c - 'a' + 'A') : c; }
