@@ -11,13 +11,13 @@
 namespace kestro {
 namespace {
 
-constexpr int kTitlePoints = 17;
+constexpr int kAlertTitlePoints = 17;
 constexpr int kMessagePoints = 14;
 constexpr int kPanelWidth = 300;
 constexpr int kPanelHeight = 152;
-constexpr int kMargin = 20;
+constexpr int kAlertMargin = 20;
 constexpr int kLineGap = 8;
-constexpr qreal kRadius = 14;
+constexpr qreal kAlertRadius = 14;
 constexpr QColor kShade(0, 0, 0, 110);
 
 }  // namespace
@@ -59,13 +59,13 @@ void AlertView::dismiss() {
 }
 
 QRect AlertView::panel() const {
-  QRect result(0, 0, std::min(kPanelWidth, width() - 2 * kMargin), kPanelHeight);
+  QRect result(0, 0, std::min(kPanelWidth, width() - 2 * kAlertMargin), kPanelHeight);
   result.moveCenter(rect().center());
   return result;
 }
 
 void AlertView::resizeEvent(QResizeEvent*) {
-  const QRect frame = panel().adjusted(kMargin, 0, -kMargin, -kMargin);
+  const QRect frame = panel().adjusted(kAlertMargin, 0, -kAlertMargin, -kAlertMargin);
   const int height = _button->sizeHint().height();
   _button->setGeometry(frame.left(), frame.bottom() - height, frame.width(), height);
 }
@@ -77,16 +77,17 @@ void AlertView::paintEvent(QPaintEvent*) {
   painter.fillRect(rect(), kShade);
   painter.setPen(colours.hairline);
   painter.setBrush(colours.row);
-  painter.drawRoundedRect(QRectF(panel()).adjusted(0.5, 0.5, -0.5, -0.5), kRadius, kRadius);
+  painter.drawRoundedRect(QRectF(panel()).adjusted(0.5, 0.5, -0.5, -0.5), kAlertRadius,
+                          kAlertRadius);
 
-  qreal top = panel().top() + kMargin;
+  qreal top = panel().top() + kAlertMargin;
   const auto centred = [&](const TextStyle& style, const QString& text) {
     const QSizeF size = style.size(text);
     style.draw(painter, QRectF(QPointF(panel().center().x() - size.width() / 2, top), size), text);
     top += size.height() + kLineGap;
   };
   painter.setPen(colours.text);
-  centred(systemTextStyle(kTitlePoints, QFont::Bold), _title);
+  centred(systemTextStyle(kAlertTitlePoints, QFont::Bold), _title);
   painter.setPen(colours.faintText);
   centred(systemTextStyle(kMessagePoints), _message);
 }

@@ -12,11 +12,11 @@
 namespace kestro {
 namespace {
 
-constexpr int kPoints = 15;
+constexpr int kButtonPoints = 15;
 constexpr int kPadding = 12;
 constexpr int kHeight = 36;
 constexpr qreal kArrowWidth = 16;
-constexpr qreal kRadius = 8;
+constexpr qreal kButtonRadius = 8;
 constexpr std::array kArrow = {QPointF(9, -6.5), QPointF(2.5, 0), QPointF(9, 6.5)};
 
 }  // namespace
@@ -42,7 +42,7 @@ void BarButton::setStrong(bool strong) {
 qreal BarButton::textIndent() const { return _shape == Shape::Back ? kArrowWidth : kPadding; }
 
 QSize BarButton::sizeHint() const {
-  const TextStyle& style = systemTextStyle(kPoints, QFont::Bold);
+  const TextStyle& style = systemTextStyle(kButtonPoints, QFont::Bold);
   const qreal width = textIndent() + style.size(text()).width() + kPadding;
   return {static_cast<int>(std::ceil(width)), kHeight};
 }
@@ -75,11 +75,11 @@ void BarButton::paintFrame(QPainter& painter, QColor fill) const {
   painter.setPen(hasFocus() ? QPen(fill, 2) : QPen(Qt::NoPen));
   fill.setAlphaF(static_cast<float>(_shape == Shape::Filled ? 1 - lit : lit));
   painter.setBrush(fill);
-  painter.drawRoundedRect(QRectF(rect()).adjusted(1, 1, -1, -1), kRadius, kRadius);
+  painter.drawRoundedRect(QRectF(rect()).adjusted(1, 1, -1, -1), kButtonRadius, kButtonRadius);
 }
 
 void BarButton::paintContent(QPainter& painter) const {
-  const TextStyle& style = systemTextStyle(kPoints, _isStrong ? QFont::Bold : QFont::Normal);
+  const TextStyle& style = systemTextStyle(kButtonPoints, _isStrong ? QFont::Bold : QFont::Normal);
   const qreal room = width() - textIndent() - kPadding / 2.0;
   const QString shown = style.elided(text(), room);
   QRectF frame(textIndent(), 0, room, height());

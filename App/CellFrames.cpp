@@ -4,7 +4,7 @@
 namespace kestro {
 namespace {
 
-constexpr qreal kMargin = 10;
+constexpr qreal kCellMargin = 10;
 constexpr qreal kGap = 50;
 
 /// A label of `size` at `left`, in the middle of the height.
@@ -15,13 +15,13 @@ QRectF labelFrame(qreal left, const QRectF& bounds, const QSizeF& size) {
 }  // namespace
 
 QRectF keyOnlyFrame(const QRectF& bounds, const QSizeF& key) {
-  return labelFrame(bounds.x() + kMargin, bounds, key);
+  return labelFrame(bounds.x() + kCellMargin, bounds, key);
 }
 
 CellFrames keyValueFrames(const QRectF& bounds, const QSizeF& key, const QSizeF& value) {
   const qreal width = bounds.width();
-  const qreal needed = key.width() + kMargin + kGap + value.width();
-  const qreal afterKey = bounds.x() + kMargin + key.width() + kGap;
+  const qreal needed = key.width() + kCellMargin + kGap + value.width();
+  const qreal afterKey = bounds.x() + kCellMargin + key.width() + kGap;
   const qreal valueLeft = needed < width ? width - value.width() : afterKey;
   const qreal contentWidth = needed <= width ? width : width + key.width() + value.width();
   return {.key = keyOnlyFrame(bounds, key),

@@ -11,16 +11,16 @@
 namespace kestro {
 namespace {
 
-constexpr int kPoints = 15;
+constexpr int kValuePoints = 15;
 constexpr QMarginsF kMarkMargins(7, 3, 7, 3);
 constexpr qreal kEdgeWidth = 24;
 
 /// What both texts are measured in, whatever they are drawn in.
-const TextStyle& measuringStyle() { return systemTextStyle(kPoints, QFont::Bold); }
+const TextStyle& measuringStyle() { return systemTextStyle(kValuePoints, QFont::Bold); }
 
 }  // namespace
 
-const TextStyle& TextLabel::style() const { return systemTextStyle(kPoints, weight); }
+const TextStyle& TextLabel::style() const { return systemTextStyle(kValuePoints, weight); }
 
 KestroCell::KestroCell(Style style, QString reuseIdentifier)
     : TableCell(std::move(reuseIdentifier)), _key{{}, QFont::Bold, {}} {

@@ -21,7 +21,7 @@ NodePointer childNamed(const NodePointer& node, const std::string& name, std::si
   return found == children.end() ? nullptr : *found;
 }
 
-QString identifier() { return QStringLiteral("KestroPaneControllerCell"); }
+QString paneIdentifier() { return QStringLiteral("KestroPaneControllerCell"); }
 
 }  // namespace
 
@@ -111,11 +111,11 @@ std::unique_ptr<TableCell> KestroPaneController::cellForRow(int row) {
   const KestroModelNode& node = *nodeAtRow(row);
   const bool isTree = node.childNodes() != nullptr;
   // Both kinds share the identifier: a row that changes its kind keeps the cell that it had.
-  std::unique_ptr<TableCell> reused = _table->dequeueReusableCell(identifier(), row);
+  std::unique_ptr<TableCell> reused = _table->dequeueReusableCell(paneIdentifier(), row);
   std::unique_ptr<KestroCell> cell(static_cast<KestroCell*>(reused.release()));
   if (!cell) {
     cell = std::make_unique<KestroCell>(
-        isTree ? KestroCell::Style::Key : KestroCell::Style::KeyValue, identifier());
+        isTree ? KestroCell::Style::Key : KestroCell::Style::KeyValue, paneIdentifier());
   }
   cell->setKey(QString::fromStdString(node.displayName()));
   cell->setAccessory(isTree ? CellAccessory::DisclosureIndicator : CellAccessory::None);

@@ -18,19 +18,19 @@ namespace kestro {
 namespace {
 
 constexpr int kCellPoints = 13;
-constexpr int kTitlePoints = 17;
+constexpr int kSaveTitlePoints = 17;
 constexpr int kCaptionPoints = 13;
 constexpr int kFieldPoints = 15;
 constexpr int kFieldMargin = 6;
 constexpr qreal kTextIndent = 10;
-constexpr int kMargin = 16;
+constexpr int kSaveMargin = 16;
 
-QString identifier() { return QStringLiteral("SaveHistoryContentCell"); }
+QString saveIdentifier() { return QStringLiteral("SaveHistoryContentCell"); }
 
 /// A line of text.
 class SaveHistoryContentCell : public TableCell {
  public:
-  SaveHistoryContentCell() : TableCell(identifier()) {}
+  SaveHistoryContentCell() : TableCell(saveIdentifier()) {}
 
   void setText(const QString& text) {
     _text = text;
@@ -76,7 +76,7 @@ TableView& KestroSaveViewController::saveContentTable() const { return *_ui->sav
 void KestroSaveViewController::viewDidLoad() {
   connectControls();
   const Colours colours = coloursOf(palette());
-  _ui->titleLabel->setFont(systemTextStyle(kTitlePoints, QFont::Bold).font());
+  _ui->titleLabel->setFont(systemTextStyle(kSaveTitlePoints, QFont::Bold).font());
   _ui->saveDescription->setFont(systemTextStyle(kFieldPoints).font());
   _ui->saveDescription->setTextMargins(kFieldMargin, 0, kFieldMargin, 0);
   for (QLabel* caption : {_ui->descriptionCaption, _ui->contentCaption}) {
@@ -107,7 +107,7 @@ void KestroSaveViewController::connectControls() {
 }
 
 std::unique_ptr<TableCell> KestroSaveViewController::cellForRow(int row) {
-  auto reused = _ui->saveContentTable->dequeueReusableCell(identifier(), row);
+  auto reused = _ui->saveContentTable->dequeueReusableCell(saveIdentifier(), row);
   std::unique_ptr<SaveHistoryContentCell> cell(
       static_cast<SaveHistoryContentCell*>(reused.release()));
   if (!cell) cell = std::make_unique<SaveHistoryContentCell>();
@@ -152,8 +152,9 @@ void KestroSaveViewController::keyPressEvent(QKeyEvent* event) {
 
 void KestroSaveViewController::resizeEvent(QResizeEvent*) {
   const int left = columnIn(width()).left;
-  _ui->barLayout->setContentsMargins(left + kMargin / 2, 0, left + kMargin / 2, 1);
-  _ui->formLayout->setContentsMargins(left + kMargin, kMargin, left + kMargin, kMargin);
+  _ui->barLayout->setContentsMargins(left + kSaveMargin / 2, 0, left + kSaveMargin / 2, 1);
+  _ui->formLayout->setContentsMargins(left + kSaveMargin, kSaveMargin, left + kSaveMargin,
+                                      kSaveMargin);
 }
 
 void KestroSaveViewController::paintEvent(QPaintEvent*) {

@@ -11,8 +11,8 @@
 namespace kestro {
 namespace {
 
-constexpr int kTitlePoints = 17;
-constexpr int kMargin = 8;
+constexpr int kBarTitlePoints = 17;
+constexpr int kBarMargin = 8;
 constexpr qreal kShift = 90;
 /// The part of the column that the way back may take from the title.
 constexpr qreal kBackShare = 0.34;
@@ -39,7 +39,7 @@ void NavigationBar::placeBackButton() {
   const Column column = columnIn(width());
   const QSize size = _back->sizeHint();
   const int most = static_cast<int>(column.width * kBackShare);
-  _back->setGeometry(column.left + kMargin, (kHeight - size.height()) / 2,
+  _back->setGeometry(column.left + kBarMargin, (kHeight - size.height()) / 2,
                      std::min(size.width(), most), size.height());
 }
 
@@ -58,12 +58,12 @@ void NavigationBar::setTransition(qreal progress) {
 
 void NavigationBar::paintTitle(QPainter& painter, const QString& title, qreal shift,
                                qreal opacity) const {
-  const TextStyle& style = systemTextStyle(kTitlePoints, QFont::Bold);
+  const TextStyle& style = systemTextStyle(kBarTitlePoints, QFont::Bold);
   const Column column = columnIn(width());
   // In the middle of the bar, unless the way back needs the room.
   const qreal left =
-      _back->isHidden() ? column.left + kMargin : _back->geometry().right() + kMargin;
-  const qreal right = column.left + column.width - 2.0 * kMargin;
+      _back->isHidden() ? column.left + kBarMargin : _back->geometry().right() + kBarMargin;
+  const qreal right = column.left + column.width - 2.0 * kBarMargin;
   const QString shown = style.elided(title, right - left);
   const qreal textWidth = style.size(shown).width();
   const qreal middle = (width() - textWidth) * 0.5;

@@ -19,7 +19,7 @@
 namespace kestro {
 namespace {
 
-constexpr int kMargin = 16;
+constexpr int kToolbarMargin = 16;
 constexpr int kSpacing = 8;
 constexpr int kLabelPoints = 14;
 
@@ -135,7 +135,7 @@ void Toolbar::fill(std::size_t index) {
 }
 
 void Toolbar::resizeEvent(QResizeEvent*) {
-  const int margin = columnIn(width()).left + kMargin;
+  const int margin = columnIn(width()).left + kToolbarMargin;
   _layout->setContentsMargins(margin, 1, margin - kSpacing, 0);
 }
 

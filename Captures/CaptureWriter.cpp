@@ -18,13 +18,6 @@
 namespace kestro {
 namespace {
 
-struct PcapCloser {
-  void operator()(pcap_t* pcap) const { pcap_close(pcap); }
-};
-struct DumperCloser {
-  void operator()(pcap_dumper_t* dumper) const { pcap_dump_close(dumper); }
-};
-
 timeval timevalOf(Moment time) {
   constexpr Moment kLatest{std::chrono::seconds{std::numeric_limits<std::uint32_t>::max()}};
   const Moment inside = std::clamp(time, Moment(), kLatest);
@@ -39,6 +32,13 @@ Error writeError(const std::string& path) {
 }  // namespace
 
 struct CaptureWriter::Handle {
+  struct PcapCloser {
+    void operator()(pcap_t* closed) const { pcap_close(closed); }
+  };
+  struct DumperCloser {
+    void operator()(pcap_dumper_t* closed) const { pcap_dump_close(closed); }
+  };
+
   // Room for the longest record, so that each reaches the system in one piece. Outlives the stream
   // that uses it, which the dumper owns.
   std::vector<char> buffer = std::vector<char>(kMaximumCapturedMessageSize + 64);

@@ -18,7 +18,7 @@
 namespace kestro {
 namespace {
 
-constexpr const char* kFooter = R"(Formats:
+constexpr const char* kCodesFooter = R"(Formats:
   table     code by code: the packet, its least length, the sections and their keys
   markdown  a document, with where every key is read and how it is shown
   json      all of that for programs: an array of technologies
@@ -60,7 +60,7 @@ Command addCodesCommand(CLI::App& program) {
       ->check(CLI::IsMember(names))
       ->option_text(fmt::format("{}", fmt::join(names, "|")));
   addFormatOption(*command, options->format, formatNames(codesFormats()));
-  command->footer(kFooter);
+  command->footer(kCodesFooter);
   return {command, [options] { return runCodes(*options); }};
 }
 

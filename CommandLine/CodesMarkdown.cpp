@@ -46,7 +46,7 @@ std::string cell(std::string_view text) {
   return result;
 }
 
-std::string_view nameOf(const ListedCode& code) {
+std::string_view titleOf(const ListedCode& code) {
   return code.name.empty() ? "(contents not known)" : code.name;
 }
 
@@ -57,7 +57,7 @@ void appendOverview(std::string& output, const TechnologyCodes& technology) {
       std::vector<std::string> sections;
       for (const CatalogueEntry& entry : code.entries) sections.push_back(cell(entry.section));
       fmt::format_to(std::back_inserter(output), "| {} | {} | {} | {} |\n", logCodeText(code.code),
-                     cell(nameOf(code)),
+                     cell(titleOf(code)),
                      code.minimumLength == 0 ? "" : fmt::format("{} bytes", code.minimumLength),
                      fmt::join(sections, ", "));
     }
@@ -103,9 +103,9 @@ void appendEntry(std::string& output, const CatalogueEntry& entry) {
   }
 }
 
-void appendCode(std::string& output, const ListedCode& code) {
+void appendCodeChapter(std::string& output, const ListedCode& code) {
   auto end = std::back_inserter(output);
-  fmt::format_to(end, "\n#### {} {}\n", logCodeText(code.code), nameOf(code));
+  fmt::format_to(end, "\n#### {} {}\n", logCodeText(code.code), titleOf(code));
   if (code.minimumLength != 0) fmt::format_to(end, "\nFrom {} bytes.\n", code.minimumLength);
   for (const CatalogueEntry& entry : code.entries) appendEntry(output, entry);
 }
@@ -124,7 +124,7 @@ std::string codesMarkdown(std::span<const TechnologyCodes> technologies) {
     for (const CodeFamily& family : technology.families) {
       fmt::format_to(std::back_inserter(text), "\n### {}: {}\n", technology.technology,
                      family.name);
-      for (const ListedCode& code : family.codes) appendCode(text, code);
+      for (const ListedCode& code : family.codes) appendCodeChapter(text, code);
     }
   }
   return text;

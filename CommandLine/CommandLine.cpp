@@ -25,7 +25,7 @@ namespace {
 constexpr std::array kCommands = {addWatchCommand,   addDecodeCommand, addRecordCommand,
                                   addExplainCommand, addCodesCommand,  addSnapshotCommand};
 
-constexpr const char* kFooter = R"(Exit status:
+constexpr const char* kProgramFooter = R"(Exit status:
   0  done
   1  nothing could be done; one line says why
   2  wrong usage
@@ -44,7 +44,7 @@ int runCommandLine(int argumentCount, const char* const* arguments) {
                    "kestro-cli");
   program.set_version_flag("--version", versionText);
   program.require_subcommand(1);
-  program.footer(kFooter);
+  program.footer(kProgramFooter);
   std::vector<Command> commands;
   std::ranges::transform(kCommands, std::back_inserter(commands),
                          [&](const auto& add) { return add(program); });

@@ -19,7 +19,7 @@
 namespace kestro {
 namespace {
 
-constexpr const char* kFooter = R"(Formats:
+constexpr const char* kDecodeFooter = R"(Formats:
   tree    the display after the last message, for people
   json    one object: "technology", "messages" (how many) and the last "display"
   ndjson  one line a refresh: "time", "message" (the last one's number) and "display"
@@ -129,7 +129,7 @@ Command addDecodeCommand(CLI::App& program) {
       ->add_option("--log-json", options->logFile,
                    "Write every line of the system log there, as {\"priority\",\"message\"}")
       ->option_text("FILE");
-  command->footer(kFooter);
+  command->footer(kDecodeFooter);
   return {command, [options] { return runDecode(*options); }};
 }
 

@@ -24,7 +24,7 @@ namespace {
 
 constexpr LogCode kHighestCode = 0xFFFFFF;
 
-constexpr const char* kFooter =
+constexpr const char* kExplainFooter =
     R"(For every packet: time, log code, name and length; then for every value the section that takes it,
 its row in a list, its key, the bytes that it was read from with their offset, the bits of the
 integer that they make, the raw value and the text that is shown. Offsets count from the packet's
@@ -173,7 +173,7 @@ Command addExplainCommand(CLI::App& program) {
           ->check(CLI::Range(LogCode{0}, kHighestCode))
           ->option_text("CODE");
   addFormatOption(*command, options->format, formatNames(explainFormats()));
-  command->footer(kFooter);
+  command->footer(kExplainFooter);
   return {command, [options, code] {
             options->hasCode = !code->empty();
             return runExplain(*options);

@@ -14,8 +14,8 @@
 namespace kestro {
 namespace {
 
-constexpr std::string_view kIndentation = "  ";
-constexpr std::string_view kColumnGap = "  ";
+constexpr std::string_view kKeyIndentation = "  ";
+constexpr std::string_view kPlaceColumnGap = "  ";
 constexpr std::string_view kPastEnd = "(past the end)";
 
 /// "cell 3", "cell", "3" or "".
@@ -117,7 +117,7 @@ void ExplainTable::describePlace(const ExplainedSource& source, Line& line) cons
 
 void ExplainTable::endPacket(std::string_view remark) {
   if (_lineCount > 0) appendTable();
-  if (!remark.empty()) fmt::format_to(std::back_inserter(_text), "{}{}\n", kIndentation, remark);
+  if (!remark.empty()) fmt::format_to(std::back_inserter(_text), "{}{}\n", kKeyIndentation, remark);
   _output.write(_text);
 }
 
@@ -139,11 +139,11 @@ void ExplainTable::appendTable() {
 /// Columns that are empty in the whole table have no width, and are left out.
 void ExplainTable::appendLine(const Line& line,
                               const std::array<std::size_t, kColumnCount>& widths) {
-  std::string_view gap = kIndentation;
+  std::string_view gap = kKeyIndentation;
   for (std::size_t i = 0; i < kColumnCount; ++i) {
     if (widths[i] == 0) continue;
     _text += gap;
-    gap = kColumnGap;
+    gap = kPlaceColumnGap;
     const std::size_t padding = widths[i] - textWidth(line[i]);
     const bool isNumber = i == kOffset || i == kRaw;
     if (isNumber) _text.append(padding, ' ');

@@ -10,7 +10,7 @@
 namespace kestro {
 namespace {
 
-constexpr std::size_t kIndentation = 2;
+constexpr std::size_t kJsonIndentation = 2;
 
 bool needsEscape(char character) noexcept {
   return static_cast<unsigned char>(character) < 0x20 || character == '"' || character == '\\';
@@ -88,7 +88,7 @@ void JsonWriter::separate() {
 void JsonWriter::breakLine() {
   if (_form == Form::Compact) return;
   _output += '\n';
-  _output.append(kIndentation * _depth, ' ');
+  _output.append(kJsonIndentation * _depth, ' ');
 }
 
 void JsonWriter::appendQuoted(std::string_view value) {

@@ -18,49 +18,49 @@ namespace {
 /// Below every priority: no line is even formatted.
 constexpr LogPriority kNoPriority{-1};
 
-class OfflineLog : public SystemLog {
- public:
-  explicit OfflineLog(std::optional<Output> file)
-      : SystemLog(file ? LogPriority::Debug : kNoPriority), _file(std::move(file)) {}
-
-  [[nodiscard]] Result<void> finish() {
-    if (!_file) return {};
-    _file->flush();
-    if (_file->failureMessage().empty()) return {};
-    return failure(_file->failureMessage());
-  }
-
- protected:
-  void writeLine(LogPriority priority, std::string_view line) override {
-    if (!_file) return;
-    _text.clear();
-    JsonWriter writer(_text);
-    writer.beginObject();
-    writer.key("priority");
-    writer.number(static_cast<std::uint64_t>(priority));
-    writer.key("message");
-    writer.text(line);
-    writer.endObject();
-    _text += '\n';
-    _file->write(_text);
-  }
-
- private:
-  std::optional<Output> _file;
-  std::string _text;
-};
-
-class StandardErrorSink : public TextSink {
- public:
-  void writeLine(std::string_view line) override { fmt::print(stderr, "{}\n", line); }
-};
-
 }  // namespace
 
 struct OfflinePlatform::Services {
+  class Log : public SystemLog {
+   public:
+    explicit Log(std::optional<Output> file)
+        : SystemLog(file ? LogPriority::Debug : kNoPriority), _file(std::move(file)) {}
+
+    [[nodiscard]] Result<void> finish() {
+      if (!_file) return {};
+      _file->flush();
+      if (_file->failureMessage().empty()) return {};
+      return failure(_file->failureMessage());
+    }
+
+   protected:
+    void writeLine(LogPriority priority, std::string_view line) override {
+      if (!_file) return;
+      _text.clear();
+      JsonWriter writer(_text);
+      writer.beginObject();
+      writer.key("priority");
+      writer.number(static_cast<std::uint64_t>(priority));
+      writer.key("message");
+      writer.text(line);
+      writer.endObject();
+      _text += '\n';
+      _file->write(_text);
+    }
+
+   private:
+    std::optional<Output> _file;
+    std::string _text;
+  };
+
+  class StandardErrorSink : public TextSink {
+   public:
+    void writeLine(std::string_view line) override { fmt::print(stderr, "{}\n", line); }
+  };
+
   explicit Services(std::optional<Output> logFile) : log(std::move(logFile)) {}
 
-  OfflineLog log;
+  Log log;
   StandardErrorSink standardError;
   std::unique_ptr<Clock> systemClock = createSystemClock();
   ReplayClock clock{*systemClock};

@@ -15,7 +15,7 @@
 namespace kestro {
 namespace {
 
-constexpr const char* kFooter =
+constexpr const char* kRecordFooter =
     R"(Nothing is decoded. The recording ends with Ctrl-C or after its duration, and goes on over lost
 connections; when the baseband changes its technology it goes on in FILE-2.pcap, FILE-3.pcap and
 so on. Existing files are replaced. Messages of more than 262,144 bytes are dropped and counted.
@@ -72,7 +72,7 @@ Command addRecordCommand(CLI::App& program) {
   addSecondsOption(*command, "--duration", options->durationSeconds,
                    "End after so long; 0: only with Ctrl-C");
   addLiveOptions(*command, options->live);
-  command->footer(kFooter);
+  command->footer(kRecordFooter);
   return {command, [options] {
             return runLive(options->live, [&](LinuxPlatform& platform, Finish finish) {
               return std::make_unique<RecordTask>(*options, platform, std::move(finish));

@@ -27,7 +27,7 @@
 namespace kestro {
 namespace {
 
-constexpr const char* kFooter =
+constexpr const char* kSnapshotFooter =
     R"(A snapshot holds the last five displays with a description and, for binary log channels, their
 packets as a DLF log: what the window saves, in the same format.
 
@@ -198,7 +198,7 @@ Command addSnapshotCommand(CLI::App& program) {
   command->require_subcommand(1);
   const std::vector<Command> actions = {addSave(*command, options), addShow(*command, options),
                                         addExport(*command, options)};
-  command->footer(kFooter);
+  command->footer(kSnapshotFooter);
   return {command, [actions] {
             return std::ranges::find_if(
                        actions, [](const Command& action) { return action.declaration->parsed(); })

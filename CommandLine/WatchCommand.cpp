@@ -16,7 +16,7 @@
 namespace kestro {
 namespace {
 
-constexpr const char* kFooter = R"(Formats:
+constexpr const char* kWatchFooter = R"(Formats:
   tree    on a terminal the display in its window, redrawn in place, with the values that
           changed marked (remarks of the decoders on standard error are not shown there:
           redirect it to keep them); elsewhere one plain display below the other
@@ -74,7 +74,7 @@ Command addWatchCommand(CLI::App& program) {
   command->add_option("--count", options->count, "End after so many refreshes")
       ->check(CLI::PositiveNumber)
       ->option_text("N");
-  command->footer(kFooter);
+  command->footer(kWatchFooter);
   return {command, [options] {
             return runLive(options->live, [&](LinuxPlatform& platform, Finish finish) {
               return std::make_unique<WatchTask>(*options, platform, std::move(finish));

@@ -11,22 +11,23 @@
 namespace kestro::plain {
 namespace {
 
-constexpr std::uint32_t kCodes[] = {0x108A, 0x1183, 0x1192, 0x12B6, 0x119C, 0x119D, 0x127E, 0x134F};
-constexpr std::string_view kNames[] = {"kChannel",         "k1xEVDODeviceState",
-                                       "kBandClass",       "kRxAGC0",
-                                       "kRxAGC1",          "kTxAGC",
-                                       "kServingPNOffset", "kSessionState",
-                                       "kUATI24",          "kColorCode",
-                                       "kActiveSetPilots", "kFingerC2I",
-                                       "k1xDeviceState",   "k1xRx0BandClass",
-                                       "k1xRx0ChanNum",    "k1xRxAGC0",
-                                       "k1xRx1BandClass",  "k1xRx1ChanNum",
-                                       "k1xRxAGC1",        "k1xTxAGC",
-                                       "k1xActiveSetInfo", "k1xTrafficFER",
-                                       "k1xRoamingHome",   "kSystemId",
-                                       "kNetworkId",       "kPacketZoneId",
-                                       "kBaseId",          "kProtocolRevision",
-                                       "kFLDataRate",      "kRLDataRate"};
+constexpr std::uint32_t kC2KCodes[] = {0x108A, 0x1183, 0x1192, 0x12B6,
+                                       0x119C, 0x119D, 0x127E, 0x134F};
+constexpr std::string_view kLookupNames[] = {"kChannel",         "k1xEVDODeviceState",
+                                             "kBandClass",       "kRxAGC0",
+                                             "kRxAGC1",          "kTxAGC",
+                                             "kServingPNOffset", "kSessionState",
+                                             "kUATI24",          "kColorCode",
+                                             "kActiveSetPilots", "kFingerC2I",
+                                             "k1xDeviceState",   "k1xRx0BandClass",
+                                             "k1xRx0ChanNum",    "k1xRxAGC0",
+                                             "k1xRx1BandClass",  "k1xRx1ChanNum",
+                                             "k1xRxAGC1",        "k1xTxAGC",
+                                             "k1xActiveSetInfo", "k1xTrafficFER",
+                                             "k1xRoamingHome",   "kSystemId",
+                                             "kNetworkId",       "kPacketZoneId",
+                                             "kBaseId",          "kProtocolRevision",
+                                             "kFLDataRate",      "kRLDataRate"};
 
 constexpr std::string_view kEvdoStates[] = {"Inactive [0]", "Acquisition [1]", "Sync [2]",
                                             "Idle [3]",     "Access [4]",      "Connected [5]"};
@@ -108,15 +109,15 @@ struct Throughput {
 class C2KReader : public PlainReader {
  public:
   C2KReader() {
-    for (const std::string_view name : kNames) shown().set(name, "");
+    for (const std::string_view name : kLookupNames) shown().set(name, "");
   }
 
   [[nodiscard]] Dictionary displayTemplate() const override {
     Dictionary result;
-    for (const std::string_view name : kNames) result.set(name, name);
+    for (const std::string_view name : kLookupNames) result.set(name, name);
     return result;
   }
-  [[nodiscard]] std::span<const std::uint32_t> codes() const override { return kCodes; }
+  [[nodiscard]] std::span<const std::uint32_t> codes() const override { return kC2KCodes; }
 
   bool receive(ByteView message) override {
     if (message.size() < 13) return true;
@@ -142,7 +143,7 @@ class C2KReader : public PlainReader {
     if (is(0x134F, 171) && packet.byte(13) >= 2) readSystemParameters(packet);
     if (is(0x1192, 241)) readForwardLink(packet);
     if (is(0x127E, 1750)) readReverseLink(packet);
-    return std::ranges::find(kCodes, code) != std::end(kCodes);
+    return std::ranges::find(kC2KCodes, code) != std::end(kC2KCodes);
   }
 
   void readEvdoStatus(const Packet& packet) {

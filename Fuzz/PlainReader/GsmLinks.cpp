@@ -4,26 +4,26 @@
 namespace kestro::plain {
 namespace {
 
-constexpr std::uint32_t kCodes[] = {0x417A, 0x51F5, 0x7135, 0x51F6, 0x51FB,   0x51FD,   0x51F4,
-                                    0x5137, 0x5134, 0x5076, 0x51F8, 0x51FF,   0x7130,   0x7132,
-                                    0x4005, 0x7131, 0x7150, 0x512C, 0x5072,   0x4125,   0x4031,
-                                    0x4127, 0x4157, 0x4116, 0x4221, 0xFF0000, 0xFF0001, 0xFF0002};
-constexpr std::string_view kDictionaries[] = {"Coding Scheme",
-                                              "GPRS Information",
-                                              "GSM Serving Cell",
-                                              "Mobile Allocation",
-                                              "Process PS",
-                                              "Process CO",
-                                              "UMTS RR Measurement",
-                                              "Cell Change Counters",
-                                              "Serving PLMN",
-                                              "GSM RR Info",
-                                              "Process CS",
-                                              "UMTS RR Info",
-                                              "BLER",
-                                              "HSDPA Info",
-                                              "SIM Info"};
-constexpr std::string_view kLists[] = {
+constexpr std::uint32_t kGsmCodes[] = {
+    0x417A, 0x51F5, 0x7135, 0x51F6, 0x51FB, 0x51FD,   0x51F4,   0x5137,  0x5134, 0x5076,
+    0x51F8, 0x51FF, 0x7130, 0x7132, 0x4005, 0x7131,   0x7150,   0x512C,  0x5072, 0x4125,
+    0x4031, 0x4127, 0x4157, 0x4116, 0x4221, 0xFF0000, 0xFF0001, 0xFF0002};
+constexpr std::string_view kGsmDictionaries[] = {"Coding Scheme",
+                                                 "GPRS Information",
+                                                 "GSM Serving Cell",
+                                                 "Mobile Allocation",
+                                                 "Process PS",
+                                                 "Process CO",
+                                                 "UMTS RR Measurement",
+                                                 "Cell Change Counters",
+                                                 "Serving PLMN",
+                                                 "GSM RR Info",
+                                                 "Process CS",
+                                                 "UMTS RR Info",
+                                                 "BLER",
+                                                 "HSDPA Info",
+                                                 "SIM Info"};
+constexpr std::string_view kGsmLists[] = {
     "Active Set",    "Neighboring Cells",   "PDP Context Info",  "Detected Set",
     "GSM Set",       "Non-Ranked GSM Set",  "UMTS Set",          "Equivalent PLMN List",
     "Monitored Set", "Non-Ranked UMTS Set", "Virtual Active Set"};
@@ -43,9 +43,9 @@ Array harqProcesses(const Packet& packet, std::size_t start, int count) {
 }  // namespace
 
 GsmReader::GsmReader(const PropertyListCoding& coding)
-    : SectionReader(coding, kDictionaries, kLists) {}
+    : SectionReader(coding, kGsmDictionaries, kGsmLists) {}
 
-std::span<const std::uint32_t> GsmReader::codes() const { return kCodes; }
+std::span<const std::uint32_t> GsmReader::codes() const { return kGsmCodes; }
 
 void GsmReader::read(const Packet& packet, std::uint32_t code) {
   const auto is = [&](std::uint32_t wanted, std::size_t length) {

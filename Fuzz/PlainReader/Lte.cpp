@@ -7,15 +7,15 @@
 namespace kestro::plain {
 namespace {
 
-constexpr std::uint32_t kCodes[] = {0xB0C2, 0xB0C1,   0xB179,   0xB17F,  0xB180,
-                                    0xB186, 0xFF0000, 0xFF0001, 0xFF0002};
-constexpr std::string_view kDictionaries[] = {
+constexpr std::uint32_t kLteCodes[] = {0xB0C2, 0xB0C1,   0xB179,   0xB17F,  0xB180,
+                                       0xB186, 0xFF0000, 0xFF0001, 0xFF0002};
+constexpr std::string_view kLteDictionaries[] = {
     "Serving Cell Info",         "Connected mode LTE Intra-frequency Measurement",
     "Serving Cell Measurements", "Neighbor Measurements",
     "Reselection Candidates",    "SIM Info"};
-constexpr std::string_view kLists[] = {"Measured Neighbor Cells", "Detected Cells",
-                                       "Neighbor Cells List", "Reselection Candidates List",
-                                       "PDP Context Info"};
+constexpr std::string_view kLteLists[] = {"Measured Neighbor Cells", "Detected Cells",
+                                          "Neighbor Cells List", "Reselection Candidates List",
+                                          "PDP Context Info"};
 
 std::string_view bandwidth(int resourceBlocks) {
   switch (resourceBlocks) {
@@ -50,9 +50,9 @@ std::string plainNumber(unsigned number) { return text("%u", number); }
 class LteReader : public SectionReader {
  public:
   explicit LteReader(const PropertyListCoding& coding)
-      : SectionReader(coding, kDictionaries, kLists) {}
+      : SectionReader(coding, kLteDictionaries, kLteLists) {}
 
-  [[nodiscard]] std::span<const std::uint32_t> codes() const override { return kCodes; }
+  [[nodiscard]] std::span<const std::uint32_t> codes() const override { return kLteCodes; }
 
  protected:
   void read(const Packet& packet, std::uint32_t code) override {

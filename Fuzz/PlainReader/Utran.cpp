@@ -7,18 +7,18 @@
 namespace kestro::plain {
 namespace {
 
-constexpr std::uint32_t kCodes[] = {0xD0E0, 0xD0E2,   0xD00A,   0xD00E,
-                                    0xD00C, 0xFF0000, 0xFF0001, 0xFF0002};
-constexpr std::string_view kDictionaries[] = {"RRC Info", "Serving Cell Info", "SIM Info"};
-constexpr std::string_view kLists[] = {"Neighbor Cell List", "GSM Neighbor Cell List", "TRCH BLER",
-                                       "CCTRCH SIR", "PDP Context Info"};
+constexpr std::uint32_t kUtranCodes[] = {0xD0E0, 0xD0E2,   0xD00A,   0xD00E,
+                                         0xD00C, 0xFF0000, 0xFF0001, 0xFF0002};
+constexpr std::string_view kUtranDictionaries[] = {"RRC Info", "Serving Cell Info", "SIM Info"};
+constexpr std::string_view kUtranLists[] = {"Neighbor Cell List", "GSM Neighbor Cell List",
+                                            "TRCH BLER", "CCTRCH SIR", "PDP Context Info"};
 
 class UtranReader : public SectionReader {
  public:
   explicit UtranReader(const PropertyListCoding& coding)
-      : SectionReader(coding, kDictionaries, kLists) {}
+      : SectionReader(coding, kUtranDictionaries, kUtranLists) {}
 
-  [[nodiscard]] std::span<const std::uint32_t> codes() const override { return kCodes; }
+  [[nodiscard]] std::span<const std::uint32_t> codes() const override { return kUtranCodes; }
 
  protected:
   void read(const Packet& packet, std::uint32_t code) override {
