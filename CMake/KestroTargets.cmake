@@ -56,7 +56,8 @@ function(kestro_check_headers library)
   endif()
 endfunction()
 
-# kestro_tests(NAME [SOURCES_IN DIR...] [LINK ...]): one test program, its tests registered by name.
+# kestro_tests(NAME [SOURCES_IN DIR...] [LINK ...]): one test program, its tests registered by name
+# (under sanitizers a part of them at a time).
 function(kestro_tests name)
   cmake_parse_arguments(ARG "" "" "SOURCES_IN;LINK" ${ARGN})
   set(sources)
@@ -72,9 +73,20 @@ function(kestro_tests name)
   set_target_properties(${name} PROPERTIES UNITY_BUILD ${KESTRO_UNITY_TESTS})
   # What is tested is optimised; the tests themselves would only take twice as long to compile.
   target_compile_options(${name} PRIVATE -O0)
-  set(timeout 120)
   if(KESTRO_SANITIZERS)
-    set(timeout 600)
+    kestro_add_shards(${name} 4)
+  else()
+    gtest_discover_tests(${name} DISCOVERY_MODE PRE_TEST PROPERTIES TIMEOUT 120)
   endif()
-  gtest_discover_tests(${name} DISCOVERY_MODE PRE_TEST PROPERTIES TIMEOUT ${timeout})
+endfunction()
+
+# kestro_add_shards(PROGRAM COUNT): a test program's tests in so many runs. Instrumented, a program
+# takes longer to start than most tests take.
+function(kestro_add_shards program count)
+  math(EXPR last "${count} - 1")
+  foreach(shard RANGE ${last})
+    add_test(NAME ${program}.${shard} COMMAND ${program})
+    set_tests_properties(${program}.${shard} PROPERTIES
+      TIMEOUT 600 ENVIRONMENT "GTEST_TOTAL_SHARDS=${count};GTEST_SHARD_INDEX=${shard}")
+  endforeach()
 endfunction()
