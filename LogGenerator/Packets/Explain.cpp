@@ -1,7 +1,10 @@
 // SPDX-License-Identifier: MIT
 #include "LogGenerator/Packets/Explain.h"
 
+#include <fmt/format.h>
+
 #include "LogGenerator/Packets/Decode.h"
+#include "LogGenerator/Packets/Walk.h"
 
 namespace kestro {
 
@@ -31,7 +34,10 @@ void Explainer::fields(std::span<const Field> fields, const RecordPosition& posi
 void Explainer::list(const ListReading& list) const {
   const RecordTable& table = list.table;
   const std::string_view name = list.key.empty() ? table.name : list.key;
-  _visit({.section = _section, .list = name, .key = "count", .sources = {source(table.count, {})}});
+  ExplainedValue count{.section = _section, .list = name, .key = "count"};
+  count.sources = {source(table.count, {})};
+  if (table.countAddend != 0) count.text = fmt::format("{}", recordCount(table, _packet));
+  _visit(count);
   try {
     forEachRecord(table, _packet, [&](std::size_t index, const RecordPosition& position) {
       fields(table.fields, position, name, index);

@@ -38,7 +38,9 @@ struct ExplainedValue {
   std::optional<std::size_t> row{};  ///< the record's number
   std::string_view key;
   std::vector<ExplainedSource> sources{};
-  Value text{};  ///< what is shown; null when the value is not shown
+  /// What is shown; null when the value is not shown. Of a list's count that is not stored as it
+  /// is: the number of records.
+  Value text{};
 };
 
 using ExplainVisitor = std::function<void(const ExplainedValue& value)>;

@@ -98,6 +98,28 @@ TEST_F(ExplainTest, HasNoTextForHiddenAndRemovedFields) {
   EXPECT_THAT(values[2].sources, IsEmpty());
 }
 
+TEST_F(ExplainTest, ACountThatIsStoredAsItIsHasNoText) {
+  explain(packet({2, 3, 4, 0xAB, 0xCD, 1, 0x07, 2, 0x09}));
+  EXPECT_EQ(values[4].sources.at(0).raw, 2);
+  EXPECT_TRUE(values[4].text.isNull());
+}
+
+TEST_F(ExplainTest, ACountThatIsStoredOtherwiseIsToldInRecords) {
+  constexpr ListReading kOneMore[] = {{.table = {.name = "cell",
+                                                 .count = u8(13),
+                                                 .countAddend = 1,
+                                                 .base = 14,
+                                                 .stride = 2,
+                                                 .fields = kRecordFields}}};
+  const PacketReading reading = {0x1234, "test packet", 14, {}, kOneMore};
+  const Bytes bytes = packet({1, 7, 0x07, 8, 0x09});
+  explainReading(kSection, reading, PacketView(bytes),
+                 [this](const ExplainedValue& value) { values.push_back(value); });
+  EXPECT_THAT(keys(), ElementsAre("count", "ID", "Odd", "ID", "Odd"));
+  EXPECT_EQ(values[0].sources.at(0).raw, 1);
+  EXPECT_EQ(values[0].text, Value("2"));
+}
+
 TEST_F(ExplainTest, MarksWhatLiesPastTheEnd) {
   explain(packet({2, 3, 4, 0xAB, 0xCD, 1}));
   EXPECT_FALSE(values[5].sources[0].isPastEnd);
