@@ -8,6 +8,7 @@
 
 #include "CommandLine/WatchSession.h"
 #include "Platform/Clock.h"
+#include "Platform/TelephonyProtocol.h"
 
 namespace kestro {
 
@@ -22,7 +23,9 @@ class RecordSession::Generator : public LogGenerator {
   }
   Value generateLogUsingState(Dictionary&) override { return {}; }
   /// Without lists of codes everything is streamed.
-  [[nodiscard]] Dictionary getStartCommand() const override { return {{"SetState", "Streaming"}}; }
+  [[nodiscard]] Dictionary getStartCommand() const override {
+    return {{kTelephonySetState, kTelephonyStreaming}};
+  }
   [[nodiscard]] Array getSaveContentsFromState(const Dictionary&) override { return {}; }
 
  private:

@@ -38,6 +38,14 @@ inline constexpr std::string_view kTelephonyTechnologyChanged = "TechnologyChang
 /// On a channel port: the request for the technology, and the reply's entry of the same name.
 inline constexpr std::string_view kTelephonyGetTechnology = "GetTechnology";
 
+/// On a channel port: the command that starts the messages, with the only state there is, and the
+/// codes of the packets that are wanted (arrays of integers); all of them when it has neither
+/// array.
+inline constexpr std::string_view kTelephonySetState = "SetState";
+inline constexpr std::string_view kTelephonyStreaming = "Streaming";
+inline constexpr std::string_view kTelephonySetOndrelLogCodes = "SetOndrelLogCodes";
+inline constexpr std::string_view kTelephonySetTqExtraCodes = "SetTqExtraCodes";
+
 /// Why there is no log channel. The server answers with the positive numbers; the numbers -1 to -4
 /// are those of SendError, -5 a reply that does not say what it should.
 enum class LogChannelError : long {

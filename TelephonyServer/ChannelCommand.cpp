@@ -14,11 +14,6 @@
 namespace kestro {
 namespace {
 
-constexpr std::string_view kSetState = "SetState";
-constexpr std::string_view kStreaming = "Streaming";
-constexpr std::string_view kSetOndrelLogCodes = "SetOndrelLogCodes";
-constexpr std::string_view kSetTqExtraCodes = "SetTqExtraCodes";
-
 /// Adds the codes in the array under `key`, if there is one, to `codes`.
 Result<void> addCodes(const Dictionary& command, std::string_view key, LogCode offset,
                       std::vector<LogCode>& codes) {
@@ -36,17 +31,18 @@ Result<void> addCodes(const Dictionary& command, std::string_view key, LogCode o
 }
 
 Result<ChannelCommand> startCommand(const Dictionary& command) {
-  if (command[kSetState].text() != kStreaming) {
-    return failure(fmt::format("{} is not \"{}\"", kSetState, kStreaming));
+  if (command[kTelephonySetState].text() != kTelephonyStreaming) {
+    return failure(fmt::format("{} is not \"{}\"", kTelephonySetState, kTelephonyStreaming));
   }
-  if (!command.contains(kSetOndrelLogCodes) && !command.contains(kSetTqExtraCodes)) {
+  if (!command.contains(kTelephonySetOndrelLogCodes) &&
+      !command.contains(kTelephonySetTqExtraCodes)) {
     return StartCommand{};
   }
   std::vector<LogCode> codes;
-  if (auto added = addCodes(command, kSetOndrelLogCodes, 0, codes); !added) {
+  if (auto added = addCodes(command, kTelephonySetOndrelLogCodes, 0, codes); !added) {
     return tl::unexpected(added.error());
   }
-  if (auto added = addCodes(command, kSetTqExtraCodes, kExtraCodes, codes); !added) {
+  if (auto added = addCodes(command, kTelephonySetTqExtraCodes, kExtraCodes, codes); !added) {
     return tl::unexpected(added.error());
   }
   return StartCommand{CodeFilter(std::move(codes))};
@@ -60,7 +56,7 @@ Result<ChannelCommand> parseChannelCommand(const PropertyListCoding& coding, Byt
   if (!parsed->isDictionary()) return failure("the property list is no dictionary");
   const auto command = parsed->dictionary();
   if (command.contains(kTelephonyGetTechnology)) return GetTechnologyCommand{};
-  if (command.contains(kSetState)) return startCommand(command);
+  if (command.contains(kTelephonySetState)) return startCommand(command);
   return failure("the dictionary holds no command");
 }
 

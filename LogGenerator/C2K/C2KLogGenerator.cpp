@@ -16,6 +16,7 @@
 #include "LogGenerator/DisplayTemplate.h"
 #include "LogGenerator/Packets/PacketHeader.h"
 #include "Platform/SystemLog.h"
+#include "Platform/TelephonyProtocol.h"
 
 namespace kestro {
 namespace {
@@ -107,7 +108,7 @@ C2KLogGenerator::C2KLogGenerator(Platform& platform)
 Dictionary C2KLogGenerator::getStartCommand() const {
   Array codes;
   for (const auto& parser : _parsers) codes.append(Value::integer(parser->reading().code));
-  return {{"SetState", "Streaming"}, {"SetOndrelLogCodes", codes}};
+  return {{kTelephonySetState, kTelephonyStreaming}, {kTelephonySetOndrelLogCodes, codes}};
 }
 
 std::span<const std::string_view> C2KLogGenerator::stateKeys() const {

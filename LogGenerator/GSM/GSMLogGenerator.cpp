@@ -5,6 +5,7 @@
 
 #include "LogGenerator/InternalConsistencyFailure.h"
 #include "Platform/PropertyListCoding.h"
+#include "Platform/TelephonyProtocol.h"
 
 namespace kestro {
 namespace {
@@ -60,7 +61,9 @@ Value GSMLogGenerator::generateLogUsingState(Dictionary& state) {
   return state[kStateDisplay];
 }
 
-Dictionary GSMLogGenerator::getStartCommand() const { return {{"SetState", "Streaming"}}; }
+Dictionary GSMLogGenerator::getStartCommand() const {
+  return {{kTelephonySetState, kTelephonyStreaming}};
+}
 
 Array GSMLogGenerator::getSaveContentsFromState(const Dictionary& state) {
   return historyOfState(state);

@@ -7,6 +7,7 @@
 #include "LogGenerator/DisplayTemplate.h"
 #include "LogGenerator/Packets/PacketHeader.h"
 #include "Platform/SystemLog.h"
+#include "Platform/TelephonyProtocol.h"
 
 namespace kestro {
 namespace {
@@ -101,8 +102,9 @@ Dictionary OndrelLogGenerator2::getStartCommand() const {
       extraCodes.append(Value::integer(code - kExtraCodes));
     }
   }
-  return {
-      {"SetState", "Streaming"}, {"SetOndrelLogCodes", logCodes}, {"SetTqExtraCodes", extraCodes}};
+  return {{kTelephonySetState, kTelephonyStreaming},
+          {kTelephonySetOndrelLogCodes, logCodes},
+          {kTelephonySetTqExtraCodes, extraCodes}};
 }
 
 // --- Display -------------------------------------------------------------------------------------
