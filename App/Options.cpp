@@ -7,21 +7,14 @@
 #include <QString>
 #include <QStringList>
 
-#include "Platform/DemoServer.h"
-#include "Platform/PortName.h"
-#include "Platform/SystemLog.h"
-
 namespace kestro {
 namespace {
 
 constexpr int kWrongUsage = 2;
-constexpr const char* kDefaultServer = "TelephonyServer";
 constexpr int kSmallestSide = 240;
 constexpr int kLargestSide = 16384;
 constexpr double kDefaultDelay = 5;
 constexpr double kLongestDelay = 86400;
-constexpr int kDebugPriority = static_cast<int>(LogPriority::Debug);
-constexpr int kNoticePriority = static_cast<int>(LogPriority::Notice);
 
 constexpr const char* kDescription =
     "Shows, live, what the cellular baseband is doing, and saves snapshots of it.";
@@ -36,11 +29,6 @@ Examples:
   kestro --demo --size=390x780
   kestro --demo=capture:drive.pcap
   kestro --demo --screenshot=kestro.png --after=5)";
-
-std::string checkPortName(const std::string& name) {
-  if (isPortName(name)) return "";
-  return "'" + name + "' is no port name (1 to 64 letters, digits, '.', '-', '_')";
-}
 
 /// The size in "390x780"; absent when it is none, or not one of a window.
 std::optional<QSize> sizeFrom(const std::string& text) {
@@ -61,23 +49,6 @@ std::string checkSize(const std::string& text) {
                      kLargestSide);
 }
 
-void addSourceOptions(CLI::App& program, Options& options) {
-  auto* server = program.add_option("--server", options.serverName, "The telephony server's port")
-                     ->check(CLI::Validator(checkPortName, ""))
-                     ->option_text(fmt::format("NAME (default: {})", kDefaultServer));
-  program
-      .add_option_function<std::string>(
-          "--demo",
-          [&options](const std::string& source) {
-            options.demoSource = source.empty() ? kDefaultDemoSource : source;
-          },
-          "Start a telephony server of one's own with this source; `kestro-telephonyd --help` "
-          "lists them")
-      ->expected(0, 1)
-      ->excludes(server)
-      ->option_text(fmt::format("[=SOURCE] (default: {})", kDefaultDemoSource));
-}
-
 void addWindowOptions(CLI::App& program, Options& options) {
   program
       .add_option_function<std::string>(
@@ -86,11 +57,6 @@ void addWindowOptions(CLI::App& program, Options& options) {
       ->check(CLI::Validator(checkSize, ""))
       ->option_text("WxH");
   program.add_flag("--plain", options.plain, "Do not mark values that have changed");
-  program
-      .add_option("--log-priority", options.logPriority,
-                  "The system log gets lines up to this priority: 3 errors, 4 warnings, 5 notices")
-      ->check(CLI::Range(0, kDebugPriority))
-      ->option_text(fmt::format("N (default: {})", kNoticePriority));
   auto* screenshot =
       program.add_option("--screenshot", options.screenshot, "Write a picture of the window, end")
           ->option_text("FILE");
@@ -102,13 +68,13 @@ void addWindowOptions(CLI::App& program, Options& options) {
 
 }  // namespace
 
-std::optional<int> Options::parse(int argumentCount, char** arguments, Options& options) {
+std::optional<int> Options::parse(const Bundle& bundle, int argumentCount, char** arguments,
+                                  Options& options) {
   options = {};
-  options.serverName = kDefaultServer;
-  options.logPriority = kNoticePriority;
   options.after = kDefaultDelay;
   CLI::App program(kDescription, "kestro");
-  addSourceOptions(program, options);
+  addVersionOption(program, bundle);
+  addLiveOptions(program, options.live);
   addWindowOptions(program, options);
   program.footer(kFooter);
   try {

@@ -18,6 +18,7 @@
 #include "App/KestroApp.h"
 #include "App/Options.h"
 #include "Model/LastWords.h"
+#include "Platform/Bundle.h"
 #include "Platform/DemoServer.h"
 #include "Platform/Linux/LinuxPlatform.h"
 
@@ -41,8 +42,8 @@ bool hasDisplay() {
 
 LinuxPlatformOptions platformOptions(const Options& options, const DemoServer* demo) {
   LinuxPlatformOptions result;
-  result.logThreshold = static_cast<LogPriority>(options.logPriority);
-  result.telephonyServerName = options.serverName;
+  result.logThreshold = options.live.logThreshold;
+  result.telephonyServerName = options.live.serverName;
   result.standardOutputToStandardError = false;
   if (demo != nullptr) result.portDirectory = demo->portDirectory();
   return result;
@@ -83,7 +84,7 @@ class Run {
 
   void watchDemo() {
     _demoWatch = _demo->watch(
-        *_platform, _options.serverName, [this] { _app.restartMonitor(); },
+        *_platform, _options.live.serverName, [this] { _app.restartMonitor(); },
         [this](const std::string& reason) {
           finish(kNothingDone, "the demo's telephony server: " + reason);
         });
@@ -127,7 +128,8 @@ class Run {
 
 int runProgram(int argumentCount, char** arguments) {
   Options options;
-  if (const auto status = Options::parse(argumentCount, arguments, options)) return *status;
+  if (const auto status = Options::parse(*createBundle(), argumentCount, arguments, options))
+    return *status;
   if (!hasDisplay()) {
     complain("there is no display here; `kestro-cli watch` shows the same on a terminal");
     return kNothingDone;
@@ -135,8 +137,8 @@ int runProgram(int argumentCount, char** arguments) {
   // A reader of standard error that goes away is no reason to die.
   std::signal(SIGPIPE, SIG_IGN);
   std::unique_ptr<DemoServer> demo;
-  if (!options.demoSource.empty()) {
-    auto started = startDemoServer(options.demoSource);
+  if (!options.live.demoSource.empty()) {
+    auto started = startDemoServer(options.live.demoSource);
     if (!started) {
       complain(started.error().message);
       return kNothingDone;

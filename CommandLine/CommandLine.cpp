@@ -17,6 +17,7 @@
 #include "CommandLine/WatchCommand.h"
 #include "Platform/Bundle.h"
 #include "Platform/Linux/LinuxPlatform.h"
+#include "Platform/ProgramOptions.h"
 
 namespace kestro {
 namespace {
@@ -33,16 +34,13 @@ constexpr const char* kProgramFooter = R"(Exit status:
 
 `kestro-cli COMMAND --help` explains a command.)";
 
-std::string versionText() {
-  return "kestro-cli " + createBundle()->version().value_or("of unknown version");
-}
-
 }  // namespace
 
 int runCommandLine(int argumentCount, const char* const* arguments) {
+  const auto bundle = createBundle();
   CLI::App program("Shows live, or from a recording, what a phone's cellular baseband is doing.",
                    "kestro-cli");
-  program.set_version_flag("--version", versionText);
+  addVersionOption(program, *bundle);
   program.require_subcommand(1);
   program.footer(kProgramFooter);
   std::vector<Command> commands;

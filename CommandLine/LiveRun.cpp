@@ -1,11 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "CommandLine/LiveRun.h"
 
-#include <fmt/format.h>
-
-#include <CLI/CLI.hpp>
 #include <csignal>
-#include <optional>
+#include <memory>
 #include <string>
 #include <string_view>
 #include <utility>
@@ -15,101 +12,90 @@
 #include "CommandLine/Output.h"
 #include "Model/LastWords.h"
 #include "Platform/MainQueue.h"
-#include "Platform/PortName.h"
 
 namespace kestro {
 namespace {
 
-constexpr int kDebugPriority = static_cast<int>(LogPriority::Debug);
-
-std::string checkPortName(const std::string& name) {
-  if (isPortName(name)) return "";
-  return "'" + name + "' is no port name (1 to 64 letters, digits, '.', '-', '_')";
-}
-
 LinuxPlatformOptions platformOptions(const LiveOptions& options, const DemoServer* demo) {
   LinuxPlatformOptions result;
-  result.logThreshold = static_cast<LogPriority>(options.logPriority);
+  result.logThreshold = options.logThreshold;
   result.telephonyServerName = options.serverName;
   if (demo != nullptr) result.portDirectory = demo->portDirectory();
   return result;
 }
 
-/// How a run ends; empty while it goes on.
-struct Ending {
-  int exitStatus;
-  std::string complaint;
-};
+/// One run of a task.
+class Run {
+ public:
+  Run(const LiveOptions& options, const LiveTaskMaker& makeTask, DemoServer* demo)
+      : _serverName(options.serverName),
+        _demo(demo),
+        _platform(createLinuxPlatform(platformOptions(options, demo))),
+        _lastWords([this](std::string_view line) { endUnexpectedly(line); }),
+        _task(makeTask(*_platform, [this](int exitStatus, std::string complaint) {
+          finish(exitStatus, std::move(complaint));
+        })) {}
 
-int run(const LiveOptions& options, const LiveTaskMaker& makeTask, DemoServer* demo) {
-  const auto platform = createLinuxPlatform(platformOptions(options, demo));
-  const LastWords lastWords([&](std::string_view line) {
-    FullScreen::restore();
-    complain(line);
-    platform->systemLog().write(LogPriority::Error, line);
-    platform->flushSystemLog();
-    if (demo != nullptr) demo->removeDirectory();
-  });
-  std::optional<Ending> ending;
-  const auto finish = [&](int exitStatus, std::string complaint) {
-    if (ending) return;
-    ending = {exitStatus, std::move(complaint)};
-    platform->mainQueue().post([&platform = *platform, exitStatus] { platform.quit(exitStatus); });
-  };
-  std::unique_ptr<LiveTask> task = makeTask(*platform, finish);
-  platform->setTerminationHandler([&] { task->stop(); });
-  platform->setResizeHandler([&] { task->resized(); });
-  std::unique_ptr<Timer> demoWatch;
-  if (demo == nullptr) {
-    platform->mainQueue().post([&] { task->start(); });
-  } else {
-    demoWatch = demo->watch(
-        *platform, options.serverName, [&] { task->start(); },
-        [&](const std::string& reason) {
+  /// Runs until the task finishes; the exit status.
+  int untilFinished() {
+    _platform->setTerminationHandler([this] { _task->stop(); });
+    _platform->setResizeHandler([this] { _task->resized(); });
+    startWithServer();
+    const int exitStatus = _platform->run();
+    _task.reset();
+    if (!_complaint.empty()) complain(_complaint);
+    return exitStatus;
+  }
+
+ private:
+  void startWithServer() {
+    if (_demo == nullptr) return _platform->mainQueue().post([this] { _task->start(); });
+    _demoWatch = _demo->watch(
+        *_platform, _serverName, [this] { _task->start(); },
+        [this](const std::string& reason) {
           finish(kExitNothingDone, "the demo's telephony server: " + reason);
         });
   }
-  const int exitStatus = platform->run();
-  task.reset();
-  if (ending && !ending->complaint.empty()) complain(ending->complaint);
-  return exitStatus;
-}
+
+  void finish(int exitStatus, std::string complaint) {
+    if (_isFinished) return;
+    _isFinished = true;
+    _complaint = std::move(complaint);
+    _platform->mainQueue().post(
+        [&platform = *_platform, exitStatus] { platform.quit(exitStatus); });
+  }
+
+  void endUnexpectedly(std::string_view line) {
+    FullScreen::restore();
+    complain(line);
+    _platform->systemLog().write(LogPriority::Error, line);
+    _platform->flushSystemLog();
+    if (_demo != nullptr) _demo->removeDirectory();
+  }
+
+  const std::string& _serverName;
+  DemoServer* _demo;
+  std::unique_ptr<LinuxPlatform> _platform;
+  LastWords _lastWords;
+  bool _isFinished = false;
+  std::string _complaint;
+  std::unique_ptr<LiveTask> _task;
+  std::unique_ptr<Timer> _demoWatch;
+};
 
 }  // namespace
-
-void addLiveOptions(CLI::App& command, LiveOptions& options) {
-  auto* server = command.add_option("--server", options.serverName, "The telephony server's port")
-                     ->check(CLI::Validator(checkPortName, ""))
-                     ->option_text("NAME (default: " + options.serverName + ")");
-  command
-      .add_option_function<std::string>(
-          "--demo",
-          [&options](const std::string& source) {
-            options.demoSource = source.empty() ? kDefaultDemoSource : source;
-          },
-          "Start a telephony server of one's own with this source; `kestro-telephonyd --help` "
-          "lists them")
-      ->expected(0, 1)
-      ->excludes(server)
-      ->option_text(fmt::format("[=SOURCE] (default: {})", kDefaultDemoSource));
-  command
-      .add_option("--log-priority", options.logPriority,
-                  "The system log gets lines up to this priority: 3 errors, 4 warnings, 5 notices")
-      ->check(CLI::Range(0, kDebugPriority))
-      ->option_text(fmt::format("N (default: {})", options.logPriority));
-}
 
 int runLive(const LiveOptions& options, const LiveTaskMaker& makeTask) {
   // A reader that goes away is noticed where it is written to; dying of it would leave things
   // behind.
   std::signal(SIGPIPE, SIG_IGN);
-  if (options.demoSource.empty()) return run(options, makeTask, nullptr);
+  if (options.demoSource.empty()) return Run(options, makeTask, nullptr).untilFinished();
   const auto demo = startDemoServer(options.demoSource);
   if (!demo) {
     complain(demo.error().message);
     return kExitNothingDone;
   }
-  return run(options, makeTask, demo->get());
+  return Run(options, makeTask, demo->get()).untilFinished();
 }
 
 }  // namespace kestro

@@ -7,21 +7,9 @@
 #include <string>
 
 #include "Platform/Linux/LinuxPlatform.h"
-
-namespace CLI {
-class App;
-}  // namespace CLI
+#include "Platform/ProgramOptions.h"
 
 namespace kestro {
-
-struct LiveOptions {
-  std::string serverName = "TelephonyServer";
-  std::string demoSource;  ///< empty: no demo
-  int logPriority = static_cast<int>(LogPriority::Notice);
-};
-
-/// Declares --server, --demo and --log-priority.
-void addLiveOptions(CLI::App& command, LiveOptions& options);
 
 /// What such a command does while the platform's event loop runs.
 class LiveTask {

@@ -12,7 +12,7 @@
 #include <utility>
 #include <vector>
 
-#include "Platform/PortName.h"
+#include "Platform/ProgramOptions.h"
 
 namespace kestro {
 namespace {
@@ -62,7 +62,6 @@ std::string speedProblem(const std::string& text) {
 struct Texts {
   std::string source = std::string(sourceKinds().front().name);
   std::string technology;
-  int logPriority = static_cast<int>(LogPriority::Notice);
   int parent = 0;
 };
 
@@ -70,27 +69,20 @@ void declare(CLI::App& app, ServerOptions& options, Texts& texts) {
   const std::vector<std::string> technologies(technologyChoices().begin(),
                                               technologyChoices().end());
   app.add_option("--source", texts.source, "Where the messages come from (below)")
-      ->type_name("KIND[:ARGUMENT]")
-      ->capture_default_str();
+      ->option_text(fmt::format("KIND[:ARGUMENT] (default: {})", texts.source));
   app.add_option("--technology", texts.technology,
                  fmt::format("What the messages are, whatever the source says:\n{}",
                              fmt::join(technologies, ", ")))
-      ->type_name("NAME")
-      ->check(CLI::IsMember(technologies).description(""));
+      ->check(CLI::IsMember(technologies))
+      ->option_text("NAME");
   app.add_option("--speed", options.playback.speed, "Seconds of the source in one second")
-      ->type_name("X")
-      ->check(speedProblem)
-      ->capture_default_str();
+      ->check(CLI::Validator(speedProblem, ""))
+      ->option_text(fmt::format("X (default: {})", options.playback.speed));
   app.add_flag("--loop", options.playback.loop, "Begin again when the source has ended");
   app.add_option("--name", options.portName, "The server's port")
-      ->type_name("PORT")
-      ->capture_default_str();
-  app.add_option("--log-priority", texts.logPriority,
-                 "Write lines up to this priority to the system log:\n3 errors to 7 everything")
-      ->type_name("N")
-      ->check(CLI::Range(static_cast<int>(LogPriority::Error), static_cast<int>(LogPriority::Debug))
-                  .description(""))
-      ->capture_default_str();
+      ->check(CLI::Validator(portNameProblem, ""))
+      ->option_text(fmt::format("NAME (default: {})", options.portName));
+  addLogPriorityOption(app, options.logThreshold);
   app.add_option("--exit-with-parent", texts.parent)->expected(0, 1)->group("");
 }
 
@@ -98,13 +90,6 @@ Result<void> understand(const CLI::App& app, const Texts& texts, ServerOptions& 
   auto source = parseSource(texts.source, technologyChosen(texts.technology));
   if (!source) return tl::unexpected(source.error());
   options.source = std::move(*source);
-  if (!isPortName(options.portName)) {
-    return failure(
-        fmt::format("--name: \"{}\" is no port name (1 to 64 letters, digits, '.', "
-                    "'-', '_')",
-                    options.portName));
-  }
-  options.logThreshold = static_cast<LogPriority>(texts.logPriority);
   options.exitsWithParent = app.count("--exit-with-parent") > 0;
   if (texts.parent > 0) options.parent = texts.parent;
   return {};
@@ -112,10 +97,11 @@ Result<void> understand(const CLI::App& app, const Texts& texts, ServerOptions& 
 
 }  // namespace
 
-std::variant<ServerOptions, OptionsText> parseServerOptions(int argumentCount,
+std::variant<ServerOptions, OptionsText> parseServerOptions(const Bundle& bundle, int argumentCount,
                                                             const char* const* arguments) {
   CLI::App app("Streams the log messages of a phone's baseband to Kestro's displays.",
                "kestro-telephonyd");
+  addVersionOption(app, bundle);
   app.footer(footer());
   ServerOptions options;
   Texts texts;

@@ -6,6 +6,7 @@
 #include <string>
 #include <variant>
 
+#include "Platform/Bundle.h"
 #include "Platform/SystemLog.h"
 #include "TelephonyServer/Playback.h"
 #include "TelephonyServer/Sources/SourceCatalogue.h"
@@ -24,16 +25,16 @@ struct ServerOptions {
   std::optional<int> parent;
 };
 
-/// What the program has to say instead of running: a help text, or what is wrong with its command
-/// line.
+/// What the program has to say instead of running: a help text, its version, or what is wrong with
+/// its command line.
 struct OptionsText {
   std::string text;
-  /// 0 for help that was asked for, 2 for wrong usage.
+  /// 0 for help or the version that was asked for, 2 for wrong usage.
   int exitStatus = 0;
 };
 
-/// Reads the command line; prints nothing.
+/// Reads the command line; the version is the bundle's. Prints nothing.
 [[nodiscard]] std::variant<ServerOptions, OptionsText> parseServerOptions(
-    int argumentCount, const char* const* arguments);
+    const Bundle& bundle, int argumentCount, const char* const* arguments);
 
 }  // namespace kestro

@@ -44,7 +44,7 @@ int serve(LinuxPlatform& platform, const ServerOptions& options) {
 }
 
 int runServer(int argumentCount, const char* const* arguments) {
-  const auto parsed = parseServerOptions(argumentCount, arguments);
+  const auto parsed = parseServerOptions(*createBundle(), argumentCount, arguments);
   if (const auto* text = std::get_if<OptionsText>(&parsed)) {
     std::fputs(text->text.c_str(), text->exitStatus == 0 ? stdout : stderr);
     return text->exitStatus;

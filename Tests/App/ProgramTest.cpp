@@ -19,6 +19,7 @@ namespace {
 
 using ::testing::EndsWith;
 using ::testing::HasSubstr;
+using ::testing::MatchesRegex;
 using ::testing::SizeIs;
 
 class ProgramTest : public LiveTest {
@@ -127,7 +128,8 @@ TEST_F(ProgramTest, WrongUsageIsRefused) {
                                                        {"--server=a/b"},
                                                        {"--after=1"},
                                                        {"--unknown"},
-                                                       {"--log-priority=9"},
+                                                       {"--log-priority=2"},
+                                                       {"--log-priority=8"},
                                                        {"--demo", "--server=A"},
                                                        {"--after=-1", "--screenshot=a.png"}};
   for (const auto& arguments : wrong) {
@@ -139,6 +141,12 @@ TEST_F(ProgramTest, HelpNeedsNoDisplay) {
   const auto kestro = startKestro({"--help"}, {{"QT_QPA_PLATFORM", ""}, {"DISPLAY", ""}});
   EXPECT_EQ(kestro->wait(), 0);
   EXPECT_THAT(kestro->output(), HasSubstr("--screenshot"));
+}
+
+TEST_F(ProgramTest, TheVersionNamesTheProgram) {
+  const auto kestro = startKestro({"--version"}, {{"QT_QPA_PLATFORM", ""}, {"DISPLAY", ""}});
+  EXPECT_EQ(kestro->wait(), 0);
+  EXPECT_THAT(kestro->output(), MatchesRegex("kestro [0-9]+\\.[0-9]+\\.[0-9]+\n"));
 }
 
 TEST_F(ProgramTest, WithoutADisplayItSaysSo) {

@@ -46,6 +46,7 @@ _APP = ("Model", "LogGenerator", "Platform")
 # A source belongs to the room with the longest path that it lies under; a single file can be one.
 ROOMS = {
     "Platform": Room((), CORE),
+    "Platform/ProgramOptions.cpp": Room(("Platform",), CORE | {"command lines"}),
     "Platform/Virtual": Room(("Platform",), CORE),
     "Platform/Linux": Room(
         ("Platform",), HOSTED | {"qt", "property lists", "system log", "sockets"}

@@ -7,6 +7,7 @@
 #include <variant>
 #include <vector>
 
+#include "Platform/Virtual/VirtualServices.h"
 #include "TelephonyServer/Options.h"
 
 namespace kestro {
@@ -17,7 +18,9 @@ using ::testing::HasSubstr;
 std::variant<ServerOptions, OptionsText> parse(std::initializer_list<const char*> arguments) {
   std::vector<const char*> line{"kestro-telephonyd"};
   line.insert(line.end(), arguments);
-  return parseServerOptions(static_cast<int>(line.size()), line.data());
+  VirtualBundle bundle;
+  bundle.setVersion("1.2.3");
+  return parseServerOptions(bundle, static_cast<int>(line.size()), line.data());
 }
 
 ServerOptions options(std::initializer_list<const char*> arguments) {
@@ -80,9 +83,16 @@ TEST(OptionsTest, wrongUsageIsStatusTwo) {
   EXPECT_EQ(refusal({"--speed=inf"}).exitStatus, 2);
   EXPECT_EQ(refusal({"--speed=fast"}).exitStatus, 2);
   EXPECT_EQ(refusal({"--name=a/b"}).exitStatus, 2);
+  EXPECT_EQ(refusal({"--log-priority=2"}).exitStatus, 2);
   EXPECT_EQ(refusal({"--log-priority=8"}).exitStatus, 2);
   EXPECT_EQ(refusal({"--unknown"}).exitStatus, 2);
   EXPECT_EQ(refusal({"stray"}).exitStatus, 2);
+}
+
+TEST(OptionsTest, theVersionIsTheBundles) {
+  const auto version = refusal({"--version"});
+  EXPECT_EQ(version.exitStatus, 0);
+  EXPECT_EQ(version.text, "kestro-telephonyd 1.2.3\n");
 }
 
 TEST(OptionsTest, helpDescribesEverySource) {
