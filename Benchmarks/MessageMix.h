@@ -119,13 +119,14 @@ void decodeMessages(benchmark::State& state, Display& display,
   const auto decode = [&] {
     for (const MessageOf<Values>& message : messages) display.receive(message.bytes);
   };
+  timeDecoding(state, messages.size(), decode);
   std::string buffer(kLongestText, '\0');
   const auto format = [&] {
     for (const MessageOf<Values>& message : messages) {
       benchmark::DoNotOptimize(message.format(message.values, buffer.data()));
     }
   };
-  measure(state, messages.size(), decode, format);
+  compareWithFloor(state, decode, format);
 }
 
 /// Registers a benchmark of these messages, once they have shown what they must.
