@@ -14,7 +14,7 @@
 namespace kestro {
 namespace {
 
-enum class Content : std::uint8_t { Text, Number, Hexadecimal };
+enum class Content : std::uint8_t { Text, Number, Decibels, Hexadecimal };
 
 struct Column {
   DriveTestColumn column;
@@ -26,13 +26,13 @@ struct Column {
 constexpr std::array<Column, kDriveTestColumnCount> kColumns = {{
     {DriveTestColumn::Timestamp, "Timestamp", Content::Text, true},
     {DriveTestColumn::NetworkMode, "NetworkMode", Content::Text, true},
-    {DriveTestColumn::Level, "RSRP", Content::Number, true},
-    {DriveTestColumn::Quality, "RSRQ", Content::Number, false},
-    {DriveTestColumn::SignalToNoise, "SNR", Content::Number, false},
-    {DriveTestColumn::TotalPower, "RSSI", Content::Number, false},
+    {DriveTestColumn::Level, "RSRP", Content::Decibels, true},
+    {DriveTestColumn::Quality, "RSRQ", Content::Decibels, false},
+    {DriveTestColumn::SignalToNoise, "SNR", Content::Decibels, false},
+    {DriveTestColumn::TotalPower, "RSSI", Content::Decibels, false},
     {DriveTestColumn::ChannelQuality, "CQI", Content::Number, false},
-    {DriveTestColumn::NeighbourLevel, "NRxRSRP", Content::Number, false},
-    {DriveTestColumn::NeighbourQuality, "NRxRSRQ", Content::Number, false},
+    {DriveTestColumn::NeighbourLevel, "NRxRSRP", Content::Decibels, false},
+    {DriveTestColumn::NeighbourQuality, "NRxRSRQ", Content::Decibels, false},
     {DriveTestColumn::DownlinkRate, "DL_bitrate", Content::Number, false},
     {DriveTestColumn::UplinkRate, "UL_bitrate", Content::Number, false},
     {DriveTestColumn::CellId, "CellID", Content::Number, false},
@@ -89,12 +89,17 @@ bool isWhollyParsed(std::string_view text, T& value, auto... format) {
   return error == std::errc() && stop == end;
 }
 
+/// No receiver measures more, either way; an integer holds it.
+constexpr double kMostDecibels = 1000;
+
 bool isUsable(std::string_view text, Content content) {
   double number = 0;
   std::uint64_t hexadecimal = 0;
   switch (content) {
     case Content::Number:
       return isWhollyParsed(text, number) && std::isfinite(number);
+    case Content::Decibels:
+      return isWhollyParsed(text, number) && std::abs(number) <= kMostDecibels;
     case Content::Hexadecimal:
       return isWhollyParsed(text, hexadecimal, 16);
     case Content::Text:

@@ -36,6 +36,22 @@ inline constexpr const char* kLookupNames[] = {"kChannel",         "k1xEVDODevic
                                                "kBaseId",          "kProtocolRevision",
                                                "kFLDataRate",      "kRLDataRate"};
 
+/// What is shown of the band classes 0 to 12, and of one that is none.
+inline constexpr const char* kBandClassTexts[] = {"800 MHz cellular band [0]",
+                                                  "1.8 to 2.0GHz PCS band [1]",
+                                                  "872 to 960MHz TACS band [2]",
+                                                  "832 to 925MHz JTACS band [3]",
+                                                  "1.75 to 1.87GHz Korean PCS band [4]",
+                                                  "450MHz band [5]",
+                                                  "2GHz band [6]",
+                                                  "700MHz band [7]",
+                                                  "1800 MHz band [8]",
+                                                  "900 MHzband [9]",
+                                                  "Secondary 800 MHz band [10]",
+                                                  "400 MHz European PAMR band [11]",
+                                                  "800 MHz European PAMR band [12]",
+                                                  "[Bad Value 13]"};
+
 /// A sub-packet: what is not written is 0, its size stands where it says itself.
 class SubPacketBytes {
  public:

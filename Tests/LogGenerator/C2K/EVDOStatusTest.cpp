@@ -86,23 +86,9 @@ TEST_F(EVDOStatusTest, NamesEverySessionState) {
 }
 
 TEST_F(EVDOStatusTest, NamesEveryBandClass) {
-  const char* const names[] = {"800 MHz cellular band [0]",
-                               "1.8 to 2.0GHz PCS band [1]",
-                               "872 to 960MHz TACS band [2]",
-                               "832 to 925MHz JTACS band [3]",
-                               "1.75 to 1.87GHz Korean PCS band [4]",
-                               "450MHz band [5]",
-                               "2GHz band [6]",
-                               "700MHz band [7]",
-                               "1800 MHz band [8]",
-                               "900 MHzband [9]",
-                               "Secondary 800 MHz band [10]",
-                               "400 MHz European PAMR band [11]",
-                               "800 MHz European PAMR band [12]",
-                               "[Bad Value 13]"};
-  for (unsigned value = 0; value < std::size(names); ++value) {
+  for (unsigned value = 0; value < std::size(kBandClassTexts); ++value) {
     receive(status().u16(13, value << 11));
-    EXPECT_EQ(text("kBandClass"), names[value]);
+    EXPECT_EQ(text("kBandClass"), kBandClassTexts[value]);
     EXPECT_EQ(text("kChannel"), "0");
   }
 }

@@ -103,26 +103,12 @@ TEST_F(OneXStatusTest, NamesEveryState) {
 }
 
 TEST_F(OneXStatusTest, NamesEveryBandClassOfBothReceivers) {
-  const char* const names[] = {"800 MHz cellular band [0]",
-                               "1.8 to 2.0GHz PCS band [1]",
-                               "872 to 960MHz TACS band [2]",
-                               "832 to 925MHz JTACS band [3]",
-                               "1.75 to 1.87GHz Korean PCS band [4]",
-                               "450MHz band [5]",
-                               "2GHz band [6]",
-                               "700MHz band [7]",
-                               "1800 MHz band [8]",
-                               "900 MHzband [9]",
-                               "Secondary 800 MHz band [10]",
-                               "400 MHz European PAMR band [11]",
-                               "800 MHz European PAMR band [12]",
-                               "[Bad Value 13]"};
-  constexpr unsigned kCount = std::size(names);
+  constexpr unsigned kCount = std::size(kBandClassTexts);
   for (unsigned value = 0; value < kCount; ++value) {
     const unsigned other = kCount - 1 - value;
     receive(status(stateOf(kTraffic), radio().u8(4, value).u8(5, other), activeSet(0, 12)));
-    EXPECT_EQ(text("k1xRx0BandClass"), names[value]);
-    EXPECT_EQ(text("k1xRx1BandClass"), names[other]);
+    EXPECT_EQ(text("k1xRx0BandClass"), kBandClassTexts[value]);
+    EXPECT_EQ(text("k1xRx1BandClass"), kBandClassTexts[other]);
   }
   receive(status(stateOf(kTraffic), radio().u8(4, 255).u8(5, 9), activeSet(0, 12)));
   EXPECT_EQ(text("k1xRx0BandClass"), "[Bad Value 255]");

@@ -202,6 +202,23 @@ TEST_F(DriveTestLogTest, valuesThatAreNoneCountAsNotMeasured) {
   EXPECT_EQ(_problems.first, "line 3: RSRP cannot be \"-9o\"");
 }
 
+TEST_F(DriveTestLogTest, levelsThatNoReceiverMeasuresAreNone) {
+  const auto rows = rowsOf(
+      "Timestamp,NetworkMode,RSRP,RSRQ,SNR,RSSI,NRxRSRP,NRxRSRQ,DL_bitrate\n"
+      "2019.11.21_15.38.36,LTE,-1000,1000,4,-72,-99,-14,10\n"
+      "2019.11.21_15.38.37,LTE,-1000.5,1001,-9e20,1e308,2147483647,-2000,9000000\n");
+  ASSERT_EQ(rows.size(), 2U);
+  EXPECT_EQ(rows[1].text(Column::Level), "-1000");
+  EXPECT_EQ(rows[1].text(Column::Quality), "1000");
+  EXPECT_EQ(rows[1].text(Column::SignalToNoise), "4");
+  EXPECT_EQ(rows[1].text(Column::TotalPower), "-72");
+  EXPECT_EQ(rows[1].text(Column::NeighbourLevel), "-99");
+  EXPECT_EQ(rows[1].text(Column::NeighbourQuality), "-14");
+  EXPECT_EQ(rows[1].text(Column::DownlinkRate), "9000000");
+  EXPECT_EQ(_problems.values, 6U);
+  EXPECT_EQ(_problems.first, "line 3: RSRP cannot be \"-1000.5\"");
+}
+
 TEST_F(DriveTestLogTest, whatIsReportedOfGarbageIsALineOfText) {
   rowsOf("Timestamp,NetworkMode,RSRP\n\"a\nb\x1B[2J\",LTE,-90\n");
   EXPECT_EQ(_problems.first, "line 2: \"a?b?[2J\" is no time");
