@@ -34,9 +34,9 @@ function(kestro_library name)
   endif()
 endfunction()
 
-# kestro_check_headers(LIBRARY HEADER...): compiles headers alone, with no more in reach than the
-# library gives to those who link it: those that no source begins with (a header's own source does,
-# see Tests/Structure) and so compiles alone already.
+# kestro_check_headers(LIBRARY HEADER...): compiles headers alone, those without a source of their
+# own. The others are the first that their sources include (see Tests/Structure), and so need no more
+# than they include themselves.
 function(kestro_check_headers library)
   set(units)
   foreach(header IN LISTS ARGN)

@@ -33,10 +33,10 @@ Error writeError(const std::string& path) {
 
 struct CaptureWriter::Handle {
   struct PcapCloser {
-    void operator()(pcap_t* closed) const { pcap_close(closed); }
+    void operator()(pcap_t* handle) const { pcap_close(handle); }
   };
   struct DumperCloser {
-    void operator()(pcap_dumper_t* closed) const { pcap_dump_close(closed); }
+    void operator()(pcap_dumper_t* handle) const { pcap_dump_close(handle); }
   };
 
   // Room for the longest record, so that each reaches the system in one piece. Outlives the stream

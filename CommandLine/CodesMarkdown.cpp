@@ -64,7 +64,7 @@ void appendOverview(std::string& output, const TechnologyCodes& technology) {
   }
 }
 
-void appendKeys(std::string& output, std::span<const CatalogueKey> keys) {
+void appendKeyTable(std::string& output, std::span<const CatalogueKey> keys) {
   output += "| Key | From | Shown as |\n|---|---|---|\n";
   for (const CatalogueKey& key : keys) {
     fmt::format_to(std::back_inserter(output), "| {} | {} | {} |\n", cell(key.key),
@@ -98,7 +98,7 @@ void appendEntry(std::string& output, const CatalogueEntry& entry) {
                      rest[0].list.empty() ? "Rows, " : cell(rest[0].list) + ": rows, ",
                      cell(tableText(*rest[0].table)));
     }
-    appendKeys(output, rest.first(size));
+    appendKeyTable(output, rest.first(size));
     rest = rest.subspan(size);
   }
 }

@@ -30,7 +30,8 @@ its row in a list, its key, the bytes that it was read from with their offset, t
 integer that they make, the raw value and the text that is shown. Offsets count from the packet's
 first byte. A value that was computed has a line for each place; one that comes from a property list
 has its key there instead of bytes. "--" is a byte past the packet's end, which reads as 0; "BE" an
-integer whose most significant byte comes first. A value without a text is not shown.
+integer whose most significant byte comes first. A value without a text is not shown; nor is a
+list's count, whose text, if it has one, is the number of records where another number is stored.
 
 Formats:
   table  for people, a table a packet

@@ -8,7 +8,7 @@ namespace kestro {
 namespace {
 
 template <class Writer>
-std::unique_ptr<ExplainWriter> makeWriter(Output& output) {
+std::unique_ptr<ExplainWriter> makeExplainWriter(Output& output) {
   return std::make_unique<Writer>(output);
 }
 
@@ -16,8 +16,8 @@ std::unique_ptr<ExplainWriter> makeWriter(Output& output) {
 
 const std::vector<ExplainFormat>& explainFormats() {
   static const std::vector<ExplainFormat> kFormats = {
-      {"table", makeWriter<ExplainTable>},
-      {"json", makeWriter<ExplainJson>},
+      {"table", makeExplainWriter<ExplainTable>},
+      {"json", makeExplainWriter<ExplainJson>},
   };
   return kFormats;
 }

@@ -11,7 +11,9 @@
 #include "CommandLine/FullScreen.h"
 #include "CommandLine/Output.h"
 #include "Model/LastWords.h"
+#include "Platform/DemoServer.h"
 #include "Platform/MainQueue.h"
+#include "Platform/SystemLog.h"
 
 namespace kestro {
 namespace {
@@ -35,6 +37,9 @@ class Run {
         _task(makeTask(*_platform, [this](int exitStatus, std::string complaint) {
           finish(exitStatus, std::move(complaint));
         })) {}
+  Run(const Run&) = delete;
+  Run& operator=(const Run&) = delete;
+  ~Run() = default;
 
   /// Runs until the task finishes; the exit status.
   int untilFinished() {

@@ -40,7 +40,10 @@ class LogGenerator {
   LogGenerator(const LogGenerator&) = delete;
   LogGenerator& operator=(const LogGenerator&) = delete;
 
-  /// Applies one message to the state. Throws for a message that ends the application.
+  /// Applies one message, borrowed for the call, to the state. A message that ends the application
+  /// throws: InternalConsistencyFailure (IFX; the state is as it was), ArrayOutOfBoundsException or
+  /// UnknownDataException (packets; sections may be half written, and the packet is not collected).
+  /// Packets are collected until the next `generateLogUsingState`.
   virtual void updateStateWithData(Dictionary& state, ByteView data) = 0;
 
   /// Returns the display object, or null when there is none yet, after recording a history entry.

@@ -49,7 +49,9 @@ class KestroModel : public std::enable_shared_from_this<KestroModel> {
   bool createPorts();
   /// Stops the timer and closes both ports; generator, state and cached tree stay.
   void destroyPorts();
-  /// Asks for the technology and makes its generator. A failure leaves the generator as it was.
+  /// Asks for the technology and makes its generator; the ports must exist. A request that fails,
+  /// or a reply without a technology, leaves the generator as it was; a technology that nobody
+  /// speaks leaves the model without one. Display and state stay in any case.
   void configureGenerator();
   /// Connects, configures, sends the start command and starts the refresh timer; after a failure it
   /// closes the ports and tries again in 5 s. Does nothing while the timer runs.
@@ -60,7 +62,8 @@ class KestroModel : public std::enable_shared_from_this<KestroModel> {
   /// log channel is gone, and, when new data arrived, drops the tree and asks for a redraw.
   void refresh();
 
-  /// The display tree, built when it is not cached; null without a generator.
+  /// The display tree, built when it is not cached; without a generator the cached one, or
+  /// null.
   [[nodiscard]] NodePointer topLevelNodes();
   /// The node at a path ("/" is the root); null when there is none.
   [[nodiscard]] NodePointer nodeAtPath(std::string_view path);

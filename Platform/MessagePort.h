@@ -63,8 +63,9 @@ class RemotePort {
   RemotePort(const RemotePort&) = delete;
   RemotePort& operator=(const RemotePort&) = delete;
 
-  /// Queues one message and returns at once. At most 4 MiB wait for a slow peer; a message beyond
-  /// that closes the connection (with a log line) and yields SendError::Transport.
+  /// Queues one message and returns at once. At most 4 MiB wait for a slow peer, 256 KiB while more
+  /// than 64 MiB wait for all peers of the process; a message beyond that closes the connection
+  /// (with a log line) and yields SendError::Transport.
   virtual SendError post(std::int32_t messageId, ByteView message) = 0;
 
   /// Sends one message, waiting at most `sendTimeout` until it has been handed to the system.

@@ -129,8 +129,11 @@ class Value {
   [[nodiscard]] std::int64_t integerBits() const noexcept;
   /// Whether this is an integer above 2^63 - 1, which `integerBits` shows negative.
   [[nodiscard]] bool isAboveInt64() const noexcept { return _tag == kUnsigned; }
+  /// The real number; 0 when this is none (integers are not converted).
   [[nodiscard]] double realNumber() const noexcept;
+  /// The boolean; false when this is none.
   [[nodiscard]] bool flag() const noexcept;
+  /// The date; 1970-01-01 00:00:00 UTC when this is none.
   [[nodiscard]] Moment moment() const noexcept;
   /// The bytes of a data value, else empty. Valid as long as any copy of this value lives.
   [[nodiscard]] ByteView bytes() const noexcept;
@@ -266,6 +269,7 @@ class KeyList {
   ~KeyList();
 
   [[nodiscard]] std::size_t size() const noexcept;
+  /// `index` must be below `size()`.
   [[nodiscard]] const Value& operator[](std::size_t index) const noexcept;
 
  private:
@@ -305,7 +309,8 @@ class Dictionary {
   Dictionary(std::initializer_list<std::pair<Value, Value>> entries);
   /// A new dictionary with these keys, all values null; the keys are shared, not copied.
   explicit Dictionary(const KeyList& keys);
-  /// A new dictionary with these keys and as many values, in the keys' order.
+  /// A new dictionary with these keys and their values, in the keys' order. Values that are missing
+  /// are null; those too many are dropped.
   Dictionary(const KeyList& keys, std::vector<Value> values);
   [[nodiscard]] static Dictionary null() noexcept { return Dictionary(nullptr); }
 
@@ -333,8 +338,9 @@ class Dictionary {
 
   /// Replaces the value under `key` where it stands, or appends the entry; returns its index.
   std::size_t set(const Value& key, Value value);
-  /// Like `set`, looking at the entry with index `hint` first: a constant-time write for who writes
-  /// the same keys again and again and remembers where they stood. Any hint is allowed.
+  /// Like `set`, looking at the entry with index `hint` first: a constant-time write for a
+  /// caller that writes the same keys again and again and remembers where they stood. Any hint is
+  /// allowed.
   std::size_t set(const Value& key, const Value& value, std::size_t hint);
   /// Removes the entry; false when there was none. Later entries move up.
   bool remove(const Value& key);
@@ -343,6 +349,7 @@ class Dictionary {
   /// Entry number `index` below `size()`, in enumeration order.
   [[nodiscard]] const Value& keyAt(std::size_t index) const noexcept;
   [[nodiscard]] const Value& valueAt(std::size_t index) const noexcept;
+  /// `index` must be below `size()`.
   void setValueAt(std::size_t index, Value value) noexcept;
   /// The values in the order of their keys, to be written over. Valid until a key comes or goes.
   [[nodiscard]] std::span<Value> valuesToRewrite() noexcept;
@@ -388,6 +395,7 @@ class Array {
 
   /// The elements in order; the span is valid until the next change.
   [[nodiscard]] std::span<const Value> elements() const noexcept;
+  /// `index` must be below `size()`.
   [[nodiscard]] const Value& operator[](std::size_t index) const noexcept {
     return elements()[index];
   }

@@ -1,5 +1,9 @@
 // SPDX-License-Identifier: MIT
 // The containers of property lists.
+#include <algorithm>
+#include <iterator>
+#include <utility>
+
 #include "Platform/PropertyList.h"
 #include "Platform/PropertyListObjects.h"
 

@@ -17,8 +17,8 @@
 
 #include "Platform/PropertyList.h"
 
-namespace kestro {
-namespace detail {
+namespace kestro::detail {
+
 /// Lists of keys longer than this are searched through an index.
 inline constexpr std::size_t kLinearSearchLimit = 24;
 
@@ -178,6 +178,4 @@ inline void releaseArray(ArrayObject* object) noexcept {
 /// What is handed out for what is not there.
 inline constinit const Value kNullValue;
 
-}  // namespace detail
-
-}  // namespace kestro
+}  // namespace kestro::detail

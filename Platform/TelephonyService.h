@@ -30,7 +30,7 @@ class TqServerConnection {
 
 /// The answer to a log-channel request: 0 and the name of the server's port, or an error number.
 struct LogChannelReply {
-  long error = 0;  ///< the number of a LogChannelError (Platform/TelephonyProtocol.h)
+  long error = 0;  ///< of a LogChannelError, or of a SendError (Platform/TelephonyProtocol.h)
   std::optional<std::string> portName;
 };
 

@@ -18,8 +18,8 @@ namespace kestro {
 namespace {
 
 constexpr int kWrongUsage = 2;
-constexpr double kSlowest = 0.001;
-constexpr double kFastest = 1e6;
+constexpr double kSlowestPlayback = 0.001;
+constexpr double kFastestPlayback = 1e6;
 
 std::string indented(std::string_view text, std::string_view indent) {
   std::string result(indent);
@@ -54,8 +54,9 @@ std::string speedProblem(const std::string& text) {
   const char* end = text.data() + text.size();
   const auto [stop, error] = std::from_chars(text.data(), end, speed);
   const bool isNumber = error == std::errc() && stop == end;
-  if (isNumber && speed >= kSlowest && speed <= kFastest) return {};
-  return fmt::format("{} is not a number from {} to {:.0f}", text, kSlowest, kFastest);
+  if (isNumber && speed >= kSlowestPlayback && speed <= kFastestPlayback) return {};
+  return fmt::format("{} is not a number from {} to {:.0f}", text, kSlowestPlayback,
+                     kFastestPlayback);
 }
 
 /// The command line's texts, before they are understood.

@@ -185,7 +185,9 @@ struct Condition {
   [[nodiscard]] constexpr bool isAlways() const { return lowest > highest; }
 };
 
+/// `lowest` must not exceed `highest`; in a table the compiler says so.
 [[nodiscard]] constexpr Condition between(Place place, std::int64_t lowest, std::int64_t highest) {
+  if (lowest > highest) throw "a range without values";
   return {place, lowest, highest};
 }
 [[nodiscard]] constexpr Condition equals(Place place, std::int64_t value) {

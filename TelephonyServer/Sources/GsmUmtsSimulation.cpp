@@ -15,7 +15,7 @@ namespace {
 constexpr unsigned kBroadcastSteps = 10;
 constexpr unsigned kContextSteps = 4;
 
-constexpr std::size_t kMostNeighbours = 6;
+constexpr std::size_t kMostUmtsNeighbours = 6;
 constexpr unsigned kUarfcn = 10613;
 
 // Codes whose contents nobody has described.
@@ -50,7 +50,7 @@ std::vector<GsmCellReport> gsmNeighbours(const SimulatedPhone& phone) {
   const bool isServing = phone.access() == RadioAccess::Gsm;
   std::vector<GsmCellReport> neighbours;
   for (const CellLevel& level : phone.gsmLevels()) {
-    if (neighbours.size() == kMostNeighbours) break;
+    if (neighbours.size() == kMostUmtsNeighbours) break;
     if (isServing && level.cell == phone.servingCell()) continue;
     neighbours.push_back(gsmReport(phone, level));
   }
@@ -61,7 +61,7 @@ std::vector<UmtsCellReport> umtsNeighbours(const SimulatedPhone& phone) {
   const bool isServing = phone.access() == RadioAccess::Umts;
   std::vector<UmtsCellReport> neighbours;
   for (const CellLevel& level : phone.umtsLevels()) {
-    if (neighbours.size() == kMostNeighbours) break;
+    if (neighbours.size() == kMostUmtsNeighbours) break;
     if (isServing && level.cell == phone.servingCell()) continue;
     neighbours.push_back(umtsReport(phone, level));
   }

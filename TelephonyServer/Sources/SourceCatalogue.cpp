@@ -32,10 +32,13 @@ constexpr std::array kTechnologies = {
     kTqLogChannelTechnology_Ondrel_CDMA, kTqLogChannelTechnology_Ondrel_LTE,
     kTqLogChannelTechnology_Ondrel_UTRAN2};
 
-// For --technology: the five, and the wish to follow the source.
-constexpr std::array kTechnologyChoices = {kTechnologies[0], kTechnologies[1],
-                                           kTechnologies[2], kTechnologies[3],
-                                           kTechnologies[4], kAutomaticTechnology};
+// For --technology: all of them, and the wish to follow the source.
+constexpr auto kTechnologyChoices = [] {
+  std::array<std::string_view, kTechnologies.size() + 1> choices;
+  std::ranges::copy(kTechnologies, choices.begin());
+  choices.back() = kAutomaticTechnology;
+  return choices;
+}();
 
 // What is made of logs and streams that do not know better.
 std::string_view orDefault(std::string_view technology) {

@@ -15,7 +15,7 @@ using std::chrono::milliseconds;
 constexpr unsigned kUarfcns[] = {10055, 10063, 10071};
 
 // Thermal noise and the receiver's own.
-constexpr double kNoise = -106;
+constexpr double kTddNoise = -106;
 // What spreading gains, how much of a jointly detected cell's interference is taken away, and how
 // far below itself a signal disturbs itself by its echoes.
 constexpr double kSpreadingGain = 9;
@@ -39,7 +39,7 @@ RadioLayerParameters radioParameters(std::uint64_t seed) {
   return {.seed = hashed(seed, 21), .frequency = 2012, .power = 44, .sites = RingRoad::allSites()};
 }
 
-RadioLayerParameters gsmParameters(std::uint64_t seed) {
+RadioLayerParameters gsmLayerParameters(std::uint64_t seed) {
   return {.seed = hashed(seed, 22),
           .frequency = 900,
           .power = 47,
@@ -111,7 +111,7 @@ UtranPhone::UtranPhone(std::uint64_t seed)
     : _seed(seed),
       _drive(hashed(seed, 0)),
       _radio(radioParameters(seed)),
-      _gsm(gsmParameters(seed)),
+      _gsm(gsmLayerParameters(seed)),
       _session(hashed(seed, 4)) {
   advance(milliseconds(0));
 }
@@ -147,7 +147,7 @@ void UtranPhone::measureInterference() {
   const std::size_t serving = _selection.serving();
   const double servingLevel = levelOfCell(_levels, serving).level;
   PowerSum interference;
-  interference.add(kNoise);
+  interference.add(kTddNoise);
   interference.add(servingLevel - kEchoLoss);
   _jointlyDetected = {serving};
   for (const auto& [index, level, distance] : _levels) {

@@ -11,7 +11,7 @@ namespace kestro {
 namespace {
 
 // How often what changes rarely is said again, in steps.
-constexpr unsigned kListSteps = 4;
+constexpr unsigned kUtranListSteps = 4;
 
 constexpr unsigned kBand = 34;  // 2010 to 2025 MHz
 
@@ -63,13 +63,13 @@ std::vector<Bytes> UtranSimulation::step(std::chrono::milliseconds elapsed, Mome
 }
 
 void UtranSimulation::addServingCell(PacketList& packets, Moment now) {
-  if (!_phone.hasNewCell() && _steps % kListSteps != 0) return;
+  if (!_phone.hasNewCell() && _steps % kUtranListSteps != 0) return;
   packets.add(utranSystemInformation(_phone.serving(), now));
   packets.add(extraPacket(kCellMonitorCode, cellMonitorList(_phone), _coding, now));
 }
 
 void UtranSimulation::addLists(PacketList& packets, Moment now) {
-  if (_steps % kListSteps == 0) {
+  if (_steps % kUtranListSteps == 0) {
     packets.add(utranGsmNeighbours(_phone.gsmCells(), now));
     packets.add(extraPacket(kPacketDataContextsCode, contexts(_phone), _coding, now));
   }

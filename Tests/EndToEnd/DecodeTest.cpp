@@ -222,6 +222,7 @@ TEST(Usage, WrongUsageIsTwo) {
       {"kestro-cli", "decode", "x.pcap", "--refresh-every=nan"},
       {"kestro-cli", "watch", "--count=0"},
       {"kestro-cli", "watch", "--server=a/b"},
+      {"kestro-cli", "watch", "--log-priority=2"},
       {"kestro-cli", "watch", "--server=A", "--demo"},
       {"kestro-cli", "record"},
       {"kestro-cli", "explain"},

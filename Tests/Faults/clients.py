@@ -210,10 +210,10 @@ def descriptors_exhausted(options):
         taken = (len(served) + 1) // 2
         waited = wait_until(
             lambda: sum(it.read().count > 0 for it in refused) >= taken,
-            "most places that become free are taken",
+            "half of the places that become free are taken",
         )
         return (
             f"{limit} descriptors, {1 + surplus} clients: {1 + len(served)} served, "
-            f"{len(refused)} refused, {share:.1%} of a processor meanwhile; of {len(served)} places "
-            f"that became free {taken} were taken within {waited:.1f} s"
+            f"{len(refused)} refused, {share:.1%} of a processor meanwhile; of {len(served)} "
+            f"places that became free {taken} were taken within {waited:.1f} s"
         )

@@ -4,6 +4,7 @@
 
 #include <unistd.h>
 
+#include <cerrno>
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
@@ -22,7 +23,10 @@ class TemporaryDirectory {
  public:
   TemporaryDirectory() {
     std::string name = std::filesystem::temp_directory_path() / "kestro-test-XXXXXX";
-    if (::mkdtemp(name.data()) != nullptr) _path = name;
+    if (::mkdtemp(name.data()) == nullptr) {
+      throw std::system_error(errno, std::generic_category(), name);
+    }
+    _path = name;
   }
   TemporaryDirectory(const TemporaryDirectory&) = delete;
   TemporaryDirectory& operator=(const TemporaryDirectory&) = delete;

@@ -3,7 +3,6 @@
 #pragma once
 
 #include <memory>
-#include <span>
 
 #include "LogGenerator/Ondrel/ClassIndex.h"
 #include "LogGenerator/Ondrel/GSM/CellSets.h"
@@ -15,9 +14,6 @@
 #include "LogGenerator/Ondrel/SharedDecoders.h"
 
 namespace kestro {
-
-/// The descriptions of all GSM/UMTS sections, in the order in which their decoders are made.
-[[nodiscard]] std::span<const Section* const> gsmSections();
 
 /// Owns one decoder for each section, made in the order of the fields.
 class Ondrel_GSMClassIndex : public ClassIndex {

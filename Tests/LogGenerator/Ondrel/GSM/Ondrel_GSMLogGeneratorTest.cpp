@@ -85,10 +85,38 @@ TEST_F(Ondrel_GSMTest, TheIndexKnowsEverySection) {
   }
 }
 
-TEST_F(Ondrel_GSMTest, TheSectionsStandInTheOrderOfTheDecoders) {
-  ASSERT_THAT(gsmSections(), SizeIs(rows().size()));
+TEST_F(Ondrel_GSMTest, EverySectionIsDescribedAsItsDecoderIsNamed) {
+  constexpr const Section* kDescribed[] = {
+      &kActiveSetSection,
+      &kCodingSchemeSection,
+      &kGPRSInformationSection,
+      &kGSMServingCellSection,
+      &kMobileAllocationSection,
+      &kNeighboringCellsSection,
+      &kPDPContextListSection,
+      &kProcessPSSection,
+      &kUMTSRRMeasurementSection,
+      &kCellChangeCountersSection,
+      &kDetectedSetSection,
+      &kGSMSetSection,
+      &kNonRankedGSMSetSection,
+      &kProcessCOSection,
+      &kServingPLMNSection,
+      &kUMTSSetSection,
+      &kEquivalentPLMNListSection,
+      &kGSMRRInfoSection,
+      &kMonitoredSetSection,
+      &kNonRankedUMTSSetSection,
+      &kProcessCSSection,
+      &kUMTSRRInfoSection,
+      &kBLERSection,
+      &kVirtualActiveSetSection,
+      &kSimInfoSection,
+      &kHSDPAInformationSection,
+  };
+  ASSERT_EQ(std::size(kDescribed), rows().size());
   for (std::size_t i = 0; i < rows().size(); ++i) {
-    const Section& section = *gsmSections()[i];
+    const Section& section = *kDescribed[i];
     EXPECT_EQ(section.name, rows()[i].name);
     EXPECT_EQ(section.logLine, rows()[i].className);
     EXPECT_THAT(section.codes, ElementsAreArray(rows()[i].codes));
