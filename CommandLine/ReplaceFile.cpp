@@ -18,10 +18,10 @@ namespace {
 
 namespace fs = std::filesystem;
 
-struct DescriptorCloser {
+struct StreamCloser {
   void operator()(std::FILE* file) const noexcept { static_cast<void>(std::fclose(file)); }
 };
-using File = std::unique_ptr<std::FILE, DescriptorCloser>;
+using File = std::unique_ptr<std::FILE, StreamCloser>;
 
 Result<void> failed(const std::string& path) {
   return failure(fmt::format("{}: {}", path, std::strerror(errno)));
