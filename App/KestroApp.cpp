@@ -7,7 +7,7 @@
 #include <QScreen>
 #include <utility>
 
-#include "App/Accessibility.h"
+#include "App/Toolkit/Accessibility.h"
 #include "Platform/Bundle.h"
 #include "Platform/Clock.h"
 #include "Platform/DeviceRoot.h"
@@ -131,7 +131,7 @@ void KestroApp::applicationWillTerminate() {
 // --- Preferences ---------------------------------------------------------------------------------
 
 void KestroApp::getRSSIPref() {
-  const auto shown = _platform->preferences().boolean(kKestroPreferencesDomain, kShowGsmRssi);
+  const auto shown = _platform->preferences().boolean(kKestroPreferencesDomain, kShowGSMRssi);
   if (shown.value_or(false)) return;
   _unsetRSSI = true;
   _setGSMRSSI(true);
@@ -143,9 +143,9 @@ void KestroApp::getSaveButtonPref() {
 
 void KestroApp::_setGSMRSSI(bool shown) {
   Preferences& preferences = _platform->preferences();
-  preferences.setBoolean(kShellPreferencesDomain, kShowGsmRssi, shown);
+  preferences.setBoolean(kShellPreferencesDomain, kShowGSMRssi, shown);
   preferences.synchronize(kShellPreferencesDomain);
-  preferences.notifyChanged(kShellPreferencesDomain, kShowGsmRssi);
+  preferences.notifyChanged(kShellPreferencesDomain, kShowGSMRssi);
 }
 
 // --- Panes ---------------------------------------------------------------------------------------

@@ -11,12 +11,12 @@
 #include <optional>
 #include <string_view>
 
-#include "App/AlertView.h"
-#include "App/KestroPaneController.h"
-#include "App/KestroSaveViewController.h"
 #include "App/MainWindow.h"
-#include "App/NavigationController.h"
-#include "App/SystemColours.h"
+#include "App/Panes/KestroPaneController.h"
+#include "App/Panes/KestroSaveViewController.h"
+#include "App/Toolkit/AlertView.h"
+#include "App/Toolkit/NavigationController.h"
+#include "App/Toolkit/SystemColours.h"
 #include "Model/KestroModel.h"
 #include "Platform/MainQueue.h"
 #include "Platform/Platform.h"
@@ -27,7 +27,7 @@ namespace kestro {
 inline constexpr std::string_view kSaveButtonPath =
     "/NorrowInternal/Library/PreferenceBundles/Carrier Settings.bundle";
 /// The preference for the signal strength as a number.
-inline constexpr std::string_view kShowGsmRssi = "LumoShowGSMRSSI";
+inline constexpr std::string_view kShowGSMRssi = "LumoShowGSMRSSI";
 
 /// How often it is looked whether the model is still connected: no new data tells so.
 inline constexpr std::chrono::milliseconds kConnectionCheckInterval{500};

@@ -6,7 +6,7 @@
 #include <functional>
 #include <memory>
 
-#include "App/NavigationController.h"
+#include "App/Toolkit/NavigationController.h"
 
 namespace kestro {
 

@@ -7,7 +7,7 @@
 #include <optional>
 #include <string>
 
-#include "Platform/ProgramOptions.h"
+#include "Options/ProgramOptions.h"
 
 namespace kestro {
 

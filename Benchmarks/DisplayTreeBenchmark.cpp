@@ -7,7 +7,7 @@
 #include <cstdlib>
 #include <memory>
 
-#include "LogGenerator/GSM/GSMLogGenerator.h"
+#include "LogGenerator/IFX/GSMLogGenerator.h"
 #include "Model/KestroModelNode.h"
 #include "Platform/Linux/LinuxPlatform.h"
 #include "Platform/Virtual/VirtualPlatform.h"

@@ -16,7 +16,7 @@
 #include <utility>
 #include <vector>
 
-#include "App/KestroPaneController.h"
+#include "App/Panes/KestroPaneController.h"
 #include "Tests/App/Screen.h"
 
 namespace kestro {

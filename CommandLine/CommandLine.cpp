@@ -7,17 +7,17 @@
 #include <string>
 #include <vector>
 
-#include "CommandLine/CodesCommand.h"
-#include "CommandLine/Command.h"
-#include "CommandLine/DecodeCommand.h"
+#include "CommandLine/Commands/CodesCommand.h"
+#include "CommandLine/Commands/Command.h"
+#include "CommandLine/Commands/DecodeCommand.h"
+#include "CommandLine/Commands/ExplainCommand.h"
+#include "CommandLine/Commands/RecordCommand.h"
+#include "CommandLine/Commands/SnapshotCommand.h"
+#include "CommandLine/Commands/WatchCommand.h"
 #include "CommandLine/ExitStatus.h"
-#include "CommandLine/ExplainCommand.h"
-#include "CommandLine/RecordCommand.h"
-#include "CommandLine/SnapshotCommand.h"
-#include "CommandLine/WatchCommand.h"
+#include "Options/ProgramOptions.h"
 #include "Platform/Bundle.h"
 #include "Platform/Linux/LinuxPlatform.h"
-#include "Platform/ProgramOptions.h"
 
 namespace kestro {
 namespace {

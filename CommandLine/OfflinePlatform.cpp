@@ -6,7 +6,7 @@
 #include <string>
 #include <utility>
 
-#include "CommandLine/JsonWriter.h"
+#include "CommandLine/Formats/JsonWriter.h"
 #include "Platform/Bundle.h"
 #include "Platform/Linux/LinuxPlatform.h"
 #include "Platform/PropertyListCoding.h"

@@ -5,7 +5,7 @@
 
 #include "Fuzz/GeneratorChannel.h"
 #include "Fuzz/MemoryFile.h"
-#include "TelephonyServer/Sources/SourceCatalogue.h"
+#include "Sources/SourceCatalogue.h"
 
 namespace kestro::fuzz {
 namespace {

@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: MIT
 // Bytes as a snapshot, and everything that is done with one: shown, its log exported, saved again.
-#include "CommandLine/SnapshotText.h"
+#include "CommandLine/Formats/SnapshotText.h"
 #include "Fuzz/SavedSnapshot.h"
-#include "Model/StorableValue.h"
+#include "Recordings/StorableValue.h"
 
 namespace kestro::fuzz {
 namespace {

@@ -5,7 +5,7 @@
 #include "Fuzz/Harness.h"
 #include "Platform/TelephonyService.h"
 #include "Platform/Virtual/VirtualServices.h"
-#include "TelephonyServer/Sources/StreamSource.h"
+#include "Sources/StreamSource.h"
 
 namespace kestro::fuzz {
 namespace {

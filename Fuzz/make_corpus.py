@@ -18,6 +18,7 @@ TEMPLATES = {
     "UTRAN2": "UTRAN",
     "Ondrel_CDMA": "C2KTemplate",
 }
+WORDS = {"IFX": "IFX", "Ondrel_GSM": "GsmUmts", "Ondrel_CDMA": "C2K", "LTE": "LTE", "UTRAN2": "UTRAN"}
 TECHNOLOGIES = ["IFX", "Ondrel_GSM", "Ondrel_CDMA", "LTE", "UTRAN2"]  # as the program lists them
 KINDS = 40  # of messages, per technology
 # Payloads on both sides of every minimum length, for each of the plain reader's codes.
@@ -59,16 +60,16 @@ def write(target, name, contents):
 
 def make_comparison(technology, kinds):
     for number, message in enumerate(kinds):
-        write(f"DifferentialFuzz_{technology}", f"message-{number:02}",
+        write(f"DifferentialFuzz_{WORDS[technology]}", f"message-{number:02}",
               WHOLE_MESSAGE + framed(message))
     drive = b"".join(WHOLE_MESSAGE + framed(message) for message in kinds[:12])
-    write(f"DifferentialFuzz_{technology}", "drive", drive + REFRESH + drive + REFRESH)
-    write(f"DifferentialFuzz_{technology}", "cut",
+    write(f"DifferentialFuzz_{WORDS[technology]}", "drive", drive + REFRESH + drive + REFRESH)
+    write(f"DifferentialFuzz_{WORDS[technology]}", "cut",
           b"".join(WHOLE_MESSAGE + framed(message[:-1]) for message in kinds[:12]))
     codes, lengths = LENGTHS[technology]
     for count in (0, 1, 2):  # of records, wherever it stands
         payload = bytes(count if i < 16 else 37 * i % 251 for i in range(2000))
-        write(f"DifferentialFuzz_{technology}", f"lengths-{count}",
+        write(f"DifferentialFuzz_{WORDS[technology]}", f"lengths-{count}",
               b"".join(bytes([code]) + framed(payload[:length])
                        for code in range(codes) for length in lengths))
 
@@ -82,7 +83,7 @@ def make_identities():
     steps = [identities + framed(cells), measurements + framed(levels), REFRESH,
              identities + framed(b"\x00"), measurements + framed(levels),
              identities + framed(b"\x00\x00"), measurements + framed(levels)]
-    write("DifferentialFuzz_Ondrel_GSM", "identities", b"".join(steps))
+    write("DifferentialFuzz_GsmUmts", "identities", b"".join(steps))
 
 
 def random_payload(numbers, length):
@@ -103,7 +104,7 @@ def make_random(technology):
                     # As short as may be, behind a sequence number that grows.
                     payload = bytes([0, step, 0, 0, 0]) + random_payload(numbers, 1732)
                 steps.append(bytes([code]) + framed(payload))
-        write(f"DifferentialFuzz_{technology}", f"random-{number}", b"".join(steps))
+        write(f"DifferentialFuzz_{WORDS[technology]}", f"random-{number}", b"".join(steps))
 
 
 def dlf_of(entries):
@@ -142,20 +143,20 @@ def make(technology, capture):
     kinds = [message for message in kinds_of(messages_of(capture)) if len(message) < 2048]
     make_recordings(technology, kinds)
     for number, message in enumerate(kinds):
-        write(f"GeneratorFuzz_{technology}", f"message-{number:02}",
+        write(f"GeneratorFuzz_{WORDS[technology]}", f"message-{number:02}",
               b"\x00\x00" + framed(message))
     everything = b"".join(b"\x00" + framed(message) for message in kinds)
-    write(f"GeneratorFuzz_{technology}", "drive", b"\x00" + everything + b"\x0c\x0d\x0e" + everything)
-    write(f"GeneratorFuzz_{technology}", "unbound", b"\x03" + everything)
+    write(f"GeneratorFuzz_{WORDS[technology]}", "drive", b"\x00" + everything + b"\x0c\x0d\x0e" + everything)
+    write(f"GeneratorFuzz_{WORDS[technology]}", "unbound", b"\x03" + everything)
     if technology in TEMPLATES:
         template = (FUZZ.parent / "Resources" / f"{TEMPLATES[technology]}.plist").read_bytes()
         short = [message for message in kinds if len(message) < 512][:8]
-        write(f"TemplateFuzz_{technology}", "own",
+        write(f"TemplateFuzz_{WORDS[technology]}", "own",
               framed(template) + b"".join(framed(message) for message in short))
     head = pathlib.Path(capture).read_bytes()[:24]
     records = b"".join(struct.pack("<IIII", 1, 2, len(message), len(message)) + message
                        for message in kinds[:3])
-    write("CaptureFuzz", technology, head + records)
+    write("RecordingFuzz", technology, head + records)
     write("StreamFuzz", technology,
           b"\xff" + b"".join(struct.pack("<I", len(message)) + message for message in kinds[:3]))
 

@@ -7,10 +7,10 @@
 #include <array>
 
 #include "LogGenerator/C2K/C2KLogGenerator.h"
-#include "LogGenerator/GSM/GSMLogGenerator.h"
-#include "LogGenerator/Ondrel/GSM/Ondrel_GSMLogGenerator.h"
-#include "LogGenerator/Ondrel/LTE/LTELogGenerator.h"
-#include "LogGenerator/Ondrel/UTRAN/UTRANLogGenerator.h"
+#include "LogGenerator/GsmUmts/Ondrel_GSMLogGenerator.h"
+#include "LogGenerator/IFX/GSMLogGenerator.h"
+#include "LogGenerator/LTE/LTELogGenerator.h"
+#include "LogGenerator/UTRAN/UTRANLogGenerator.h"
 #include "Platform/Clock.h"
 #include "Platform/SystemLog.h"
 #include "Platform/TelephonyService.h"

@@ -6,9 +6,9 @@
 #include <chrono>
 
 #include "LogGenerator/Ondrel/OndrelLogGenerator.h"
-#include "Model/StorableValue.h"
 #include "Platform/DeviceRoot.h"
 #include "Platform/SystemLog.h"
+#include "Recordings/StorableValue.h"
 
 namespace kestro {
 

@@ -12,7 +12,7 @@
 #include <utility>
 #include <vector>
 
-#include "Platform/ProgramOptions.h"
+#include "Options/ProgramOptions.h"
 
 namespace kestro {
 namespace {

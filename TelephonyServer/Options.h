@@ -8,8 +8,8 @@
 
 #include "Platform/Bundle.h"
 #include "Platform/SystemLog.h"
+#include "Sources/SourceCatalogue.h"
 #include "TelephonyServer/Playback.h"
-#include "TelephonyServer/Sources/SourceCatalogue.h"
 
 namespace kestro {
 

@@ -10,7 +10,7 @@
 
 #include "Platform/Clock.h"
 #include "Platform/MainQueue.h"
-#include "TelephonyServer/Sources/LogSource.h"
+#include "Sources/LogSource.h"
 
 namespace kestro {
 

@@ -29,7 +29,7 @@ constexpr std::string_view kLookupNames[] = {"kChannel",         "k1xEVDODeviceS
                                              "kBaseId",          "kProtocolRevision",
                                              "kFLDataRate",      "kRLDataRate"};
 
-constexpr std::string_view kEvdoStates[] = {"Inactive [0]", "Acquisition [1]", "Sync [2]",
+constexpr std::string_view kEVDOStates[] = {"Inactive [0]", "Acquisition [1]", "Sync [2]",
                                             "Idle [3]",     "Access [4]",      "Connected [5]"};
 constexpr std::string_view kSessionStates[] = {
     "Closed [0]", "AMP setup [1]", "AT-initiated neg [2]", "Initiated neg [3]", "Open [4]"};
@@ -135,7 +135,7 @@ class C2KReader : public PlainReader {
     const auto is = [&](std::uint32_t wanted, std::size_t length) {
       return code == wanted && packet.size() >= length;
     };
-    if (is(0x1183, 50) && packet.size() == 50) readEvdoStatus(packet);
+    if (is(0x1183, 50) && packet.size() == 50) readEVDOStatus(packet);
     if (is(0x12B6, 25)) readActiveSet(packet);
     if (is(0x108A, 23)) readFingers(packet);
     if (is(0x119C, 17)) readOneXStatus(packet);
@@ -146,12 +146,12 @@ class C2KReader : public PlainReader {
     return std::ranges::find(kC2KCodes, code) != std::end(kC2KCodes);
   }
 
-  void readEvdoStatus(const Packet& packet) {
+  void readEVDOStatus(const Packet& packet) {
     const int state = packet.byte(36);
     const int session = packet.byte(37);
     storeNumber("kChannel", packet.byte(13) + 256 * (packet.byte(14) & 7));
     store("k1xEVDODeviceState",
-          nameOf(static_cast<std::uint32_t>(state), kEvdoStates, text("[Reserved %d]", state)));
+          nameOf(static_cast<std::uint32_t>(state), kEVDOStates, text("[Reserved %d]", state)));
     store("kBandClass", bandText(packet.byte(14) >> 3));
     store("kRxAGC0", text("%+d dBm", packet.signedByte(15)));
     store("kRxAGC1", state < 4 ? "N/A" : text("%+d dBm", packet.signedByte(16)));

@@ -157,9 +157,9 @@ std::vector<Dictionary> SectionReader::cellsIn(const Packet& packet) const {
 
 std::unique_ptr<PlainReader> makePlainReader(std::string_view technology,
                                              const PropertyListCoding& coding) {
-  if (technology == "LTE") return makeLteReader(coding);
-  if (technology == "Ondrel_GSM") return makeGsmReader(coding);
-  if (technology == "UTRAN2") return makeUtranReader(coding);
+  if (technology == "LTE") return makeLTEReader(coding);
+  if (technology == "Ondrel_GSM") return makeGsmUmtsReader(coding);
+  if (technology == "UTRAN2") return makeUTRANReader(coding);
   if (technology == "Ondrel_CDMA") return makeC2KReader();
   return nullptr;
 }

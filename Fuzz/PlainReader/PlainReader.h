@@ -104,9 +104,9 @@ void showLevel(Dictionary& target, std::string_view key, const Dictionary& cell,
 [[nodiscard]] std::unique_ptr<PlainReader> makePlainReader(std::string_view technology,
                                                            const PropertyListCoding& coding);
 
-[[nodiscard]] std::unique_ptr<PlainReader> makeLteReader(const PropertyListCoding& coding);
-[[nodiscard]] std::unique_ptr<PlainReader> makeGsmReader(const PropertyListCoding& coding);
-[[nodiscard]] std::unique_ptr<PlainReader> makeUtranReader(const PropertyListCoding& coding);
+[[nodiscard]] std::unique_ptr<PlainReader> makeLTEReader(const PropertyListCoding& coding);
+[[nodiscard]] std::unique_ptr<PlainReader> makeGsmUmtsReader(const PropertyListCoding& coding);
+[[nodiscard]] std::unique_ptr<PlainReader> makeUTRANReader(const PropertyListCoding& coding);
 [[nodiscard]] std::unique_ptr<PlainReader> makeC2KReader();
 
 }  // namespace kestro::plain

@@ -5,9 +5,9 @@
 #include <QApplication>
 #include <QFontDatabase>
 
-#include "App/Colours.h"
-#include "App/Column.h"
-#include "App/TextStyle.h"
+#include "App/Toolkit/Colours.h"
+#include "App/Toolkit/Column.h"
+#include "App/Toolkit/TextStyle.h"
 
 namespace kestro {
 namespace {

@@ -7,7 +7,7 @@
 #include <cstdlib>
 #include <set>
 
-#include "App/SystemColours.h"
+#include "App/Toolkit/SystemColours.h"
 #include "Tests/App/WindowFixture.h"
 
 namespace kestro::testing {

@@ -5,10 +5,10 @@
 #include <string>
 #include <vector>
 
-#include "App/ActivityIndicator.h"
-#include "App/KestroCell.h"
-#include "App/TableView.h"
-#include "App/Toolbar.h"
+#include "App/Panes/KestroCell.h"
+#include "App/Toolkit/ActivityIndicator.h"
+#include "App/Toolkit/TableView.h"
+#include "App/Toolkit/Toolbar.h"
 
 namespace kestro::testing {
 

@@ -9,7 +9,7 @@
 #include <regex>
 #include <sstream>
 
-#include "Tests/EndToEnd/IfxMessages.h"
+#include "Tests/EndToEnd/IFXMessages.h"
 #include "Tests/EndToEnd/PacketMessages.h"
 #include "Tests/EndToEnd/Process.h"
 #include "Tests/Support/TemporaryFile.h"

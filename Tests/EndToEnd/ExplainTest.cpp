@@ -7,7 +7,7 @@
 #include <iterator>
 #include <nlohmann/json.hpp>
 
-#include "Tests/EndToEnd/IfxMessages.h"
+#include "Tests/EndToEnd/IFXMessages.h"
 #include "Tests/EndToEnd/PacketMessages.h"
 #include "Tests/EndToEnd/Process.h"
 #include "Tests/Support/TemporaryFile.h"
@@ -225,7 +225,7 @@ TEST_F(ExplainTest, ACaptureWithoutMessagesExplainsNothing) {
             R"({"technology":"LTE","messages":[]})");
 }
 
-TEST_F(ExplainTest, TheIfxChannelHasNoPackets) {
+TEST_F(ExplainTest, TheIFXChannelHasNoPackets) {
   writeCapture(capture.path(), {ifxMessage("1")}, 0s);
   const Outcome outcome = explain();
   EXPECT_EQ(outcome.status, 1);

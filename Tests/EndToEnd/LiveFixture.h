@@ -8,7 +8,7 @@
 #include <string>
 #include <vector>
 
-#include "Tests/EndToEnd/IfxMessages.h"
+#include "Tests/EndToEnd/IFXMessages.h"
 #include "Tests/EndToEnd/Process.h"
 #include "Tests/Support/TemporaryFile.h"
 

@@ -8,7 +8,7 @@
 #include <filesystem>
 #include <fstream>
 
-#include "Tests/EndToEnd/IfxMessages.h"
+#include "Tests/EndToEnd/IFXMessages.h"
 #include "Tests/EndToEnd/Process.h"
 #include "Tests/Support/TemporaryFile.h"
 
@@ -33,10 +33,10 @@ class SnapshotCommandTest : public ::testing::Test {
   [[nodiscard]] std::string pathOf(const std::string& name) const {
     return directory.directory() + "/" + name;
   }
-  void writeIfx(const std::vector<std::string>& messages) {
+  void writeIFX(const std::vector<std::string>& messages) {
     writeCapture(capture, messages, 1500ms);
   }
-  void writeLte(const std::vector<std::string>& messages) {
+  void writeLTE(const std::vector<std::string>& messages) {
     writeCapture(capture, messages, 1500ms, "LTE");
   }
   void writeSnapshot(std::string_view contents) {
@@ -64,7 +64,7 @@ class SnapshotCommandTest : public ::testing::Test {
 bool isRoot() { return ::geteuid() == 0; }
 
 TEST_F(SnapshotCommandTest, ShowsWhatWasSaved) {
-  writeIfx({ifxMessage("1"), ifxMessage("2")});
+  writeIFX({ifxMessage("1"), ifxMessage("2")});
   const Outcome saved = save();
   EXPECT_EQ(saved.status, 0);
   EXPECT_EQ(saved.output, "");
@@ -87,7 +87,7 @@ TEST_F(SnapshotCommandTest, ShowsWhatWasSaved) {
 TEST_F(SnapshotCommandTest, ShowsTheNewestFiveDisplaysAndTheirPackets) {
   // Messages at 0, 1.5, … 13.5 s. Refreshes at 2, 4, … 12 s, each before the message that comes
   // with it, and at the end: the last five have 1, 2, 1, 1 and 2 messages.
-  writeLte(std::vector<std::string>(10, kMessage));
+  writeLTE(std::vector<std::string>(10, kMessage));
   ASSERT_EQ(save("").status, 0);
   const Outcome shown = show();
   EXPECT_EQ(shown.status, 0);
@@ -102,7 +102,7 @@ TEST_F(SnapshotCommandTest, ShowsTheNewestFiveDisplaysAndTheirPackets) {
 }
 
 TEST_F(SnapshotCommandTest, AnEmptyDescriptionMayBeWrittenBothWays) {
-  writeIfx({ifxMessage("1")});
+  writeIFX({ifxMessage("1")});
   EXPECT_EQ(save("").status, 0);
   EXPECT_EQ(
       run({"kestro-cli", "snapshot", "save", capture, "-o", snapshot, "--description", ""}).status,
@@ -112,13 +112,13 @@ TEST_F(SnapshotCommandTest, AnEmptyDescriptionMayBeWrittenBothWays) {
 }
 
 TEST_F(SnapshotCommandTest, ADescriptionThatIsNoUtf8DoesNotLoseTheSnapshot) {
-  writeIfx({ifxMessage("1")});
+  writeIFX({ifxMessage("1")});
   EXPECT_EQ(save("a\xFF\x1B!").status, 0);
   EXPECT_THAT(TemporaryDirectory::text(snapshot), HasSubstr("<string>a\uFFFD\uFFFD!</string>"));
 }
 
 TEST_F(SnapshotCommandTest, MessagesThatCannotBeDecodedAreNamedAndTheRestSaved) {
-  writeIfx({ifxMessage("1"), "garbage"});
+  writeIFX({ifxMessage("1"), "garbage"});
   const Outcome outcome = save();
   EXPECT_EQ(outcome.status, 3);
   EXPECT_THAT(outcome.errors, StartsWith("kestro-cli: " + capture + ": message 2: "));
@@ -126,7 +126,7 @@ TEST_F(SnapshotCommandTest, MessagesThatCannotBeDecodedAreNamedAndTheRestSaved) 
 }
 
 TEST_F(SnapshotCommandTest, ACaptureWithoutMessagesHasAnEmptyHistory) {
-  writeIfx({});
+  writeIFX({});
   EXPECT_EQ(save().status, 0);
   EXPECT_THAT(show().output, MatchesRegex("Timestamp    20[-0-9: ]+ \\+0000\n"
                                           "Description  tunnel\n"
@@ -141,7 +141,7 @@ TEST_F(SnapshotCommandTest, NothingIsWrittenWithoutACapture) {
 }
 
 TEST_F(SnapshotCommandTest, AMissingDirectoryIsNotMade) {
-  writeIfx({ifxMessage("1")});
+  writeIFX({ifxMessage("1")});
   snapshot = pathOf("nowhere/a.kestro");
   const Outcome outcome = save();
   EXPECT_EQ(outcome.status, 1);
@@ -151,7 +151,7 @@ TEST_F(SnapshotCommandTest, AMissingDirectoryIsNotMade) {
 
 TEST_F(SnapshotCommandTest, AReadOnlyDirectoryIsAFailure) {
   if (isRoot()) GTEST_SKIP() << "root may write everywhere";
-  writeIfx({ifxMessage("1")});
+  writeIFX({ifxMessage("1")});
   ASSERT_EQ(::mkdir(pathOf("locked").c_str(), 0500), 0);
   snapshot = pathOf("locked/a.kestro");
   const Outcome outcome = save();
@@ -160,7 +160,7 @@ TEST_F(SnapshotCommandTest, AReadOnlyDirectoryIsAFailure) {
 }
 
 TEST_F(SnapshotCommandTest, AFullDiskIsAFailure) {
-  writeIfx({ifxMessage("1")});
+  writeIFX({ifxMessage("1")});
   snapshot = "/dev/full";
   const Outcome outcome = save();
   EXPECT_EQ(outcome.status, 1);
@@ -168,7 +168,7 @@ TEST_F(SnapshotCommandTest, AFullDiskIsAFailure) {
 }
 
 TEST_F(SnapshotCommandTest, TheCaptureIsNotReplaced) {
-  writeIfx({ifxMessage("1")});
+  writeIFX({ifxMessage("1")});
   const std::string before = TemporaryDirectory::text(capture);
   snapshot = directory.directory() + "/./a.pcap";
   const Outcome outcome = save();
@@ -230,7 +230,7 @@ TEST_F(SnapshotCommandTest, ASnapshotOfATimestampOnlyIsShown) {
 }
 
 TEST_F(SnapshotCommandTest, ExportsTheLogAsItWasSaved) {
-  writeLte({kMessage, kMessage});
+  writeLTE({kMessage, kMessage});
   ASSERT_EQ(save().status, 0);
   const Outcome outcome = exportDlf();
   EXPECT_EQ(outcome.status, 0);
@@ -243,7 +243,7 @@ TEST_F(SnapshotCommandTest, ExportsTheLogAsItWasSaved) {
 
 TEST_F(SnapshotCommandTest, ReframedEveryPacketFrames) {
   const std::string prefixed = "\x81\x02" + kMessage;
-  writeLte({kMessage, prefixed, kMessage, kMessage});
+  writeLTE({kMessage, prefixed, kMessage, kMessage});
   ASSERT_EQ(save().status, 0);
   const Outcome outcome = exportDlf({"--reframe"});
   EXPECT_EQ(outcome.status, 0);
@@ -253,7 +253,7 @@ TEST_F(SnapshotCommandTest, ReframedEveryPacketFrames) {
 }
 
 TEST_F(SnapshotCommandTest, WhatDoesNotFrameIsNamedAndLeftOut) {
-  writeLte({kMessage, "junk"});
+  writeLTE({kMessage, "junk"});
   ASSERT_EQ(save().status, 0);
   const Outcome outcome = exportDlf({"--reframe"});
   EXPECT_EQ(outcome.status, 3);
@@ -275,8 +275,8 @@ TEST_F(SnapshotCommandTest, ALogOfOtherPacketsIsNotReframed) {
             "kestro-cli: " + snapshot + ": its DLF log does not hold the packets of its history\n");
 }
 
-TEST_F(SnapshotCommandTest, AnIfxSnapshotHasNoLog) {
-  writeIfx({ifxMessage("1")});
+TEST_F(SnapshotCommandTest, AnIFXSnapshotHasNoLog) {
+  writeIFX({ifxMessage("1")});
   ASSERT_EQ(save().status, 0);
   const Outcome outcome = exportDlf();
   EXPECT_EQ(outcome.status, 1);

@@ -5,11 +5,11 @@
 #include <vector>
 
 #include "LogGenerator/C2K/C2KLogGenerator.h"
-#include "LogGenerator/GSM/GSMLogGenerator.h"
+#include "LogGenerator/GsmUmts/Ondrel_GSMLogGenerator.h"
+#include "LogGenerator/IFX/GSMLogGenerator.h"
+#include "LogGenerator/LTE/LTELogGenerator.h"
 #include "LogGenerator/LogGenerator.h"
-#include "LogGenerator/Ondrel/GSM/Ondrel_GSMLogGenerator.h"
-#include "LogGenerator/Ondrel/LTE/LTELogGenerator.h"
-#include "LogGenerator/Ondrel/UTRAN/UTRANLogGenerator.h"
+#include "LogGenerator/UTRAN/UTRANLogGenerator.h"
 #include "Platform/Linux/LinuxPlatform.h"
 #include "Platform/TelephonyService.h"
 #include "Platform/Virtual/VirtualPlatform.h"

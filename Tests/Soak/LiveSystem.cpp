@@ -8,8 +8,8 @@
 
 #include "LogGenerator/LogGenerator.h"
 #include "Platform/TelephonyProtocol.h"
+#include "Sources/SourceCatalogue.h"
 #include "TelephonyServer/ChannelCommand.h"
-#include "TelephonyServer/Sources/SourceCatalogue.h"
 #include "Tests/Soak/CountingGenerator.h"
 
 namespace kestro::soak {

@@ -11,7 +11,7 @@
 #include <variant>
 #include <vector>
 
-#include "TelephonyServer/Sources/LogSource.h"
+#include "Sources/LogSource.h"
 
 namespace kestro::soak {
 

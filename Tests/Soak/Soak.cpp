@@ -12,7 +12,7 @@
 #include <vector>
 
 #include "Platform/TelephonyService.h"
-#include "TelephonyServer/Sources/SourceCatalogue.h"
+#include "Sources/SourceCatalogue.h"
 #include "Tests/Soak/LiveSystem.h"
 #include "Tests/Soak/ProcessUse.h"
 

@@ -11,7 +11,7 @@ KINDS = (
     ("property lists", r"plist/.*"),
     ("system log", r"syslog\.h"),
     ("sockets", r"sys/(socket|un)\.h|netinet/.*|arpa/.*|netdb\.h|linux/.*"),
-    ("captures", r"pcap(/.*)?(\.h)?"),
+    ("pcap", r"pcap(/.*)?(\.h)?"),
     ("command lines", r"CLI/.*"),
     ("json", r"nlohmann/.*"),
     ("tests", r"(gtest|gmock)/.*"),
@@ -39,31 +39,44 @@ class Room:
     doors: tuple = ()
 
 
-_SERVER = ("LogGenerator", "Captures", "Platform")
-_COMMAND_LINE = ("Model", "LogGenerator", "Captures", "Platform", "Platform/Virtual")
-_APP = ("Model", "LogGenerator", "Platform")
+_SOURCES = ("LogGenerator", "Recordings", "Platform")
+_MODEL = ("LogGenerator", "Recordings", "Platform")
+_SERVER = ("Sources", "Options", *_SOURCES)
+_COMMAND_LINE = ("Model", "Options", "Platform/Virtual", *_SERVER)
+_FORMATS = ("CommandLine", "CommandLine/Formats", *_COMMAND_LINE)
+_TERMINAL = ("CommandLine/Terminal", *_FORMATS)
+_APP = ("Model", "Options", *_SOURCES, "Sources")
+_COMMANDS = HOSTED | {"command lines", "unicode"}
 
 # A source belongs to the room with the longest path that it lies under; a single file can be one.
 ROOMS = {
     "Platform": Room((), CORE),
-    "Platform/ProgramOptions.cpp": Room(("Platform",), CORE | {"command lines"}),
     "Platform/Virtual": Room(("Platform",), CORE),
     "Platform/Linux": Room(
         ("Platform",), HOSTED | {"qt", "property lists", "system log", "sockets"}
     ),
+    "Options": Room(("Platform",), CORE | {"command lines"}),
     "LogGenerator": Room(("Platform",), CORE),
-    "Model": Room(("LogGenerator", "Platform"), CORE),
-    "Captures": Room(("Platform",), HOSTED | {"captures"}),
+    "Recordings": Room(("Platform",), HOSTED | {"pcap"}),
+    "Model": Room(_MODEL, CORE),
+    "Sources": Room(_SOURCES, HOSTED),
     "TelephonyServer": Room(_SERVER, HOSTED | {"command lines"}),
     "TelephonyServer/main.cpp": Room(
         ("TelephonyServer", *_SERVER), HOSTED | {"command lines"}, (LINUX_DOOR,)
     ),
     "CommandLine": Room(
-        _COMMAND_LINE, HOSTED | {"command lines", "json", "unicode"}, (LINUX_DOOR,)
+        ("CommandLine/Commands", *_TERMINAL), _COMMANDS | {"json"}, (LINUX_DOOR,)
     ),
-    "App": Room(_APP, CORE | {"qt"}),
+    "CommandLine/Formats": Room(_FORMATS, HOSTED | {"json", "unicode"}),
+    "CommandLine/Terminal": Room(_TERMINAL, HOSTED | {"unicode"}),
+    "CommandLine/Commands": Room(_TERMINAL, _COMMANDS, (LINUX_DOOR,)),
+    "App": Room(("App/Panes", "App/Toolkit", *_APP), CORE | {"qt"}),
     "App/Options.cpp": Room(("App", *_APP), CORE | {"qt", "command lines"}),
-    "App/Program.cpp": Room(("App", *_APP), HOSTED | {"qt"}, (LINUX_DOOR,)),
+    "App/Program.cpp": Room(
+        ("App", "App/Panes", "App/Toolkit", *_APP), HOSTED | {"qt"}, (LINUX_DOOR,)
+    ),
+    "App/Panes": Room(("App/Toolkit", *_APP), CORE | {"qt"}),
+    "App/Toolkit": Room((), CORE | {"qt"}),
 }
 
 
@@ -72,7 +85,8 @@ def _with_tests(rooms):
     platforms and the operating system; only the Linux platform's own tests see its inside.
     Benchmarks and fuzzers see every other room."""
     public = tuple(
-        name for name in rooms if "." not in name and name not in ("App", "Platform/Linux")
+        name for name in rooms
+        if "." not in name and name.split("/")[0] != "App" and name != "Platform/Linux"
     )
     kinds = HOSTED | {"tests", "json", "sockets"}
     everything = Room(("Tests", *public), kinds, (LINUX_DOOR,))
@@ -87,13 +101,17 @@ def _with_tests(rooms):
     all_rooms["Tests/Soak"] = dataclasses.replace(everything, kinds=kinds | {"command lines"})
     all_rooms["Benchmarks"] = dataclasses.replace(everything, kinds=kinds | {"benchmarks"})
     all_rooms["Benchmarks/WindowBenchmark.cpp"] = Room(
-        ("App", "Model", "Platform", "Tests", "Tests/App"), kinds | {"benchmarks", "qt"}
+        ("App", "App/Panes", "App/Toolkit", "Model", "Platform", "Tests", "Tests/App"), kinds | {"benchmarks", "qt"}
     )
     for name, room in rooms.items():
         if "." in name:
             continue
         seen = {name, *room.rooms, "Platform", "Platform/Virtual", "Tests"}
         seen |= {f"Tests/{lower}" for lower in room.rooms}
+        outer = name.split("/")[0]
+        if outer != "Platform":  # tests of a room within a room see all of the outer one
+            seen |= {inner for inner in rooms if inner.startswith(outer) and "." not in inner}
+            seen.add(f"Tests/{outer}")
         all_rooms[f"Tests/{name}"] = Room(tuple(seen), kinds | room.kinds, (LINUX_DOOR,))
     return all_rooms
 

@@ -39,7 +39,7 @@ class Check(unittest.TestCase):
         self.write("Platform/Virtual/VirtualClock.h")
         self.write("LogGenerator/LogGenerator.h")
         self.write("Model/Tree.h")
-        self.write("Captures/Capture.h")
+        self.write("Recordings/Recording.h")
         self.write("TelephonyServer/Channel.h")
 
     def write(self, path, *headers):
@@ -60,8 +60,8 @@ class Check(unittest.TestCase):
 
     def test_downward_arrows_are_allowed(self):
         self.assert_allowed("Model/Model.cpp", '"LogGenerator/LogGenerator.h"')
-        self.assert_allowed("LogGenerator/GSM/GSM.cpp", '"Platform/Clock.h"')
-        self.assert_allowed("TelephonyServer/Sources/Replay.cpp", '"Captures/Capture.h"')
+        self.assert_allowed("LogGenerator/IFX/IFX.cpp", '"Platform/Clock.h"')
+        self.assert_allowed("Sources/Replay.cpp", '"Recordings/Recording.h"')
 
     def test_an_upward_arrow_is_refused(self):
         self.assert_refused(
@@ -76,7 +76,7 @@ class Check(unittest.TestCase):
         )
 
     def test_angle_brackets_do_not_hide_an_arrow(self):
-        self.assert_refused("Captures/A.h", "<Model/Tree.h>", "Captures must not know Model")
+        self.assert_refused("Recordings/A.h", "<Model/Tree.h>", "Recordings must not know Model")
 
     def test_the_values_know_no_implementation_of_the_platform(self):
         self.assert_refused(
@@ -101,10 +101,10 @@ class Check(unittest.TestCase):
             "CommandLine/A.cpp", "<syslog.h>", "CommandLine must not use system log"
         )
 
-    def test_only_captures_use_libpcap(self):
-        self.assert_allowed("Captures/A.cpp", "<pcap/pcap.h>")
+    def test_only_recordings_use_libpcap(self):
+        self.assert_allowed("Recordings/A.cpp", "<pcap/pcap.h>")
         self.assert_refused(
-            "TelephonyServer/A.cpp", "<pcap.h>", "TelephonyServer must not use captures"
+            "TelephonyServer/A.cpp", "<pcap.h>", "TelephonyServer must not use pcap"
         )
 
     def test_the_inside_of_the_linux_platform_is_closed(self):
@@ -126,9 +126,9 @@ class Check(unittest.TestCase):
         self.assert_refused("Tests/Model/A.cpp", '"Platform/Linux/Sockets.h"', why)
 
     def test_tests_share_helpers_along_the_arrows(self):
-        self.write("Tests/Captures/CaptureBytes.h")
+        self.write("Tests/Recordings/PcapBytes.h")
         self.write("Tests/Model/Nodes.h")
-        self.assert_allowed("Tests/TelephonyServer/A.cpp", '"Tests/Captures/CaptureBytes.h"')
+        self.assert_allowed("Tests/TelephonyServer/A.cpp", '"Tests/Recordings/PcapBytes.h"')
         self.assert_refused(
             "Tests/TelephonyServer/A.cpp",
             '"Tests/Model/Nodes.h"',

@@ -11,7 +11,7 @@ const Bytes kPacketB179 = {0x01, 12, 0, 0x79, 0xB1, 1, 2, 3, 4, 5, 6, 7, 8};
 const Bytes kPrefixedB179 = {0x81, 0x00, 0x01, 12, 0, 0x79, 0xB1, 1, 2, 3, 4, 5, 6};
 const Bytes kExtra1 = {0xFF, 12, 0, 0x01, 0x00, 1, 2, 3, 4, 5, 6, 7, 8};
 
-TEST(CodeFilterTest, acceptsEverythingWithoutCodes) {
+TEST(CodeFilterTest, AcceptsEverythingWithoutCodes) {
   const CodeFilter filter;
   EXPECT_TRUE(filter.accepts(kPacketB179));
   EXPECT_TRUE(filter.accepts(kExtra1));
@@ -19,19 +19,19 @@ TEST(CodeFilterTest, acceptsEverythingWithoutCodes) {
   EXPECT_TRUE(filter.accepts({}));
 }
 
-TEST(CodeFilterTest, acceptsTheCodesAskedFor) {
+TEST(CodeFilterTest, AcceptsTheCodesAskedFor) {
   const CodeFilter filter({0xB17F, 0xB179});
   EXPECT_TRUE(filter.accepts(kPacketB179));
   EXPECT_FALSE(filter.accepts(kExtra1));
   EXPECT_FALSE(CodeFilter({0xB17F}).accepts(kPacketB179));
 }
 
-TEST(CodeFilterTest, aPrefixMovesTheCodeByTwoBytes) {
+TEST(CodeFilterTest, APrefixMovesTheCodeByTwoBytes) {
   EXPECT_TRUE(CodeFilter({0xB179}).accepts(kPrefixedB179));
   EXPECT_FALSE(CodeFilter({0x000C}).accepts(kPrefixedB179));
 }
 
-TEST(CodeFilterTest, extraCodesAreCodesOfTheirOwn) {
+TEST(CodeFilterTest, ExtraCodesAreCodesOfTheirOwn) {
   EXPECT_TRUE(CodeFilter({0xFF0001}).accepts(kExtra1));
   EXPECT_FALSE(CodeFilter({0x0001}).accepts(kExtra1));
   const Bytes ordinary1 = {0x01, 12, 0, 0x01, 0x00};
@@ -39,11 +39,11 @@ TEST(CodeFilterTest, extraCodesAreCodesOfTheirOwn) {
   EXPECT_TRUE(CodeFilter({0x0001}).accepts(ordinary1));
 }
 
-TEST(CodeFilterTest, anEmptyListOfCodesAcceptsNothing) {
+TEST(CodeFilterTest, AnEmptyListOfCodesAcceptsNothing) {
   EXPECT_FALSE(CodeFilter(std::vector<LogCode>{}).accepts(kPacketB179));
 }
 
-TEST(CodeFilterTest, messagesTooShortForACodeAreNotWanted) {
+TEST(CodeFilterTest, MessagesTooShortForACodeAreNotWanted) {
   const CodeFilter filter({0, 0x79, 0xB179});
   for (std::size_t length = 0; length < 5; ++length) {
     EXPECT_FALSE(filter.accepts(ByteView(kPacketB179).first(length))) << length;
@@ -55,7 +55,7 @@ TEST(CodeFilterTest, messagesTooShortForACodeAreNotWanted) {
   EXPECT_TRUE(filter.accepts(ByteView(kPrefixedB179).first(7)));
 }
 
-TEST(CodeFilterTest, repeatedCodesCountOnce) {
+TEST(CodeFilterTest, RepeatedCodesCountOnce) {
   EXPECT_TRUE(CodeFilter({0xB179, 0xB179, 1}).accepts(kPacketB179));
 }
 

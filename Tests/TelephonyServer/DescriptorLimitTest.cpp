@@ -27,17 +27,17 @@ class DescriptorLimitTest : public ::testing::Test {
   rlimit _earlier{};
 };
 
-TEST_F(DescriptorLimitTest, asManyAreAllowedAsAreAskedFor) {
+TEST_F(DescriptorLimitTest, AsManyAreAllowedAsAreAskedFor) {
   allowDescriptors(200);
   EXPECT_EQ(current(), 200U);
 }
 
-TEST_F(DescriptorLimitTest, whatIsAllowedAlreadyStays) {
+TEST_F(DescriptorLimitTest, WhatIsAllowedAlreadyStays) {
   allowDescriptors(50);
   EXPECT_EQ(current(), 100U);
 }
 
-TEST_F(DescriptorLimitTest, noMoreThanTheSystemAllows) {
+TEST_F(DescriptorLimitTest, NoMoreThanTheSystemAllows) {
   if (most() == RLIM_INFINITY) GTEST_SKIP() << "this system allows any number";
   allowDescriptors(static_cast<std::size_t>(most()) + 1);
   EXPECT_EQ(current(), most());

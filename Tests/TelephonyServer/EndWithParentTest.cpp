@@ -34,7 +34,7 @@ class EndWithParentTest : public ::testing::Test {
   std::array<int, 2> _pipe{};
 };
 
-TEST_F(EndWithParentTest, itEndsWhenItsParentIsKilled) {
+TEST_F(EndWithParentTest, ItEndsWhenItsParentIsKilled) {
   const pid_t parent = ::fork();
   if (parent == 0) {
     if (::fork() == 0) {
@@ -51,7 +51,7 @@ TEST_F(EndWithParentTest, itEndsWhenItsParentIsKilled) {
   EXPECT_TRUE(othersEnd());
 }
 
-TEST_F(EndWithParentTest, aParentThatHasEndedAlreadyIsNoticed) {
+TEST_F(EndWithParentTest, AParentThatHasEndedAlreadyIsNoticed) {
   const pid_t child = ::fork();
   if (child == 0) ::_exit(endWithParent(1'000'000'000) ? 1 : 0);
   int status = -1;
@@ -59,7 +59,7 @@ TEST_F(EndWithParentTest, aParentThatHasEndedAlreadyIsNoticed) {
   EXPECT_TRUE(WIFEXITED(status) && WEXITSTATUS(status) == 0);
 }
 
-TEST_F(EndWithParentTest, aLivingParentIsAccepted) {
+TEST_F(EndWithParentTest, ALivingParentIsAccepted) {
   const pid_t self = ::getpid();
   const pid_t child = ::fork();
   if (child == 0) ::_exit(endWithParent(self) ? 0 : 1);

@@ -39,7 +39,7 @@ OptionsText refusal(std::initializer_list<const char*> arguments) {
   return {};
 }
 
-TEST(OptionsTest, withoutOptionsTheSimulationRunsAtItsOwnPace) {
+TEST(OptionsTest, WithoutOptionsTheSimulationRunsAtItsOwnPace) {
   const auto parsed = options({});
   EXPECT_EQ(parsed.source.kind, "simulation");
   EXPECT_EQ(parsed.source.argument, "");
@@ -51,7 +51,7 @@ TEST(OptionsTest, withoutOptionsTheSimulationRunsAtItsOwnPace) {
   EXPECT_FALSE(parsed.exitsWithParent);
 }
 
-TEST(OptionsTest, everyOptionIsTaken) {
+TEST(OptionsTest, EveryOptionIsTaken) {
   const auto parsed =
       options({"--source=drive-test:a.csv", "--technology=LTE", "--speed=0.5", "--loop",
                "--name=Other", "--log-priority=7", "--exit-with-parent=42"});
@@ -66,14 +66,14 @@ TEST(OptionsTest, everyOptionIsTaken) {
   EXPECT_EQ(parsed.parent, 42);
 }
 
-TEST(OptionsTest, theParentNeedsNoNumber) {
+TEST(OptionsTest, TheParentNeedsNoNumber) {
   const auto parsed = options({"--exit-with-parent", "--loop"});
   EXPECT_TRUE(parsed.exitsWithParent);
   EXPECT_EQ(parsed.parent, std::nullopt);
   EXPECT_TRUE(parsed.playback.loop);
 }
 
-TEST(OptionsTest, wrongUsageIsStatusTwo) {
+TEST(OptionsTest, WrongUsageIsStatusTwo) {
   EXPECT_EQ(refusal({"--source=film"}).exitStatus, 2);
   EXPECT_EQ(refusal({"--source=capture"}).exitStatus, 2);
   EXPECT_EQ(refusal({"--technology=5G"}).exitStatus, 2);
@@ -89,13 +89,13 @@ TEST(OptionsTest, wrongUsageIsStatusTwo) {
   EXPECT_EQ(refusal({"stray"}).exitStatus, 2);
 }
 
-TEST(OptionsTest, theVersionIsTheBundles) {
+TEST(OptionsTest, TheVersionIsTheBundles) {
   const auto version = refusal({"--version"});
   EXPECT_EQ(version.exitStatus, 0);
   EXPECT_EQ(version.text, "kestro-telephonyd 1.2.3\n");
 }
 
-TEST(OptionsTest, helpDescribesEverySource) {
+TEST(OptionsTest, HelpDescribesEverySource) {
   const auto help = refusal({"--help"});
   EXPECT_EQ(help.exitStatus, 0);
   for (const auto& kind : sourceKinds()) {

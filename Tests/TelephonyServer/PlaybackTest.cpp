@@ -95,7 +95,7 @@ class PlaybackTest : public ::testing::Test, public PlaybackListener {
   std::vector<std::string> _lines;
 };
 
-TEST_F(PlaybackTest, handsOverEachMessageWhenItIsDue) {
+TEST_F(PlaybackTest, HandsOverEachMessageWhenItIsDue) {
   play({{milliseconds(0), "a"}, {milliseconds(250), "b"}, {milliseconds(3'000), "c"}});
   EXPECT_THAT(take(), IsEmpty());
   _queue.advance(milliseconds(249));
@@ -106,32 +106,32 @@ TEST_F(PlaybackTest, handsOverEachMessageWhenItIsDue) {
   EXPECT_THAT(take(), ElementsAre("3000 c"));
 }
 
-TEST_F(PlaybackTest, aHigherSpeedShortensThePauses) {
+TEST_F(PlaybackTest, AHigherSpeedShortensThePauses) {
   play({{milliseconds(0), "a"}, {milliseconds(1'000), "b"}, {milliseconds(60'000), "c"}},
        {.speed = 50});
   _queue.advance(seconds(5));
   EXPECT_THAT(take(), ElementsAre("0 a", "20 b", "1200 c"));
 }
 
-TEST_F(PlaybackTest, aLowerSpeedLengthensThePauses) {
+TEST_F(PlaybackTest, ALowerSpeedLengthensThePauses) {
   play({{milliseconds(0), "a"}, {milliseconds(1'000), "b"}}, {.speed = 0.25});
   _queue.advance(seconds(5));
   EXPECT_THAT(take(), ElementsAre("0 a", "4000 b"));
 }
 
-TEST_F(PlaybackTest, tellsOfAChangeOfTechnologyBeforeItsFirstMessage) {
+TEST_F(PlaybackTest, TellsOfAChangeOfTechnologyBeforeItsFirstMessage) {
   play({{milliseconds(0), "a"}, {milliseconds(10), "b", "LTE"}, {milliseconds(20), "c", "LTE"}});
   _queue.advance(seconds(1));
   EXPECT_THAT(take(), ElementsAre("0 a", "10 LTE", "10 b", "20 c"));
 }
 
-TEST_F(PlaybackTest, anEventWithoutMessageChangesTheTechnologyOnly) {
+TEST_F(PlaybackTest, AnEventWithoutMessageChangesTheTechnologyOnly) {
   play({{milliseconds(5), "", "LTE"}, {milliseconds(9), "a", "LTE"}});
   _queue.advance(seconds(1));
   EXPECT_THAT(take(), ElementsAre("5 LTE", "9 a"));
 }
 
-TEST_F(PlaybackTest, theEndIsReportedAndNothingMoreComes) {
+TEST_F(PlaybackTest, TheEndIsReportedAndNothingMoreComes) {
   play({{milliseconds(0), "a"}});
   _queue.advance(hours(1));
   EXPECT_THAT(take(), ElementsAre("0 a"));
@@ -139,7 +139,7 @@ TEST_F(PlaybackTest, theEndIsReportedAndNothingMoreComes) {
   EXPECT_EQ(_queue.pending(), 0U);
 }
 
-TEST_F(PlaybackTest, anErrorIsReportedAfterWhatCameBefore) {
+TEST_F(PlaybackTest, AnErrorIsReportedAfterWhatCameBefore) {
   play({{milliseconds(0), "a"}, {milliseconds(0), "", "IFX", "the file is cut"}});
   _queue.advance(seconds(10));
   EXPECT_THAT(take(), ElementsAre("0 a"));
@@ -147,27 +147,27 @@ TEST_F(PlaybackTest, anErrorIsReportedAfterWhatCameBefore) {
                                   "the source has ended after 1 messages; clients stay connected"));
 }
 
-TEST_F(PlaybackTest, aLoopBeginsAgainASecondAfterTheEnd) {
+TEST_F(PlaybackTest, ALoopBeginsAgainASecondAfterTheEnd) {
   play({{milliseconds(0), "a"}, {milliseconds(100), "b"}}, {.speed = 1, .loop = true});
   _queue.advance(milliseconds(2'500));
   EXPECT_THAT(take(), ElementsAre("0 a", "100 b", "1100 a", "1200 b", "2200 a", "2300 b"));
   EXPECT_THAT(_lines, IsEmpty());
 }
 
-TEST_F(PlaybackTest, aLoopGoesBackToTheFirstTechnology) {
+TEST_F(PlaybackTest, ALoopGoesBackToTheFirstTechnology) {
   play({{milliseconds(0), "a"}, {milliseconds(100), "b", "LTE"}}, {.speed = 1, .loop = true});
   _queue.advance(milliseconds(1'100));
   EXPECT_THAT(take(), ElementsAre("0 a", "100 LTE", "100 b", "1100 IFX", "1100 a"));
 }
 
-TEST_F(PlaybackTest, aLoopOverNothingEnds) {
+TEST_F(PlaybackTest, ALoopOverNothingEnds) {
   play({}, {.speed = 1, .loop = true});
   _queue.advance(hours(1));
   EXPECT_EQ(_source->restarts, 0);
   EXPECT_THAT(_lines, ElementsAre("the source has ended after 0 messages; clients stay connected"));
 }
 
-TEST_F(PlaybackTest, aSourceThatCannotBeginAgainEndsTheLoop) {
+TEST_F(PlaybackTest, ASourceThatCannotBeginAgainEndsTheLoop) {
   play({{milliseconds(0), "a"}}, {.speed = 1, .loop = true});
   _source->restartError = "the file is gone";
   _queue.advance(hours(1));
@@ -176,7 +176,7 @@ TEST_F(PlaybackTest, aSourceThatCannotBeginAgainEndsTheLoop) {
   EXPECT_EQ(_queue.pending(), 0U);
 }
 
-TEST_F(PlaybackTest, whatComesFromALiveSourceIsHandedOverAtOnce) {
+TEST_F(PlaybackTest, WhatComesFromALiveSourceIsHandedOverAtOnce) {
   play({{std::nullopt, "a"}, {std::nullopt, "b"}});
   _source->wait();
   _queue.advance(seconds(7));
@@ -185,7 +185,7 @@ TEST_F(PlaybackTest, whatComesFromALiveSourceIsHandedOverAtOnce) {
   EXPECT_THAT(take(), ElementsAre("7000 a", "7000 b"));
 }
 
-TEST_F(PlaybackTest, aBurstLeavesTheMainThreadToOthersInBetween) {
+TEST_F(PlaybackTest, ABurstLeavesTheMainThreadToOthersInBetween) {
   std::vector<Scripted> burst(1'000, {milliseconds(0), "x"});
   play(burst);
   _queue.runReady();
@@ -196,13 +196,13 @@ TEST_F(PlaybackTest, aBurstLeavesTheMainThreadToOthersInBetween) {
   EXPECT_EQ(take().size(), 1'000U - 2 * 256U);
 }
 
-TEST_F(PlaybackTest, aBurstOfLongMessagesIsCutSooner) {
+TEST_F(PlaybackTest, ABurstOfLongMessagesIsCutSooner) {
   play(std::vector<Scripted>(10, {milliseconds(0), std::string(400'000, 'x')}));
   _queue.runReady();
   EXPECT_EQ(take().size(), 3U);
 }
 
-TEST_F(PlaybackTest, aClockSetBackDelaysByASecondAtMost) {
+TEST_F(PlaybackTest, AClockSetBackDelaysByASecondAtMost) {
   play({{milliseconds(0), "a"}, {milliseconds(10'000), "b"}});
   _queue.advance(milliseconds(4'500));
   _clock.setNow(_clock.now() - hours(5));
@@ -212,7 +212,7 @@ TEST_F(PlaybackTest, aClockSetBackDelaysByASecondAtMost) {
   EXPECT_EQ(take().size(), 1U);
 }
 
-TEST_F(PlaybackTest, aClockSetForwardSkipsTenSecondsAtMost) {
+TEST_F(PlaybackTest, AClockSetForwardSkipsTenSecondsAtMost) {
   play({{milliseconds(0), "a"}, {milliseconds(12'000), "b"}});
   _queue.advance(milliseconds(500));
   _clock.setNow(_clock.now() + hours(5));
@@ -222,7 +222,7 @@ TEST_F(PlaybackTest, aClockSetForwardSkipsTenSecondsAtMost) {
   EXPECT_EQ(take().size(), 1U);
 }
 
-TEST_F(PlaybackTest, aLongPauseIsAnnouncedOnce) {
+TEST_F(PlaybackTest, ALongPauseIsAnnouncedOnce) {
   play({{milliseconds(0), "a"}, {milliseconds(90'000), "b"}, {milliseconds(91'000), "c"}});
   _queue.advance(seconds(80));
   EXPECT_THAT(_lines, ElementsAre("the source pauses: its next message is due in 90 s"));
@@ -231,7 +231,7 @@ TEST_F(PlaybackTest, aLongPauseIsAnnouncedOnce) {
   EXPECT_EQ(_lines.size(), 2U);  // the other one reports the end
 }
 
-TEST_F(PlaybackTest, nothingIsHandedOverAfterItsEnd) {
+TEST_F(PlaybackTest, NothingIsHandedOverAfterItsEnd) {
   play({{milliseconds(0), "a"}, {milliseconds(100), "b"}});
   _queue.advance(milliseconds(50));
   _playback.reset();

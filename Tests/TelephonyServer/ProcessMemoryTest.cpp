@@ -11,7 +11,7 @@ namespace kestro {
 namespace {
 
 #ifndef __SANITIZE_ADDRESS__  // which has an allocator of its own
-TEST(ProcessMemory, largeBlocksAreTheSystemsAgainWhenFreed) {
+TEST(ProcessMemory, LargeBlocksAreTheSystemsAgainWhenFreed) {
   giveBackLargeBlocks();
   for (int round = 0; round < 3; ++round) {
     const std::size_t before = ::mallinfo2().hblkhd;

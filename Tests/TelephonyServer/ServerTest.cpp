@@ -100,23 +100,23 @@ class ServerTest : public ::testing::Test {
   bool _portLost = false;
 };
 
-TEST_F(ServerTest, aNameThatIsTakenIsAnError) {
+TEST_F(ServerTest, ANameThatIsTakenIsAnError) {
   const auto second = Server::open(_platform, "TelephonyServer", "IFX", [] {});
   ASSERT_FALSE(second.has_value());
   EXPECT_EQ(second.error().message,
             "another server is running: the port name \"TelephonyServer\" is taken");
 }
 
-TEST_F(ServerTest, aNameThatIsNoneIsAnError) {
+TEST_F(ServerTest, ANameThatIsNoneIsAnError) {
   EXPECT_FALSE(Server::open(_platform, "a/b", "IFX", [] {}).has_value());
 }
 
-TEST_F(ServerTest, losingItsNameIsReported) {
+TEST_F(ServerTest, LosingItsNameIsReported) {
   _platform.messagePorts().lose("TelephonyServer");
   EXPECT_TRUE(_portLost);
 }
 
-TEST_F(ServerTest, everyChannelHasAPortOfItsOwn) {
+TEST_F(ServerTest, EveryChannelHasAPortOfItsOwn) {
   openClientPort("A");
   const auto first = requestChannel("A");
   const auto second = requestChannel("A");
@@ -126,7 +126,7 @@ TEST_F(ServerTest, everyChannelHasAPortOfItsOwn) {
   EXPECT_EQ(_server->channelCount(), 2U);
 }
 
-TEST_F(ServerTest, badChannelRequestsAreAnsweredWithOne) {
+TEST_F(ServerTest, BadChannelRequestsAreAnsweredWithOne) {
   openClientPort("A");
   EXPECT_EQ(request(bytesOf("garbage"))["Error"], Value::integer(1));
   EXPECT_EQ(request({})["Error"], Value::integer(1));
@@ -137,13 +137,13 @@ TEST_F(ServerTest, badChannelRequestsAreAnsweredWithOne) {
   EXPECT_EQ(_server->channelCount(), 0U);
 }
 
-TEST_F(ServerTest, aLocalPortThatNobodyOwnsIsAnsweredWithTwo) {
+TEST_F(ServerTest, ALocalPortThatNobodyOwnsIsAnsweredWithTwo) {
   const auto reply = requestChannel("Nobody");
   EXPECT_EQ(reply["Error"], Value::integer(2));
   EXPECT_TRUE(reply["Port"].isNull());
 }
 
-TEST_F(ServerTest, aChannelWithoutAPortIsAnsweredWithThree) {
+TEST_F(ServerTest, AChannelWithoutAPortIsAnsweredWithThree) {
   openClientPort("A");
   _platform.messagePorts().failures().localPort = true;
   EXPECT_EQ(requestChannel("A")["Error"], Value::integer(3));
@@ -152,7 +152,7 @@ TEST_F(ServerTest, aChannelWithoutAPortIsAnsweredWithThree) {
   EXPECT_EQ(_server->channelCount(), 0U);
 }
 
-TEST_F(ServerTest, thereAreNoMoreThan512Channels) {
+TEST_F(ServerTest, ThereAreNoMoreThan512Channels) {
   openClientPort("A");
   for (int i = 0; i < 512; ++i) {
     ASSERT_EQ(requestChannel("A")["Error"], Value::integer(0)) << i;
@@ -163,14 +163,14 @@ TEST_F(ServerTest, thereAreNoMoreThan512Channels) {
   EXPECT_EQ(requestChannel("B")["Error"], Value::integer(0));
 }
 
-TEST_F(ServerTest, answersGetTechnology) {
+TEST_F(ServerTest, AnswersGetTechnology) {
   const auto channel = openChannel("A");
   const auto body = xml({{"GetTechnology", "GetTechnology"}});
   const auto reply = channel->request(0, body, seconds(1), seconds(1));
   EXPECT_EQ(Value(parsed(reply.data)), Value(Dictionary{{"GetTechnology", "IFX"}}));
 }
 
-TEST_F(ServerTest, streamsNothingBeforeTheStartCommand) {
+TEST_F(ServerTest, StreamsNothingBeforeTheStartCommand) {
   const auto channel = openChannel("A");
   stream("one");
   command(channel, {{"SetState", "Streaming"}});
@@ -178,7 +178,7 @@ TEST_F(ServerTest, streamsNothingBeforeTheStartCommand) {
   EXPECT_THAT(_received["A"], ElementsAre("0:two"));
 }
 
-TEST_F(ServerTest, everyStreamingClientGetsEveryMessage) {
+TEST_F(ServerTest, EveryStreamingClientGetsEveryMessage) {
   const auto a = openStream("A");
   const auto b = openStream("B");
   stream("one");
@@ -187,7 +187,7 @@ TEST_F(ServerTest, everyStreamingClientGetsEveryMessage) {
   EXPECT_THAT(_received["B"], ElementsAre("0:one", "0:two"));
 }
 
-TEST_F(ServerTest, eachClientGetsTheCodesThatItAskedFor) {
+TEST_F(ServerTest, EachClientGetsTheCodesThatItAskedFor) {
   const auto a = openChannel("A");
   const auto b = openChannel("B");
   command(a, {{"SetState", "Streaming"}, {"SetOndrelLogCodes", Array{Value::integer(0x4241)}}});
@@ -201,7 +201,7 @@ TEST_F(ServerTest, eachClientGetsTheCodesThatItAskedFor) {
   EXPECT_THAT(_received["B"], ElementsAre("0:\xFF..AB"));
 }
 
-TEST_F(ServerTest, aLaterStartCommandReplacesTheEarlier) {
+TEST_F(ServerTest, ALaterStartCommandReplacesTheEarlier) {
   const auto channel = openChannel("A");
   command(channel, {{"SetState", "Streaming"}, {"SetOndrelLogCodes", Array{}}});
   stream("\x01..AB");
@@ -210,7 +210,7 @@ TEST_F(ServerTest, aLaterStartCommandReplacesTheEarlier) {
   EXPECT_THAT(_received["A"], ElementsAre("0:\x01..XY"));
 }
 
-TEST_F(ServerTest, malformedCommandsAreDroppedWithALine) {
+TEST_F(ServerTest, MalformedCommandsAreDroppedWithALine) {
   const auto channel = openChannel("A");
   logLines();
   const std::vector<Bytes> bodies = {
@@ -236,7 +236,7 @@ TEST_F(ServerTest, malformedCommandsAreDroppedWithALine) {
   EXPECT_EQ(_server->channelCount(), 1U);
 }
 
-TEST_F(ServerTest, messagesWithOtherIdsAreIgnored) {
+TEST_F(ServerTest, MessagesWithOtherIdsAreIgnored) {
   const auto channel = openChannel("A");
   channel->send(7, xml({{"SetState", "Streaming"}}), seconds(1));
   connect("TelephonyServer")->send(0, xml({{"LocalPort", "A"}}), seconds(1));
@@ -246,7 +246,7 @@ TEST_F(ServerTest, messagesWithOtherIdsAreIgnored) {
   EXPECT_EQ(_server->channelCount(), 1U);
 }
 
-TEST_F(ServerTest, aClientThatGoesAwayFreesItsChannel) {
+TEST_F(ServerTest, AClientThatGoesAwayFreesItsChannel) {
   const auto a = openStream("A");
   const auto b = openStream("B");
   _clientPorts["A"]->invalidate();
@@ -256,14 +256,14 @@ TEST_F(ServerTest, aClientThatGoesAwayFreesItsChannel) {
   EXPECT_TRUE(b->isValid());
 }
 
-TEST_F(ServerTest, aClientThatHasGoneIsNoticedByTheNextMessageToo) {
+TEST_F(ServerTest, AClientThatHasGoneIsNoticedByTheNextMessageToo) {
   const auto a = openStream("A");
   _clientPorts["A"]->invalidate();
   stream("one");
   EXPECT_EQ(_server->channelCount(), 0U);
 }
 
-TEST_F(ServerTest, aSlowClientLosesItsChannelAndStallsNobody) {
+TEST_F(ServerTest, ASlowClientLosesItsChannelAndStallsNobody) {
   const auto slow = openStream("Slow");
   const auto quick = openStream("Quick");
   logLines();
@@ -277,7 +277,7 @@ TEST_F(ServerTest, aSlowClientLosesItsChannelAndStallsNobody) {
   EXPECT_THAT(logLines(), Contains(HasSubstr("reads too slowly")));
 }
 
-TEST_F(ServerTest, aMessageThatNoQueueHoldsIsLeftOutForAll) {
+TEST_F(ServerTest, AMessageThatNoQueueHoldsIsLeftOutForAll) {
   const auto channel = openStream("A");
   logLines();
   _server->messageDue(Bytes(Server::kMaximumStreamedMessage + 1));
@@ -287,7 +287,7 @@ TEST_F(ServerTest, aMessageThatNoQueueHoldsIsLeftOutForAll) {
   EXPECT_THAT(logLines(), ElementsAre(HasSubstr("A message of 4194289 bytes is left out")));
 }
 
-TEST_F(ServerTest, aChangeOfTechnologyInvalidatesTheChannelsBeforeItNotifies) {
+TEST_F(ServerTest, AChangeOfTechnologyInvalidatesTheChannelsBeforeItNotifies) {
   const auto channel = openStream("A");
   bool wasValidWhenNotified = true;
   std::vector<std::string> notifications;
@@ -308,14 +308,14 @@ TEST_F(ServerTest, aChangeOfTechnologyInvalidatesTheChannelsBeforeItNotifies) {
   EXPECT_FALSE(wasValidWhenNotified);
 }
 
-TEST_F(ServerTest, aNewChannelSpeaksTheNewTechnology) {
+TEST_F(ServerTest, ANewChannelSpeaksTheNewTechnology) {
   _server->technologyChanged("LTE");
   const auto reply = openChannel("A")->request(0, xml({{"GetTechnology", "GetTechnology"}}),
                                                seconds(1), seconds(1));
   EXPECT_EQ(parsed(reply.data)["GetTechnology"], Value("LTE"));
 }
 
-TEST_F(ServerTest, aRegistrationTwiceCountsOnce) {
+TEST_F(ServerTest, ARegistrationTwiceCountsOnce) {
   openClientPort("N");
   registerPort("N");
   registerPort("N");
@@ -325,7 +325,7 @@ TEST_F(ServerTest, aRegistrationTwiceCountsOnce) {
   EXPECT_EQ(_received["N"].size(), 1U);
 }
 
-TEST_F(ServerTest, aRegistrationEndsWithItsPort) {
+TEST_F(ServerTest, ARegistrationEndsWithItsPort) {
   openClientPort("N");
   registerPort("N");
   _clientPorts["N"]->invalidate();
@@ -333,7 +333,7 @@ TEST_F(ServerTest, aRegistrationEndsWithItsPort) {
   EXPECT_EQ(_server->registrationCount(), 0U);
 }
 
-TEST_F(ServerTest, aPortThatCameBackCanRegisterAgainAtOnce) {
+TEST_F(ServerTest, APortThatCameBackCanRegisterAgainAtOnce) {
   openClientPort("N");
   registerPort("N");
   _clientPorts["N"]->invalidate();
@@ -344,7 +344,7 @@ TEST_F(ServerTest, aPortThatCameBackCanRegisterAgainAtOnce) {
   EXPECT_EQ(_received["N"].size(), 1U);
 }
 
-TEST_F(ServerTest, unusableRegistrationsAreDroppedWithALine) {
+TEST_F(ServerTest, UnusableRegistrationsAreDroppedWithALine) {
   connect("TelephonyServer")->send(1, bytesOf("garbage"), seconds(1));
   run();
   registerPort("a/b");
@@ -355,7 +355,7 @@ TEST_F(ServerTest, unusableRegistrationsAreDroppedWithALine) {
                                       "A registration is dropped: nobody owns the port Nobody"));
 }
 
-TEST_F(ServerTest, thereAreNoMoreThan512Registrations) {
+TEST_F(ServerTest, ThereAreNoMoreThan512Registrations) {
   for (int i = 0; i < 513; ++i) {
     const auto name = "N" + std::to_string(i);
     openClientPort(name);

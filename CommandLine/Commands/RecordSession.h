@@ -1,0 +1,63 @@
+// SPDX-License-Identifier: MIT
+// Recording what arrives on the log channel.
+#pragma once
+
+#include <chrono>
+#include <cstdint>
+#include <functional>
+#include <memory>
+#include <optional>
+#include <string>
+
+#include "Model/KestroModel.h"
+#include "Platform/MainQueue.h"
+#include "Platform/Platform.h"
+#include "Recordings/PcapRecording.h"
+
+namespace kestro {
+
+/// Connects as the model does and writes every message to a capture, undecoded. When the technology
+/// changes, the recording goes on in the next file; one without a link type ends it. Main thread
+/// only.
+class RecordSession {
+ public:
+  /// A remark for the person who records: that it connects, records, or leaves a message out.
+  using Remark = std::function<void(const std::string& text)>;
+
+  /// `path` is the first file's. `failed` is called once when the capture cannot be written; after
+  /// that nothing is recorded. `platform` must outlive the session.
+  RecordSession(Platform& platform, std::string path, Remark remark,
+                std::function<void(const std::string& reason)> failed);
+
+  void start();
+  /// Records nothing from now on: what still comes while the program ends is in neither the file
+  /// nor the summary.
+  void stop();
+
+  /// "123 messages, 4567 bytes, 0 dropped, in drive.pcap"; absent when no file was begun.
+  [[nodiscard]] std::optional<std::string> summary() const;
+
+ private:
+  class Generator;
+
+  /// Stands in for the technology's generator.
+  [[nodiscard]] std::unique_ptr<LogGenerator> recordTechnology(std::string_view technology);
+  [[nodiscard]] Result<void> openFile(std::string_view technology);
+  void recordMessage(ByteView message);
+  void checkConnection();
+  void fail(const std::string& reason);
+
+  Platform& _platform;
+  std::string _path;
+  Remark _remark;
+  std::function<void(const std::string& reason)> _failed;
+  std::optional<PcapRecording> _recording;
+  std::uint64_t _byteCount = 0;
+  bool _isOver = false;  ///< stopped or failed: nothing is recorded any more
+  bool _wasConnected = true;
+  std::shared_ptr<RecordSession*> _self;  ///< what generators find this by, while it lives
+  std::shared_ptr<KestroModel> _model;
+  std::unique_ptr<Timer> _connectionTimer;
+};
+
+}  // namespace kestro

@@ -1,0 +1,209 @@
+// SPDX-License-Identifier: MIT
+#include "CommandLine/Commands/SnapshotCommand.h"
+
+#include <fmt/format.h>
+
+#include <CLI/CLI.hpp>
+#include <algorithm>
+#include <filesystem>
+#include <memory>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "CommandLine/Commands/RecordingFeed.h"
+#include "CommandLine/ExitStatus.h"
+#include "CommandLine/Formats/SnapshotText.h"
+#include "CommandLine/Input.h"
+#include "CommandLine/OfflinePlatform.h"
+#include "CommandLine/Output.h"
+#include "CommandLine/ReplaceFile.h"
+#include "LogGenerator/Ondrel/Reframing.h"
+#include "Model/Replay.h"
+#include "Model/Snapshot.h"
+#include "Platform/Linux/LinuxPlatform.h"
+#include "Recordings/PcapReader.h"
+
+namespace kestro {
+namespace {
+
+constexpr const char* kSnapshotFooter =
+    R"(A snapshot holds the last five displays with a description and, for binary log channels, their
+packets as a DLF log: what the window saves, in the same format.
+
+Examples:
+  kestro-cli snapshot save drive.pcap -o drive.kestro --description="drop at the tunnel"
+  kestro-cli snapshot show drive.kestro
+  kestro-cli snapshot export-dlf drive.kestro -o drive.dlf
+
+`kestro-cli snapshot ACTION --help` explains an action.)";
+
+constexpr const char* kSaveFooter =
+    R"(The capture is replayed with a refresh every 2 s of its time, as `decode` does, and saved as if the
+save button were pressed at its last message: all times in the snapshot are the capture's. An
+existing file is replaced when the snapshot is complete.
+
+Example:
+  kestro-cli snapshot save drive.pcap -o drive.kestro --description="drop at the tunnel")";
+
+constexpr const char* kShowFooter = R"(Example:
+  kestro-cli snapshot show drive.kestro | less)";
+
+constexpr const char* kExportFooter =
+    R"(The DLF log is written as it was saved: of each history entry only the first packet frames, those
+behind it have their type byte in front of their record. With --reframe these bytes (and the 2-byte
+prefixes that some messages have) are left out, so that every packet frames; what is no packet even
+so is named and left out, and the exit status is 3. An existing file is replaced.
+
+Examples:
+  kestro-cli snapshot export-dlf drive.kestro -o drive.dlf
+  kestro-cli snapshot export-dlf drive.kestro -o drive.dlf --reframe)";
+
+struct SnapshotOptions {
+  std::string input;
+  std::string output;
+  std::string description;
+  bool reframe = false;
+};
+
+int nothingDone(std::string_view why) {
+  complain(why);
+  return kExitNothingDone;
+}
+
+/// Writes a whole file, unless it is the very one that was read; the exit status.
+int writeFile(const SnapshotOptions& options, const Bytes& contents, ExitStatus status) {
+  std::error_code error;
+  if (std::filesystem::equivalent(options.input, options.output, error)) {
+    return nothingDone(fmt::format("{}: the output would replace the input", options.output));
+  }
+  const auto written = replaceFile(
+      options.output, {reinterpret_cast<const char*>(contents.data()), contents.size()});
+  return written ? status : nothingDone(written.error().message);
+}
+
+Result<Dictionary> readSnapshot(const std::string& path) {
+  const auto file = readFile(path, PropertyListLimits::snapshotFile().bytes);
+  if (!file) return tl::unexpected(file.error());
+  auto snapshot = parseSnapshot(*createPropertyListCoding(), *file);
+  if (!snapshot) return failure(fmt::format("{}: {}", path, snapshot.error().message));
+  return snapshot;
+}
+
+// --- save
+
+/// What a generator would save at the end of a capture.
+int runSave(const SnapshotOptions& options) {
+  auto reader = PcapReader::open(options.input);
+  if (!reader) return nothingDone(reader.error().message);
+  RecordingFeed feed(options.input, *std::move(reader));
+  OfflinePlatform platform;
+  platform.clock().setNow(createSystemClock()->now());  // for a capture without a message
+  const auto generator = feed.makeGenerator(platform);
+  if (!generator) return kExitNothingDone;
+  Replay replay(*generator, platform.clock(), {}, [](const ReplayRefresh&) {});
+  while (feed.feedNext(replay)) {
+  }
+  if (feed.status() == kExitNothingDone) return kExitNothingDone;
+  replay.finish();
+  const Snapshot snapshot(platform.clock(), generator->getSaveContentsFromState(replay.state()));
+  const auto file = snapshot.file(platform.propertyListCoding(), options.description);
+  if (!file) return nothingDone(fmt::format("{}: {}", options.input, file.error().message));
+  return writeFile(options, *file, feed.status());
+}
+
+// --- show
+
+int runShow(const SnapshotOptions& options) {
+  const auto snapshot = readSnapshot(options.input);
+  if (!snapshot) return nothingDone(snapshot.error().message);
+  Output output = Output::standardOutput();
+  writeSnapshotText(*snapshot, [&output](std::string_view text) { output.write(text); });
+  output.flush();
+  if (output.failureMessage().empty()) return kExitDone;
+  return nothingDone(output.failureMessage());
+}
+
+// --- export-dlf
+
+int writeReframed(const SnapshotOptions& options, const Dictionary& snapshot, const Value& dlf) {
+  const auto reframed = reframedDlf(dlf.bytes(), snapshot[kSnapshotData].array());
+  if (!reframed) {
+    return nothingDone(
+        fmt::format("{}: its DLF log does not hold the packets of its history", options.input));
+  }
+  for (const ReframedDlf::Unframed& part : reframed->unframed) {
+    complain(fmt::format("{}: entry {}: the last {} bytes are no packets and are left out",
+                         options.input, part.entry, part.size));
+  }
+  return writeFile(options, reframed->dlf,
+                   reframed->unframed.empty() ? kExitDone : kExitPartlyDone);
+}
+
+int runExport(const SnapshotOptions& options) {
+  const auto snapshot = readSnapshot(options.input);
+  if (!snapshot) return nothingDone(snapshot.error().message);
+  const Value dlf = dlfOfSnapshot(*snapshot);
+  if (dlf.isNull()) return nothingDone(fmt::format("{}: holds no DLF log", options.input));
+  if (options.reframe) return writeReframed(options, *snapshot, dlf);
+  return writeFile(options, Bytes(dlf.bytes().begin(), dlf.bytes().end()), kExitDone);
+}
+
+// --- Options
+
+using Options = std::shared_ptr<SnapshotOptions>;
+
+void addInput(CLI::App& action, const Options& options, const char* name, const char* what) {
+  action.add_option(name, options->input, what)->required()->option_text(" ");
+}
+
+void addOutput(CLI::App& action, const Options& options, const char* what) {
+  action.add_option("-o,--output", options->output, what)->required()->option_text("FILE");
+}
+
+Command addSave(CLI::App& snapshot, const Options& options) {
+  CLI::App* action = snapshot.add_subcommand("save", "Save the end of a capture as a snapshot");
+  addInput(*action, options, "CAPTURE", "The capture, a pcap file");
+  addOutput(*action, options, "The snapshot to write");
+  action->add_option("--description", options->description, "What the snapshot shows; may be empty")
+      ->required()
+      ->expected(0, 1)  // "--description=" is an empty one
+      ->option_text("TEXT");
+  action->footer(kSaveFooter);
+  return {action, [options] { return runSave(*options); }};
+}
+
+Command addShow(CLI::App& snapshot, const Options& options) {
+  CLI::App* action = snapshot.add_subcommand("show", "Show what a snapshot holds");
+  addInput(*action, options, "FILE", "The snapshot");
+  action->footer(kShowFooter);
+  return {action, [options] { return runShow(*options); }};
+}
+
+Command addExport(CLI::App& snapshot, const Options& options) {
+  CLI::App* action =
+      snapshot.add_subcommand("export-dlf", "Write a snapshot's packets as a DLF log");
+  addInput(*action, options, "FILE", "The snapshot");
+  addOutput(*action, options, "The DLF log to write");
+  action->add_flag("--reframe", options->reframe, "Leave out the type bytes between the packets");
+  action->footer(kExportFooter);
+  return {action, [options] { return runExport(*options); }};
+}
+
+}  // namespace
+
+Command addSnapshotCommand(CLI::App& program) {
+  const auto options = std::make_shared<SnapshotOptions>();
+  CLI::App* command = program.add_subcommand("snapshot", "Save, show and export snapshots");
+  command->require_subcommand(1);
+  const std::vector<Command> actions = {addSave(*command, options), addShow(*command, options),
+                                        addExport(*command, options)};
+  command->footer(kSnapshotFooter);
+  return {command, [actions] {
+            return std::ranges::find_if(
+                       actions, [](const Command& action) { return action.declaration->parsed(); })
+                ->run();
+          }};
+}
+
+}  // namespace kestro

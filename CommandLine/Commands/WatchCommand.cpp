@@ -1,0 +1,85 @@
+// SPDX-License-Identifier: MIT
+#include "CommandLine/Commands/WatchCommand.h"
+
+#include <CLI/CLI.hpp>
+#include <algorithm>
+#include <memory>
+#include <optional>
+#include <string>
+#include <utility>
+
+#include "CommandLine/Commands/LiveRun.h"
+#include "CommandLine/Commands/WatchSession.h"
+#include "CommandLine/ExitStatus.h"
+#include "CommandLine/Terminal/WatchView.h"
+
+namespace kestro {
+namespace {
+
+constexpr const char* kWatchFooter = R"(Formats:
+  tree    on a terminal the display in its window, redrawn in place, with the values that
+          changed marked (remarks of the decoders on standard error are not shown there:
+          redirect it to keep them); elsewhere one plain display below the other
+  ndjson  one line a refresh: "time" (UTC) and "display"
+The display refreshes every 2 s while data arrives. Ctrl-C ends it.
+
+Examples:
+  kestro-cli watch --demo
+  kestro-cli watch --demo=drive-test:drive.csv
+  kestro-cli watch --format=ndjson --count=10)";
+
+struct WatchOptions {
+  LiveOptions live;
+  std::string format;
+  std::optional<std::uint64_t> count;
+};
+
+class WatchTask : public LiveTask {
+ public:
+  WatchTask(const WatchOptions& options, Platform& platform, Finish finish)
+      : _finish(std::move(finish)),
+        _view(makeView(options)),
+        _session(platform, *_view, options.count, [this] { sessionEnded(); }) {}
+
+  void start() override { _session.start(); }
+  void stop() override { _finish(kExitDone, ""); }
+  void resized() override { _session.redraw(); }
+
+ private:
+  static std::unique_ptr<WatchView> makeView(const WatchOptions& options) {
+    const auto& formats = watchFormats();
+    const auto format = std::ranges::find(formats, options.format, &WatchFormat::name);
+    return format->makeView("Kestro · " + (options.live.demoSource.empty()
+                                               ? options.live.serverName
+                                               : "demo " + options.live.demoSource));
+  }
+
+  void sessionEnded() {
+    if (_view->failureMessage().empty() || _view->readerIsGone()) return _finish(kExitDone, "");
+    _finish(kExitNothingDone, std::string(_view->failureMessage()));
+  }
+
+  Finish _finish;
+  std::unique_ptr<WatchView> _view;
+  WatchSession _session;
+};
+
+}  // namespace
+
+Command addWatchCommand(CLI::App& program) {
+  const auto options = std::make_shared<WatchOptions>();
+  CLI::App* command = program.add_subcommand("watch", "Show the live display");
+  addLiveOptions(*command, options->live);
+  addFormatOption(*command, options->format, formatNames(watchFormats()));
+  command->add_option("--count", options->count, "End after so many refreshes")
+      ->check(CLI::PositiveNumber)
+      ->option_text("N");
+  command->footer(kWatchFooter);
+  return {command, [options] {
+            return runLive(options->live, [&](LinuxPlatform& platform, Finish finish) {
+              return std::make_unique<WatchTask>(*options, platform, std::move(finish));
+            });
+          }};
+}
+
+}  // namespace kestro

@@ -1,0 +1,74 @@
+// SPDX-License-Identifier: MIT
+#include "CommandLine/Commands/WatchSession.h"
+
+#include <string>
+#include <utility>
+
+#include "Platform/Clock.h"
+
+namespace kestro {
+namespace {
+
+constexpr const char* kConnecting = "Connecting...";
+
+}  // namespace
+
+WatchSession::WatchSession(Platform& platform, WatchView& view,
+                           std::optional<std::uint64_t> refreshLimit, std::function<void()> ended)
+    : _platform(platform),
+      _view(view),
+      _refreshLimit(refreshLimit),
+      _ended(std::move(ended)),
+      _updateMessage(kConnecting),
+      _self(std::make_shared<WatchSession*>(this)),
+      _model(KestroModel::create(platform, [weak = std::weak_ptr(_self)] {
+        if (const auto session = weak.lock()) (*session)->refresh();
+      })) {
+  _state.status = kConnecting;
+}
+
+void WatchSession::start() {
+  redraw();
+  _connectionTimer = _platform.mainQueue().scheduleRepeating(kConnectionCheckInterval,
+                                                             [this] { checkConnection(); });
+  _model->restartMonitor();
+}
+
+void WatchSession::redraw() {
+  if (_isOver) return;
+  _view.changed(_state);
+  endIfOver();
+}
+
+void WatchSession::refresh() {
+  if (_isOver) return;
+  NodePointer tree = _model->topLevelNodes();
+  if (!tree) return;  // the channel's technology has no generator: the last display stays
+  const Moment now = _platform.clock().now();
+  if (_model->isConnected()) _updateMessage = updatedText(_platform.clock(), now);
+  _state.previous = std::exchange(_state.tree, std::move(tree));
+  _state.time = now;
+  updateStatus();
+  ++_refreshCount;
+  _view.refreshed(_state);
+  endIfOver();
+}
+
+void WatchSession::checkConnection() {
+  const std::string before = _state.status;
+  updateStatus();
+  if (_state.status != before) redraw();
+}
+
+void WatchSession::updateStatus() {
+  _state.status = _model->isConnected() ? _updateMessage : kConnecting;
+}
+
+void WatchSession::endIfOver() {
+  const bool isComplete = _refreshLimit && _refreshCount >= *_refreshLimit;
+  if (!isComplete && _view.failureMessage().empty()) return;
+  _isOver = true;
+  _ended();
+}
+
+}  // namespace kestro

@@ -1,0 +1,54 @@
+// SPDX-License-Identifier: MIT
+// The live display's behaviour, apart from how it is shown.
+#pragma once
+
+#include <chrono>
+#include <cstdint>
+#include <functional>
+#include <memory>
+#include <optional>
+
+#include "CommandLine/Terminal/WatchView.h"
+#include "Model/KestroModel.h"
+#include "Platform/MainQueue.h"
+#include "Platform/Platform.h"
+
+namespace kestro {
+
+/// How often it is looked whether the model is still connected: no new data tells so.
+inline constexpr std::chrono::milliseconds kConnectionCheckInterval{500};
+
+/// Shows a model's displays in a view: the status is "Connecting..." while the model is not
+/// connected and until the first data, else the time of the last refresh. Main thread only.
+class WatchSession {
+ public:
+  /// `view` and `platform` must outlive the session. After `refreshLimit` refreshes, or when the
+  /// view has failed, nothing more is shown, and `ended` is called once.
+  WatchSession(Platform& platform, WatchView& view, std::optional<std::uint64_t> refreshLimit,
+               std::function<void()> ended);
+
+  /// Shows the status and begins to connect.
+  void start();
+  /// Shows the same again, for another window.
+  void redraw();
+
+ private:
+  void refresh();
+  void checkConnection();
+  void updateStatus();
+  void endIfOver();
+
+  Platform& _platform;
+  WatchView& _view;
+  std::optional<std::uint64_t> _refreshLimit;
+  std::function<void()> _ended;
+  bool _isOver = false;
+  std::uint64_t _refreshCount = 0;
+  std::string _updateMessage = "Connecting...";
+  WatchState _state;
+  std::shared_ptr<WatchSession*> _self;  ///< what a queued redraw finds this by, while it lives
+  std::shared_ptr<KestroModel> _model;
+  std::unique_ptr<Timer> _connectionTimer;
+};
+
+}  // namespace kestro

@@ -1,0 +1,23 @@
+// SPDX-License-Identifier: MIT
+// The list of log codes as people and programs read it.
+#pragma once
+
+#include <span>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "CommandLine/Formats/CodeList.h"
+
+namespace kestro {
+
+/// A format's name on the command line, and what makes its text.
+struct CodesFormat {
+  std::string_view name;
+  std::string (*text)(std::span<const TechnologyCodes> technologies);
+};
+
+/// All formats, the default first.
+[[nodiscard]] const std::vector<CodesFormat>& codesFormats();
+
+}  // namespace kestro

@@ -1,0 +1,172 @@
+// SPDX-License-Identifier: MIT
+#include "CommandLine/Formats/LayoutText.h"
+
+#include <fmt/format.h>
+#include <fmt/ranges.h>
+
+#include <vector>
+
+namespace kestro {
+namespace {
+
+std::string numberFormatText(const NumberFormat& format) {
+  const std::string width = format.width == 0 ? "" : fmt::to_string(format.width);
+  const std::string precision =
+      format.conversion == 'f' && format.precision != 6 ? fmt::format(".{}", format.precision) : "";
+  return fmt::format("{}%{}{}{}{}{}{}", format.prefix, format.plus ? "+" : "",
+                     format.zeroPadded ? "0" : "", width, precision, format.conversion,
+                     format.suffix);
+}
+
+/// "0.25x - 140"; empty for the raw value itself.
+std::string formulaText(double factor, double addend) {
+  if (factor == 1 && addend == 0) return "";
+  std::string text = factor == 1 ? "x" : fmt::format("{}x", factor);
+  if (addend != 0)
+    text += fmt::format(" {} {}", addend < 0 ? '-' : '+', addend < 0 ? -addend : addend);
+  return text;
+}
+
+std::string formattedText(const std::string& formula, const NumberFormat& format) {
+  const std::string number = numberFormatText(format);
+  return formula.empty() ? number : formula + " as " + number;
+}
+
+std::string namesText(const TextRule& rule) {
+  std::vector<std::string> names;
+  for (const NamedValue& name : rule.names) {
+    names.push_back(fmt::format("{}: {}", name.value, name.text));
+  }
+  names.push_back("else " + (rule.otherName.empty() ? numberFormatText(rule.format)
+                                                    : std::string(rule.otherName)));
+  return fmt::format("{}", fmt::join(names, "; "));
+}
+
+std::string kindText(const TextRule& rule) {
+  switch (rule.kind) {
+    case TextRule::Kind::Hidden:
+      return "as it is";
+    case TextRule::Kind::Integer:
+      return formattedText(formulaText(rule.multiplier, rule.addend), rule.format);
+    case TextRule::Kind::Scaled:
+      return formattedText(formulaText(rule.scale, rule.offset), rule.format);
+    case TextRule::Kind::Named:
+      return namesText(rule);
+    case TextRule::Kind::Computed:
+      return "computed";
+    case TextRule::Kind::Each:
+      return "a list of all, each %d";
+    case TextRule::Kind::Removed:
+      return "removed";
+    case TextRule::Kind::Supplied:
+      return "known from another packet";
+  }
+  return "";
+}
+
+std::string conditionText(const Condition& condition, bool inRecord) {
+  const std::string place = placeText(condition.place, inRecord);
+  if (condition.lowest == condition.highest) {
+    return fmt::format("({}) is {}", place, condition.lowest);
+  }
+  return fmt::format("({}) is {} to {}", place, condition.lowest, condition.highest);
+}
+
+std::string fieldText(const Field& field, bool inRecord) {
+  std::string text = ruleText(field.text);
+  if (field.condition.isAlways()) return text;
+  text += " when " + conditionText(field.condition, inRecord);
+  if (!field.otherwise.empty()) text += fmt::format(", else {}", field.otherwise);
+  return text;
+}
+
+/// "from byte 16 + 6 x (u8 at 27), 9 bytes each"
+std::string originText(unsigned base, unsigned perCount, const Place& counted, unsigned stride) {
+  std::string text = fmt::format("from byte {}", base);
+  if (perCount != 0) text += fmt::format(" + {} x ({})", perCount, placeText(counted, false));
+  return text + fmt::format(", {} {} each", stride, stride == 1 ? "byte" : "bytes");
+}
+
+std::vector<std::string_view> technologiesOf(const CellKind& kind) {
+  std::vector<std::string_view> technologies;
+  for (const std::string_view technology : kind.technologies) {
+    if (!technology.empty()) technologies.push_back(technology);
+  }
+  return technologies;
+}
+
+}  // namespace
+
+std::string logCodeText(LogCode code) { return fmt::format("0x{:04X}", code); }
+
+std::string placeText(const Place& place, bool inRecord) {
+  const bool isRelative = inRecord && place.origin != Origin::Packet;
+  std::string text = fmt::format("{}{} at {}{}", place.isSigned ? 's' : 'u', 8 * place.width,
+                                 isRelative ? "+" : "", place.offset);
+  if (inRecord && place.origin == Origin::Twin) text += " of the twin record";
+  if (inRecord && place.origin == Origin::Packet) text += " of the packet";
+  if (place.isBigEndian) text += ", big-endian";
+  if (place.bitCount == 8 * place.width) return text;
+  if (place.bitCount == 1) return text + fmt::format(", bit {}", place.firstBit);
+  return text + fmt::format(", bits {}-{}", place.firstBit, place.firstBit + place.bitCount - 1);
+}
+
+std::string ruleText(const TextRule& rule) {
+  std::string text = kindText(rule);
+  if (rule.number != nullptr) text = "computed, " + text;
+  if (rule.hasAbsentValue) {
+    text += fmt::format("; {}: {}", rule.absentValue,
+                        rule.absentText.empty() ? "nothing" : rule.absentText);
+  }
+  return text;
+}
+
+std::string sourcesText(const CatalogueKey& key) {
+  if (key.listed != nullptr) return std::string(key.listed->listKey);
+  std::vector<std::string> places;
+  for (const Field* field : key.fields) {
+    for (const Place& place : field->allPlaces()) {
+      std::string text = placeText(place, key.table != nullptr);
+      if (places.empty() || places.back() != text) places.push_back(std::move(text));
+    }
+  }
+  return fmt::format("{}", fmt::join(places, "; "));
+}
+
+std::string shownText(const CatalogueKey& key) {
+  if (key.listed != nullptr) return ruleText(key.listed->text);
+  std::vector<std::string> texts;
+  for (const Field* field : key.fields) texts.push_back(fieldText(*field, key.table != nullptr));
+  return fmt::format("{}", fmt::join(texts, "; or "));
+}
+
+std::string tableText(const RecordTable& table) {
+  std::string text =
+      fmt::format("one for each {}; count: {}", table.name, placeText(table.count, false));
+  if (table.countAddend != 0) text += fmt::format(" + {}", table.countAddend);
+  text += "; " + originText(table.base, table.perCount, table.counted, table.stride);
+  if (table.twinStride != 0) {
+    text += "; twins " +
+            originText(table.twinBase, table.twinPerCount, table.counted, table.twinStride);
+  }
+  if (!table.keep.isAlways()) text += "; only where " + conditionText(table.keep, true);
+  return text;
+}
+
+std::string partText(const PropertyListReading& reading) {
+  switch (reading.part) {
+    case ListedPart::Root:
+      return "from the property list's dictionary";
+    case ListedPart::Elements:
+      return "the property list's array as it is";
+    case ListedPart::FirstCell:
+      return fmt::format("from the first {} of {}", reading.cells.type,
+                         fmt::join(technologiesOf(reading.cells), " or "));
+    case ListedPart::EachCell:
+      return fmt::format("from every {} of {}", reading.cells.type,
+                         fmt::join(technologiesOf(reading.cells), " or "));
+  }
+  return "";
+}
+
+}  // namespace kestro

@@ -1,0 +1,102 @@
+// SPDX-License-Identifier: MIT
+#include "CommandLine/Terminal/WatchView.h"
+
+#include <optional>
+#include <utility>
+
+#include "CommandLine/Formats/DisplayFormats.h"
+#include "CommandLine/Terminal/FullScreen.h"
+#include "CommandLine/Terminal/TerminalView.h"
+
+namespace kestro {
+namespace {
+
+/// A view that writes text and keeps nothing back.
+class TextView : public WatchView {
+ public:
+  explicit TextView(Output output) : _output(std::move(output)) {}
+
+  [[nodiscard]] std::string_view failureMessage() const override {
+    return _output.failureMessage();
+  }
+  [[nodiscard]] bool readerIsGone() const override { return _output.readerIsGone(); }
+
+ protected:
+  void write(std::string_view text) {
+    _output.write(text);
+    _output.flush();
+  }
+
+ private:
+  Output _output;
+};
+
+class PlainView : public TextView {
+ public:
+  using TextView::TextView;
+
+  void refreshed(const WatchState& state) override {
+    std::string text = state.status + "\n\n";
+    appendPlainTree(text, *state.tree);
+    write(text + "\n");
+  }
+  void changed(const WatchState& state) override { write(state.status + "\n"); }
+};
+
+class NdjsonView : public TextView {
+ public:
+  using TextView::TextView;
+
+  void refreshed(const WatchState& state) override {
+    std::string text;
+    appendNdjsonLine(text, state.time, std::nullopt, *state.tree);
+    write(text);
+  }
+  void changed(const WatchState&) override {}
+};
+
+/// The live display in the terminal's window.
+class FullScreenView : public WatchView {
+ public:
+  explicit FullScreenView(std::string title) : _title(std::move(title)) {}
+
+  void refreshed(const WatchState& state) override { draw(state); }
+  void changed(const WatchState& state) override { draw(state); }
+
+ private:
+  void draw(const WatchState& state) {
+    _screen.draw(terminalView({.title = _title,
+                               .status = state.status,
+                               .tree = state.tree.get(),
+                               .previous = state.previous.get()},
+                              _screen.size()));
+  }
+
+  std::string _title;
+  FullScreen _screen;
+};
+
+std::unique_ptr<WatchView> makeTreeView(const std::string& title) {
+  if (FullScreen::isPossible()) return std::make_unique<FullScreenView>(title);
+  return makePlainView(Output::standardOutput());
+}
+
+}  // namespace
+
+std::unique_ptr<WatchView> makePlainView(Output output) {
+  return std::make_unique<PlainView>(std::move(output));
+}
+
+std::unique_ptr<WatchView> makeNdjsonView(Output output) {
+  return std::make_unique<NdjsonView>(std::move(output));
+}
+
+const std::vector<WatchFormat>& watchFormats() {
+  static const std::vector<WatchFormat> kFormats = {
+      {"tree", makeTreeView},
+      {"ndjson", [](const std::string&) { return makeNdjsonView(Output::standardOutput()); }},
+  };
+  return kFormats;
+}
+
+}  // namespace kestro

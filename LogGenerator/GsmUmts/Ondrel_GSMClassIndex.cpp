@@ -1,0 +1,11 @@
+// SPDX-License-Identifier: MIT
+#include "LogGenerator/GsmUmts/Ondrel_GSMClassIndex.h"
+
+#include "Platform/TextSink.h"
+
+namespace kestro {
+Ondrel_GSMClassIndex::~Ondrel_GSMClassIndex() {
+  platform().standardOutput().writeLine("Deallocing Ondrel_GSMClassIndex");
+}
+
+}  // namespace kestro

@@ -1,0 +1,73 @@
+// SPDX-License-Identifier: MIT
+#include "LogGenerator/LTE/Reselection.h"
+
+namespace kestro {
+namespace {
+
+constexpr std::size_t kHeaderLength = 21;
+
+constexpr Field kHeader[] = {
+    {"Version", u8(13), decimal()},
+    {"Serving EARFCN", u16(15), decimal()},
+    {"Serving Cell ID", u16(17), decimal()},
+};
+static_assert(isLayout(kHeader));
+
+constexpr NamedValue kCandidateTechnologies[] = {
+    {0, "LTE"}, {1, "UTRAN"}, {2, "GERAN"}, {3, "CDMA1XRTT"}, {4, "CDMAHRPD"},
+};
+
+constexpr Place kTechnology = u16(2);
+constexpr Condition kIsLTE = equals(kTechnology, 0);
+constexpr Condition kIsUTRAN = equals(kTechnology, 1);
+constexpr Condition kIsGeran = equals(kTechnology, 2);
+constexpr Condition kIsCDMA = between(kTechnology, 3, 4);
+
+constexpr Field kCandidate[] = {
+    {"Candidate Priority", u16(0), decimal()},
+    {"Candidate RAT Type", kTechnology, named(kCandidateTechnologies, "??")},
+    Field{"E ARFCN", u16(4), decimal()}.when(kIsLTE),
+    Field{"Cell ID", u16(6).bits(7, 15), decimal()}.when(kIsLTE),
+    Field{"U ARFCN", u16(4), decimal()}.when(kIsUTRAN),
+    Field{"PSC", u16(6), decimal()}.when(kIsUTRAN),
+    Field{"ARFCN", u16(4), decimal()}.when(kIsGeran),
+    Field{"Band", u8(6), decimal()}.when(kIsGeran),
+    Field{"BSIC ID", u8(7), decimal()}.when(kIsGeran),
+    Field{"Band", u8(4), decimal()}.when(kIsCDMA),
+    Field{"Channel", u16(8), decimal()}.when(kIsCDMA),
+    Field{"Pilot", u16(10), decimal()}.when(kIsCDMA),
+};
+static_assert(isLayout(kCandidate));
+
+// The list is as long as the count's low byte says, while an index is checked against all of it.
+// Candidates stand 4 bytes apart though their fields reach further.
+constexpr ListReading kCandidates[] = {{.table = {
+                                            .name = "candidate",
+                                            .count = u8(19),
+                                            .boundsCount = u16(19),
+                                            .base = kHeaderLength,
+                                            .stride = 4,
+                                            .fields = kCandidate,
+                                        }}};
+
+constexpr PacketReading reselection(std::span<const Field> fields,
+                                    std::span<const ListReading> lists) {
+  return {
+      .code = kLTEReselectionCode,
+      .packetName = "LTE reselection candidates",
+      .minimumLength = kHeaderLength,
+      .fields = fields,
+      .lists = lists,
+  };
+}
+constexpr PacketReading kHeaderReading = reselection(kHeader, {});
+constexpr PacketReading kCandidatesReading = reselection({}, kCandidates);
+
+}  // namespace
+
+constinit const Section kReselectionCandidatesSection =
+    sectionOf("Reselection Candidates", SectionKind::Dictionary, kHeaderReading);
+constinit const Section kReselectionCandidatesListSection =
+    sectionOf("Reselection Candidates List", SectionKind::List, kCandidatesReading);
+
+}  // namespace kestro

@@ -1,0 +1,19 @@
+// SPDX-License-Identifier: MIT
+// The LTE reselection packet, 0xB186: the candidates of any radio technology.
+#pragma once
+
+#include "LogGenerator/Ondrel/SectionDecoder.h"
+
+namespace kestro {
+
+/// A candidate's fields lie over the next candidate's first bytes: of several candidates only the
+/// last one says what was meant.
+inline constexpr LogCode kLTEReselectionCode = 0xB186;
+
+extern const Section kReselectionCandidatesSection;
+extern const Section kReselectionCandidatesListSection;
+
+using ReselectionCandidatesMisc = TableDecoder<kReselectionCandidatesSection>;
+using ReselectionCandidatesList = TableDecoder<kReselectionCandidatesListSection>;
+
+}  // namespace kestro

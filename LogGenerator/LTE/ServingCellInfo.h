@@ -1,0 +1,25 @@
+// SPDX-License-Identifier: MIT
+// The LTE serving cell as its system information (0xB0C2), its antennas (0xB0C1) and the
+// cell-monitor list describe it.
+#pragma once
+
+#include "LogGenerator/Ondrel/CellMonitor.h"
+
+namespace kestro {
+
+inline constexpr LogCode kLTESystemInformationCode = 0xB0C2;
+inline constexpr LogCode kLTEAntennasCode = 0xB0C1;
+
+extern const Section kLTEServingCellInfoSection;
+
+/// Reports a decoded antenna packet as unknown all the same.
+class LTEServingCellInfo : public CellMonitorDecoder {
+ public:
+  explicit LTEServingCellInfo(Platform& platform)
+      : CellMonitorDecoder(platform, kLTEServingCellInfoSection) {}
+
+ protected:
+  void didRead(const PacketReading& reading, PacketView packet) override;
+};
+
+}  // namespace kestro

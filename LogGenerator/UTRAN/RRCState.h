@@ -1,0 +1,23 @@
+// SPDX-License-Identifier: MIT
+// The UTRAN radio-resource-control state packet, 0xD0E0.
+#pragma once
+
+#include "LogGenerator/Ondrel/SectionDecoder.h"
+
+namespace kestro {
+
+inline constexpr LogCode kUTRANRRCStateCode = 0xD0E0;
+
+extern const Section kRRCStateSection;
+
+/// Shows the mode of the phone's radio-resource control, and also writes it to the console log. A
+/// packet that is too short is reported and shown all the same: it has no known mode.
+class RRC_State : public SectionDecoder {
+ public:
+  explicit RRC_State(Platform& platform) : SectionDecoder(platform, kRRCStateSection) {}
+
+ protected:
+  void didRead(const PacketReading& reading, PacketView packet) override;
+};
+
+}  // namespace kestro

@@ -1,0 +1,54 @@
+// SPDX-License-Identifier: MIT
+// File names and counts of a recording.
+#include "Recordings/PcapRecording.h"
+
+#include <fmt/format.h>
+
+#include <filesystem>
+#include <utility>
+
+#include "Recordings/PcapFormat.h"
+
+namespace kestro {
+namespace {
+
+std::string numberedPath(const std::string& first, std::size_t number) {
+  const std::filesystem::path path(first);
+  const auto name = fmt::format("{}-{}{}", path.stem().string(), number, path.extension().string());
+  return (path.parent_path() / name).string();
+}
+
+}  // namespace
+
+Result<PcapRecording> PcapRecording::create(const std::string& path, std::string_view technology) {
+  auto writer = PcapWriter::create(path, technology);
+  if (!writer) return tl::unexpected(writer.error());
+  return PcapRecording(path, technology, std::move(*writer));
+}
+
+PcapRecording::PcapRecording(const std::string& path, std::string_view technology,
+                             PcapWriter writer)
+    : _files{path}, _technology(technology), _writer(std::move(writer)) {}
+
+Result<void> PcapRecording::setTechnology(std::string_view technology) {
+  if (technology == _technology) return {};
+  const auto path = numberedPath(_files.front(), _files.size() + 1);
+  auto writer = PcapWriter::create(path, technology);
+  if (!writer) return tl::unexpected(writer.error());
+  _writer = std::move(*writer);
+  _technology = technology;
+  _files.push_back(path);
+  return {};
+}
+
+Result<void> PcapRecording::write(Moment time, ByteView message) {
+  if (message.size() > kMaximumPcapMessageSize) {
+    ++_leftOutCount;
+    return {};
+  }
+  auto written = _writer.write(time, message);
+  if (written) ++_messageCount;
+  return written;
+}
+
+}  // namespace kestro

@@ -1,0 +1,96 @@
+// SPDX-License-Identifier: MIT
+#include "Sources/DriveTestSource.h"
+
+#include <fmt/format.h>
+#include <fmt/ranges.h>
+
+#include <algorithm>
+#include <cstdint>
+#include <iterator>
+#include <utility>
+
+namespace kestro {
+
+Result<std::unique_ptr<DriveTestSource>> DriveTestSource::open(
+    const std::string& path, std::unique_ptr<DriveTestEncoder> encoder, SourceReporter report) {
+  auto log = DriveTestLog::open(path);
+  if (!log) return tl::unexpected(log.error());
+  if (const auto& missing = log->missingColumns(); !missing.empty()) {
+    report(fmt::format("{}: no columns {}; their values are left out", path,
+                       fmt::join(missing, ", ")));
+  }
+  return std::unique_ptr<DriveTestSource>(
+      new DriveTestSource(path, std::move(*log), std::move(encoder), std::move(report)));
+}
+
+DriveTestSource::DriveTestSource(std::string path, DriveTestLog log,
+                                 std::unique_ptr<DriveTestEncoder> encoder, SourceReporter report)
+    : _path(std::move(path)),
+      _log(std::move(log)),
+      _encoder(std::move(encoder)),
+      _report(std::move(report)) {}
+
+Result<SourceStep> DriveTestSource::next() {
+  while (_messages.empty()) {
+    if (_rows.empty()) {
+      if (auto read = readSecond(); !read) return tl::unexpected(read.error());
+      if (_rows.empty()) {
+        reportProblems();
+        return SourceEnded{};
+      }
+    }
+    const TimedRow timed = std::move(_rows.front());
+    _rows.pop_front();
+    _time = timed.time;
+    auto messages = _encoder->messages(timed.row);
+    std::ranges::move(messages, std::back_inserter(_messages));
+  }
+  _message = std::move(_messages.front());
+  _messages.pop_front();
+  return SourceEvent{.time = _time, .technology = _encoder->technology(), .message = _message};
+}
+
+Result<void> DriveTestSource::readSecond() {
+  std::vector<DriveTestRow> rows;
+  if (_rowOfNextSecond) rows.push_back(*std::exchange(_rowOfNextSecond, std::nullopt));
+  while (rows.size() < kMaximumRowsOfASecond) {
+    auto row = _log.next();
+    if (!row) return tl::unexpected(row.error());
+    if (!row->has_value()) break;
+    if (!rows.empty() && (*row)->time != rows.front().time) {
+      _rowOfNextSecond = std::move(*row);
+      break;
+    }
+    rows.push_back(std::move(**row));
+  }
+  if (rows.empty()) return {};
+  // Where the log's clock was set back, its second lies before rows that are spread already.
+  const auto begin = std::max(_timeline.advanceTo(rows.front().time), _time);
+  const auto count = static_cast<std::int64_t>(rows.size());
+  for (std::int64_t i = 0; i < count; ++i) {
+    const auto share = std::chrono::microseconds(std::chrono::seconds(1)) * i / count;
+    _rows.push_back({begin + share, std::move(rows[static_cast<std::size_t>(i)])});
+  }
+  return {};
+}
+
+void DriveTestSource::reportProblems() {
+  const auto& problems = _log.problems();
+  if (problems.rows == 0 && problems.values == 0) return;
+  _report(fmt::format("{}: {} rows and {} values could not be used; the first: {}", _path,
+                      problems.rows, problems.values, problems.first));
+}
+
+Result<void> DriveTestSource::restart() {
+  auto log = DriveTestLog::open(_path);
+  if (!log) return tl::unexpected(log.error());
+  _log = std::move(*log);
+  _timeline = {};
+  _rowOfNextSecond.reset();
+  _rows.clear();
+  _time = {};
+  _messages.clear();
+  return {};
+}
+
+}  // namespace kestro

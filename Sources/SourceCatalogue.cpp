@@ -1,0 +1,232 @@
+// SPDX-License-Identifier: MIT
+// The table of source kinds.
+#include "Sources/SourceCatalogue.h"
+
+#include <fmt/format.h>
+#include <fmt/ranges.h>
+
+#include <algorithm>
+#include <array>
+#include <vector>
+
+#include "Platform/TelephonyService.h"
+#include "Sources/AutoDriveTest.h"
+#include "Sources/C2K/C2KSimulation.h"
+#include "Sources/DriveTestSource.h"
+#include "Sources/GsmUmts/GsmUmtsSimulation.h"
+#include "Sources/IFX/IFXDriveTest.h"
+#include "Sources/IFX/IFXSimulation.h"
+#include "Sources/LTE/LTESimulation.h"
+#include "Sources/PacketSimulation.h"
+#include "Sources/RecordingSource.h"
+#include "Sources/StreamSource.h"
+#include "Sources/UTRAN/UTRANSimulation.h"
+
+namespace kestro {
+namespace {
+
+using OpenedSource = Result<std::unique_ptr<LogSource>>;
+
+constexpr std::array kTechnologies = {
+    kTqLogChannelTechnology_IFX, kTqLogChannelTechnology_Ondrel_GSM,
+    kTqLogChannelTechnology_Ondrel_CDMA, kTqLogChannelTechnology_Ondrel_LTE,
+    kTqLogChannelTechnology_Ondrel_UTRAN2};
+
+// For --technology: all of them, and the wish to follow the source.
+constexpr auto kTechnologyChoices = [] {
+  std::array<std::string_view, kTechnologies.size() + 1> choices;
+  std::ranges::copy(kTechnologies, choices.begin());
+  choices.back() = kAutomaticTechnology;
+  return choices;
+}();
+
+// What is made of logs and streams that do not know better.
+std::string_view orDefault(std::string_view technology) {
+  return technology.empty() ? kTqLogChannelTechnology_IFX : technology;
+}
+
+template <class Baseband>
+std::unique_ptr<LogSource> packetSimulation(const PropertyListCoding& coding) {
+  return std::make_unique<PacketSimulation>(
+      [&coding] { return std::make_unique<Baseband>(coding); });
+}
+
+template <class Source>
+std::unique_ptr<LogSource> simulation(const PropertyListCoding& coding) {
+  return std::make_unique<Source>(coding);
+}
+
+/// What can be simulated, and who does it.
+struct Simulation {
+  std::string_view technology;
+  std::unique_ptr<LogSource> (*make)(const PropertyListCoding& coding);
+};
+constexpr std::array kSimulations = {
+    Simulation{kTqLogChannelTechnology_IFX, simulation<IFXSimulation>},
+    Simulation{kTqLogChannelTechnology_Ondrel_GSM, packetSimulation<GsmUmtsSimulation>},
+    Simulation{kTqLogChannelTechnology_Ondrel_CDMA, packetSimulation<C2KSimulation>},
+    Simulation{kTqLogChannelTechnology_Ondrel_LTE, packetSimulation<LTESimulation>},
+    Simulation{kTqLogChannelTechnology_Ondrel_UTRAN2, packetSimulation<UTRANSimulation>},
+};
+
+template <class Encoder>
+std::unique_ptr<DriveTestEncoder> encoder(const PropertyListCoding& coding,
+                                          DriveTestFamily /*first*/) {
+  return std::make_unique<Encoder>(coding);
+}
+
+std::unique_ptr<DriveTestEncoder> autoEncoder(const PropertyListCoding& coding,
+                                              DriveTestFamily first) {
+  return std::make_unique<AutoDriveTestEncoder>(coding, first);
+}
+
+/// What a drive-test log can be written as, and by whom, given the family of its first row.
+struct DriveTestWriter {
+  std::string_view technology;
+  std::unique_ptr<DriveTestEncoder> (*make)(const PropertyListCoding& coding,
+                                            DriveTestFamily first);
+};
+constexpr std::array kDriveTestWriters = {
+    DriveTestWriter{kTqLogChannelTechnology_IFX, encoder<IFXDriveTestEncoder>},
+    DriveTestWriter{kTqLogChannelTechnology_Ondrel_GSM, encoder<GsmUmtsDriveTestEncoder>},
+    DriveTestWriter{kTqLogChannelTechnology_Ondrel_LTE, encoder<LTEDriveTestEncoder>},
+    DriveTestWriter{kAutomaticTechnology, autoEncoder},
+};
+
+/// The refusal of a technology that a source does not speak, with those that it does.
+template <class Rows>
+tl::unexpected<Error> notMade(const SourceRequest& request, std::string_view technology,
+                              const Rows& rows) {
+  std::vector<std::string_view> made;
+  made.reserve(rows.size());
+  for (const auto& row : rows) made.push_back(row.technology);
+  return failure(fmt::format("the source \"{}\" cannot make {} messages, only {}", request.kind,
+                             technology, fmt::join(made, ", ")));
+}
+
+OpenedSource openSimulation(const SourceRequest& request, Platform& platform,
+                            const SourceReporter& /*report*/) {
+  std::string_view technology = request.technology;
+  if (technology.empty()) technology = technologyNamed(request.argument);
+  if (technology.empty()) technology = kTqLogChannelTechnology_Ondrel_LTE;
+  const auto* row = std::ranges::find(kSimulations, technology, &Simulation::technology);
+  if (row == kSimulations.end()) return notMade(request, technology, kSimulations);
+  return row->make(platform.propertyListCoding());
+}
+
+OpenedSource openCapture(const SourceRequest& request, Platform& /*platform*/,
+                         const SourceReporter& report) {
+  // A capture says itself what it speaks.
+  const bool followsFile = request.technology == kAutomaticTechnology;
+  return RecordingSource::open(request.argument, followsFile ? "" : request.technology, report);
+}
+
+/// The family of a log's first usable row; LTE where there is none.
+Result<DriveTestFamily> firstFamily(const std::string& path) {
+  auto log = DriveTestLog::open(path);
+  if (!log) return tl::unexpected(log.error());
+  const auto row = log->next();
+  if (!row) return tl::unexpected(row.error());
+  return row->has_value() ? (*row)->family : DriveTestFamily::LTE;
+}
+
+OpenedSource openDriveTest(const SourceRequest& request, Platform& platform,
+                           const SourceReporter& report) {
+  const auto technology = orDefault(request.technology);
+  const auto* row = std::ranges::find(kDriveTestWriters, technology, &DriveTestWriter::technology);
+  if (row == kDriveTestWriters.end()) return notMade(request, technology, kDriveTestWriters);
+  const auto first = firstFamily(request.argument);
+  if (!first) return tl::unexpected(first.error());
+  return DriveTestSource::open(request.argument, row->make(platform.propertyListCoding(), *first),
+                               report);
+}
+
+OpenedSource openStream(const SourceRequest& request, Platform& platform,
+                        const SourceReporter& /*report*/) {
+  if (request.technology == kAutomaticTechnology) {
+    return failure("a stream does not say what it speaks; --technology must");
+  }
+  return StreamSource::open(platform.inputStreams(), request.argument,
+                            orDefault(request.technology));
+}
+
+bool isTechnologyOrEmpty(std::string_view argument) {
+  return argument.empty() || !technologyNamed(argument).empty();
+}
+
+bool isGiven(std::string_view argument) { return !argument.empty(); }
+
+constexpr std::array kKinds = {
+    SourceKind{"simulation", isTechnologyOrEmpty, "simulation[:TECHNOLOGY]",
+               "A made-up drive, the same in every run: cells, path loss, fading,\n"
+               "handovers, data transfers. Technology: LTE (unless given), IFX,\n"
+               "Ondrel_GSM, Ondrel_CDMA or UTRAN2.",
+               openSimulation},
+    SourceKind{"capture", isGiven, "capture:FILE",
+               "A recorded capture, with the pauses that it was recorded with. The\n"
+               "file names the technology.",
+               openCapture},
+    SourceKind{"drive-test", isGiven, "drive-test:FILE.csv",
+               "A drive-test log as phone apps write it, one row a second: columns\n"
+               "Timestamp, NetworkMode, RSRP, and what else there is of RSRQ, SNR,\n"
+               "RSSI, CQI, NRxRSRP, NRxRSRQ, DL_bitrate, UL_bitrate, CellID, CELLHEX,\n"
+               "NODEHEX, LACHEX, RAWCELLID, Operatorname, State, Longitude, Latitude,\n"
+               "Speed. Technology: IFX (unless given), where nothing is made up save\n"
+               "the neighbour's rank; LTE (the log's LTE and 5G rows) or Ondrel_GSM\n"
+               "(its UMTS and GSM rows), where what the log does not hold is made up:\n"
+               "physical cell identities, scrambling codes, channels, network code,\n"
+               "states, SIM, contexts; auto follows the log from one to the other. A\n"
+               "value that was not measured (\"-\") keeps the last one; before there\n"
+               "is one, it is left out, with the packets that need it.",
+               openDriveTest},
+    SourceKind{"stream", isGiven, "stream:PATH",
+               "Messages from a file, a pipe or standard input (\"-\") as they arrive,\n"
+               "each behind its length (32 bits, little-endian). --technology says\n"
+               "what they are; IFX unless given. --speed does not apply.",
+               openStream},
+};
+
+}  // namespace
+
+std::span<const SourceKind> sourceKinds() noexcept { return kKinds; }
+
+std::span<const std::string_view> technologyNames() noexcept { return kTechnologies; }
+
+std::span<const std::string_view> technologyChoices() noexcept { return kTechnologyChoices; }
+
+std::string_view technologyChosen(std::string_view name) noexcept {
+  return name == kAutomaticTechnology ? kAutomaticTechnology : technologyNamed(name);
+}
+
+std::string_view technologyNamed(std::string_view name) noexcept {
+  const auto* found = std::ranges::find(kTechnologies, name);
+  return found == kTechnologies.end() ? std::string_view() : *found;
+}
+
+Result<SourceRequest> parseSource(std::string_view text, std::string_view technology) {
+  const auto colon = text.find(':');
+  const auto name = text.substr(0, colon);
+  const auto argument =
+      colon == std::string_view::npos ? std::string_view() : text.substr(colon + 1);
+  const auto* kind = std::ranges::find(kKinds, name, &SourceKind::name);
+  if (kind == kKinds.end()) {
+    std::vector<std::string_view> names;
+    names.reserve(kKinds.size());
+    for (const auto& known : kKinds) names.push_back(known.name);
+    return failure(
+        fmt::format("there is no source \"{}\" (there are {})", name, fmt::join(names, ", ")));
+  }
+  if (!kind->accepts(argument)) {
+    return failure(fmt::format("\"{}\" is no source; the form is {}", text, kind->form));
+  }
+  return SourceRequest{std::string(name), std::string(argument), technology};
+}
+
+Result<std::unique_ptr<LogSource>> openSource(const SourceRequest& request, Platform& platform,
+                                              const SourceReporter& report) {
+  const auto* kind = std::ranges::find(kKinds, request.kind, &SourceKind::name);
+  if (kind == kKinds.end()) return failure(fmt::format("no source \"{}\"", request.kind));
+  return kind->open(request, platform, report);
+}
+
+}  // namespace kestro

@@ -1,0 +1,118 @@
+// SPDX-License-Identifier: MIT
+// Sources by name.
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <memory>
+#include <string>
+
+#include "Platform/Linux/LinuxPlatform.h"
+#include "Platform/Virtual/VirtualPlatform.h"
+#include "Sources/SourceCatalogue.h"
+#include "Tests/Recordings/PcapBytes.h"
+#include "Tests/Support/TemporaryDirectory.h"
+
+namespace kestro {
+namespace {
+
+using ::testing::HasSubstr;
+using testing::TemporaryDirectory;
+
+class SourceCatalogueTest : public ::testing::Test {
+ protected:
+  Result<std::unique_ptr<LogSource>> open(std::string_view text, std::string_view technology = "") {
+    const auto request = parseSource(text, technology);
+    EXPECT_TRUE(request.has_value()) << request.error().message;
+    return openSource(*request, platform, report);
+  }
+
+  TemporaryDirectory directory;
+  std::unique_ptr<PropertyListCoding> coding = createPropertyListCoding();
+  VirtualPlatform platform{*coding};
+  SourceReporter report = [](std::string_view) {};
+};
+
+TEST_F(SourceCatalogueTest, TheKindEndsAtTheFirstColon) {
+  const auto request = parseSource("capture:a:b.pcap", "LTE");
+  ASSERT_TRUE(request.has_value());
+  EXPECT_EQ(request->kind, "capture");
+  EXPECT_EQ(request->argument, "a:b.pcap");
+  EXPECT_EQ(request->technology, "LTE");
+}
+
+TEST_F(SourceCatalogueTest, UnknownKindsAndMissingArgumentsAreWrongUsage) {
+  for (const auto* text : {"", "film", "capture", "capture:", "drive-test",
+                           "stream:", "simulation:5G", ":x", "Simulation"}) {
+    EXPECT_FALSE(parseSource(text, "").has_value()) << text;
+  }
+  EXPECT_EQ(parseSource("film:x", "").error().message,
+            "there is no source \"film\" (there are simulation, capture, drive-test, stream)");
+  EXPECT_EQ(parseSource("capture", "").error().message,
+            "\"capture\" is no source; the form is capture:FILE");
+}
+
+TEST_F(SourceCatalogueTest, OpensEveryKind) {
+  const auto capture = directory.write("a.pcap", captureHeader(151));
+  const auto log = directory.write("a.csv", std::string_view("Timestamp,NetworkMode,RSRP\n"));
+  platform.inputStreams().allow("pipe");
+  EXPECT_EQ((*open("simulation"))->technology(), "LTE");
+  EXPECT_EQ((*open("simulation:IFX"))->technology(), "IFX");
+  EXPECT_EQ((*open("capture:" + capture))->technology(), "UTRAN2");
+  EXPECT_EQ((*open("drive-test:" + log))->technology(), "IFX");
+  EXPECT_EQ((*open("stream:pipe"))->technology(), "IFX");
+}
+
+TEST_F(SourceCatalogueTest, TheTechnologyAskedForWins) {
+  const auto capture = directory.write("a.pcap", captureHeader(151));
+  platform.inputStreams().allow("pipe");
+  EXPECT_EQ((*open("capture:" + capture, "LTE"))->technology(), "LTE");
+  EXPECT_EQ((*open("stream:pipe", "Ondrel_GSM"))->technology(), "Ondrel_GSM");
+  EXPECT_EQ((*open("simulation:LTE", "IFX"))->technology(), "IFX");
+}
+
+TEST_F(SourceCatalogueTest, SimulationsAndDriveTestsSpeakSeveralTechnologies) {
+  const auto log = directory.write("a.csv", std::string_view("Timestamp,NetworkMode,RSRP\n"
+                                                             "2020.01.02_03.04.05,EDGE,-90\n"));
+  for (const std::string technology : {"LTE", "Ondrel_GSM"}) {
+    EXPECT_EQ((*open("drive-test:" + log, technology))->technology(), technology);
+  }
+  for (const auto technology : technologyNames()) {
+    EXPECT_EQ((*open("simulation:" + std::string(technology)))->technology(), technology);
+  }
+  EXPECT_THAT(open("drive-test:" + log, "UTRAN2").error().message,
+              HasSubstr("cannot make UTRAN2 messages, only IFX, Ondrel_GSM, LTE, auto"));
+}
+
+TEST_F(SourceCatalogueTest, AnAutomaticDriveTestBeginsWithItsFirstRow) {
+  const auto gsm = directory.write("a.csv", std::string_view("Timestamp,NetworkMode,RSRP\n"
+                                                             "2020.01.02_03.04.05,EDGE,-90\n"));
+  const auto lte = directory.write("b.csv", std::string_view("Timestamp,NetworkMode,RSRP\n"
+                                                             "2020.01.02_03.04.05,5G,-90\n"));
+  EXPECT_EQ((*open("drive-test:" + gsm, kAutomaticTechnology))->technology(), "Ondrel_GSM");
+  EXPECT_EQ((*open("drive-test:" + lte, kAutomaticTechnology))->technology(), "LTE");
+}
+
+TEST_F(SourceCatalogueTest, AutomaticMeansWhatASourceSaysItself) {
+  const auto capture = directory.write("a.pcap", captureHeader(151));
+  platform.inputStreams().allow("pipe");
+  EXPECT_EQ((*open("capture:" + capture, kAutomaticTechnology))->technology(), "UTRAN2");
+  EXPECT_FALSE(open("stream:pipe", kAutomaticTechnology).has_value());
+  EXPECT_FALSE(open("simulation", kAutomaticTechnology).has_value());
+}
+
+TEST_F(SourceCatalogueTest, FilesThatCannotBeUsedAreNamed) {
+  EXPECT_THAT(open("capture:/none").error().message, HasSubstr("/none"));
+  EXPECT_THAT(open("drive-test:/none").error().message, HasSubstr("/none"));
+}
+
+TEST_F(SourceCatalogueTest, TechnologiesAreFoundByTheirNames) {
+  for (const auto name : technologyNames()) EXPECT_EQ(technologyNamed(name), name);
+  EXPECT_EQ(technologyNames().size(), 5U);
+  EXPECT_EQ(technologyNamed("5G"), "");
+  EXPECT_EQ(technologyNamed("auto"), "");
+  for (const auto name : technologyChoices()) EXPECT_EQ(technologyChosen(name), name);
+  EXPECT_EQ(technologyChoices().size(), 6U);
+}
+
+}  // namespace
+}  // namespace kestro
