@@ -1,8 +1,9 @@
 // SPDX-License-Identifier: MIT
 #include "App/Panes/KestroPaneController.h"
 
-#include <algorithm>
 #include <utility>
+
+#include "Model/NodePair.h"
 
 namespace kestro {
 namespace {
@@ -11,14 +12,6 @@ const std::vector<NodePointer>& childrenOf(const NodePointer& node) {
   static const std::vector<NodePointer> kNone;
   const std::vector<NodePointer>* children = node ? node->childNodes() : nullptr;
   return children == nullptr ? kNone : *children;
-}
-
-/// The child with that name, the one at `row` before any other; null when there is none.
-NodePointer childNamed(const NodePointer& node, const std::string& name, std::size_t row) {
-  const auto& children = childrenOf(node);
-  if (row < children.size() && children[row]->displayName() == name) return children[row];
-  const auto found = std::ranges::find(children, name, &KestroModelNode::displayName);
-  return found == children.end() ? nullptr : *found;
 }
 
 QString paneIdentifier() { return QStringLiteral("KestroPaneControllerCell"); }
@@ -90,21 +83,17 @@ void KestroPaneController::reloadWithNode(NodePointer node) {
 
 /// Rows may have come or gone above the one that has the focus.
 void KestroPaneController::keepFocusOn(const std::string& name) {
-  const auto& children = childrenOf(_nodes);
-  const auto row = static_cast<std::size_t>(_table->focusedRow());
-  if (row < children.size() && children[row]->displayName() == name) return;
-  const auto found = std::ranges::find(children, name, &KestroModelNode::displayName);
-  if (found != children.end()) {
-    _table->focusRowAtReload(static_cast<int>(found - children.begin()));
+  const int focused = _table->focusedRow();
+  const auto row = childPlace(_nodes.get(), static_cast<std::size_t>(focused), name);
+  if (row && static_cast<int>(*row) != focused) {
+    _table->focusRowAtReload(static_cast<int>(*row));
   }
 }
 
+/// A row that is new is not marked.
 bool KestroPaneController::hasChanged(int row) const {
   if (!_earlierNodes || !_host.marksChanges()) return false;
-  const KestroModelNode& node = *nodeAtRow(row);
-  const NodePointer earlier =
-      childNamed(_earlierNodes, node.displayName(), static_cast<std::size_t>(row));
-  return earlier && earlier->value() != nullptr && *earlier->value() != *node.value();
+  return NodePair(*_nodes, _earlierNodes.get()).child(static_cast<std::size_t>(row)).isChanged();
 }
 
 std::unique_ptr<TableCell> KestroPaneController::cellForRow(int row) {

@@ -134,7 +134,7 @@ class Table {
     }
     const NodePair value = row.child(index);
     appendCell(line, displayText(*value.node().value()),
-               value.isChanged() ? TextStyle::Changed : TextStyle::Plain, column.width,
+               value.isNewOrChanged() ? TextStyle::Changed : TextStyle::Plain, column.width,
                column.isFlushRight);
   }
 

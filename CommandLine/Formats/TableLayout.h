@@ -5,8 +5,8 @@
 #include <cstddef>
 #include <optional>
 
-#include "CommandLine/Formats/NodePair.h"
 #include "CommandLine/Formats/TreeLayout.h"
+#include "Model/NodePair.h"
 
 namespace kestro {
 

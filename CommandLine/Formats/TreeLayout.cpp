@@ -7,8 +7,8 @@
 #include <utility>
 
 #include "CommandLine/Formats/DisplayText.h"
-#include "CommandLine/Formats/NodePair.h"
 #include "CommandLine/Formats/TableLayout.h"
+#include "Model/NodePair.h"
 
 namespace kestro {
 namespace {
@@ -52,7 +52,7 @@ class Layout {
     StyledLine line;
     line.padTo(indent).append(displayText(leaf.node().displayName()), TextStyle::Key);
     line.padTo(std::max(indent + keyWidth, line.width()) + kValueGap);
-    line.append(valueText(leaf), leaf.isChanged() ? TextStyle::Changed : TextStyle::Plain);
+    line.append(valueText(leaf), leaf.isNewOrChanged() ? TextStyle::Changed : TextStyle::Plain);
     appendLine(block, line);
   }
 
