@@ -6,6 +6,11 @@
 #include <utility>
 
 namespace kestro {
+namespace {
+
+bool isOver(PortDeadline deadline) { return std::chrono::steady_clock::now() >= deadline; }
+
+}  // namespace
 
 UnixRemotePort::UnixRemotePort(FileDescriptor socket, std::string portName,
                                std::shared_ptr<PortContext> context)
@@ -70,7 +75,8 @@ SendError UnixRemotePort::transmit(const PortFrameHeader& header, ByteView messa
   const PortSendQueue::Position position = queue().append(header, message);
   for (flush(); isOpen() && !queue().empty(); flush()) {
     const short ready = waitFor(POLLOUT | POLLIN, deadline);
-    if (ready == 0) {
+    // A peer that sends replies without end, or reads byte by byte, would be ready for ever.
+    if (ready == 0 || isOver(deadline)) {
       queue().withdraw(position);
       countQueue();
       return SendError::SendTimeout;
@@ -82,13 +88,15 @@ SendError UnixRemotePort::transmit(const PortFrameHeader& header, ByteView messa
 }
 
 RemotePort::Reply UnixRemotePort::awaitReply(std::uint32_t sequence, PortDeadline deadline) {
-  for (;;) {
+  for (bool isLastRead = false;;) {
     if (const auto reply = findReply(sequence)) {
       if (reply->header.kind == PortFrameKind::ReplyWithoutData) return {};
       return {SendError::None, Bytes(reply->body.begin(), reply->body.end())};
     }
     if (!isOpen()) return {SendError::Transport, {}};
-    if (waitFor(POLLIN, deadline) == 0) return {SendError::ReceiveTimeout, {}};
+    if (isLastRead || waitFor(POLLIN, deadline) == 0) return {SendError::ReceiveTimeout, {}};
+    // A reply that came in time may lie there still. Other replies without end must not hold us up.
+    isLastRead = isOver(deadline);
     if (!readOnce()) close();
   }
 }

@@ -10,6 +10,7 @@ namespace kestro {
 namespace {
 
 constexpr std::size_t kMaximumWaitingBytes = std::size_t{4} * 1024 * 1024;
+constexpr std::chrono::nanoseconds kAtOnce{0};
 
 }  // namespace
 
@@ -29,6 +30,7 @@ class InMemoryPorts::Local : public LocalPort, public std::enable_shared_from_th
   }
 
   [[nodiscard]] bool isValid() const override { return _valid; }
+  [[nodiscard]] bool isStalled() const noexcept { return _stalled; }
 
   /// Takes a message for delivery; false when too much waits already.
   bool enqueue(std::int32_t messageId, ByteView message) {
@@ -84,20 +86,26 @@ class InMemoryPorts::Remote : public RemotePort {
       : _ports(ports), _receiver(std::move(receiver)) {}
 
   SendError post(std::int32_t messageId, ByteView message) override {
-    return deliver(messageId, message, _ports._failures.post);
+    const SendError error = deliver(messageId, message, _ports._failures.post);
+    if (error != kQueueIsFull) return error;
+    invalidate();
+    return SendError::Transport;
   }
 
-  SendError send(std::int32_t messageId, ByteView message, std::chrono::nanoseconds) override {
-    return deliver(messageId, message, _ports._failures.send);
+  SendError send(std::int32_t messageId, ByteView message,
+                 std::chrono::nanoseconds sendTimeout) override {
+    const SendError error = deliver(messageId, message, _ports._failures.send);
+    if (error == SendError::SendTimeout) _ports._queue.wait(sendTimeout);
+    return error;
   }
 
-  [[nodiscard]] Reply request(std::int32_t messageId, ByteView message, std::chrono::nanoseconds,
-                              std::chrono::nanoseconds) override {
-    const auto receiver = valid();
-    if (!receiver) return {SendError::InvalidPort, {}};
-    if (const auto meanwhile = std::exchange(_ports._failures.duringRequest, {})) meanwhile();
-    if (auto failure = std::exchange(_ports._failures.request, std::nullopt)) return *failure;
-    return {SendError::None, receiver->answer(messageId, message)};
+  [[nodiscard]] Reply request(std::int32_t messageId, ByteView message,
+                              std::chrono::nanoseconds sendTimeout,
+                              std::chrono::nanoseconds receiveTimeout) override {
+    Reply reply = ask(messageId, message, receiveTimeout);
+    if (reply.error == SendError::SendTimeout) _ports._queue.wait(sendTimeout);
+    if (reply.error == SendError::ReceiveTimeout) _ports._queue.wait(receiveTimeout);
+    return reply;
   }
 
   void invalidate() override { _receiver.reset(); }
@@ -105,6 +113,22 @@ class InMemoryPorts::Remote : public RemotePort {
   [[nodiscard]] bool isValid() const override { return valid() != nullptr; }
 
  private:
+  static constexpr SendError kQueueIsFull = SendError::SendTimeout;
+
+  [[nodiscard]] Reply ask(std::int32_t messageId, ByteView message,
+                          std::chrono::nanoseconds receiveTimeout) {
+    const auto receiver = valid();
+    if (!receiver) return {SendError::InvalidPort, {}};
+    if (const auto meanwhile = std::exchange(_ports._failures.duringRequest, {})) meanwhile();
+    if (auto failure = std::exchange(_ports._failures.request, std::nullopt)) return *failure;
+    const auto delay = std::exchange(_ports._failures.replyDelay, {}).value_or(kAtOnce);
+    if (receiver->isStalled()) return {SendError::ReceiveTimeout, {}};
+    auto answer = receiver->answer(messageId, message);
+    if (delay > receiveTimeout) return {SendError::ReceiveTimeout, {}};
+    _ports._queue.wait(delay);
+    return {SendError::None, std::move(answer)};
+  }
+
   [[nodiscard]] std::shared_ptr<Local> valid() const {
     auto receiver = _receiver.lock();
     return receiver && receiver->isValid() ? receiver : nullptr;
@@ -115,9 +139,7 @@ class InMemoryPorts::Remote : public RemotePort {
     if (!receiver) return SendError::InvalidPort;
     if (const auto error = std::exchange(failure, std::nullopt)) return *error;
     if (message.size() > kMaximumMessageSize) return SendError::Transport;
-    if (receiver->enqueue(messageId, message)) return SendError::None;
-    invalidate();
-    return SendError::Transport;
+    return receiver->enqueue(messageId, message) ? SendError::None : kQueueIsFull;
   }
 
   InMemoryPorts& _ports;

@@ -2,6 +2,7 @@
 // Message ports within one process, with failures on request.
 #pragma once
 
+#include <chrono>
 #include <deque>
 #include <functional>
 #include <map>
@@ -9,13 +10,14 @@
 #include <optional>
 #include <string>
 
-#include "Platform/MainQueue.h"
 #include "Platform/MessagePort.h"
+#include "Platform/Virtual/VirtualMainQueue.h"
 
 namespace kestro {
 
 /// Ports that deliver through a main queue, in the order of sending. A request calls the receiver's
-/// handler at once, as the wait for a reply serves nothing else.
+/// handler at once, as the wait for a reply serves nothing else. What runs out of time takes that
+/// time, in which nothing else runs.
 class InMemoryPorts : public MessagePorts {
  public:
   /// What goes wrong next; each failure is used up by the first operation that it applies to.
@@ -25,10 +27,12 @@ class InMemoryPorts : public MessagePorts {
     std::optional<SendError> post;             ///< post yields this and delivers nothing
     std::optional<SendError> send;             ///< send yields this and delivers nothing
     std::optional<RemotePort::Reply> request;  ///< request yields this and delivers nothing
-    std::function<void()> duringRequest;       ///< runs while the next request waits
+    /// The reply to a request comes so long after it was asked for, if that is in time.
+    std::optional<std::chrono::nanoseconds> replyDelay;
+    std::function<void()> duringRequest;  ///< runs while the next request waits
   };
 
-  explicit InMemoryPorts(MainQueue& queue) : _queue(queue) {}
+  explicit InMemoryPorts(VirtualMainQueue& queue) : _queue(queue) {}
 
   [[nodiscard]] std::shared_ptr<LocalPort> createLocalPort(std::string_view name,
                                                            ReceiveHandler handler) override;
@@ -42,7 +46,8 @@ class InMemoryPorts : public MessagePorts {
   [[nodiscard]] std::vector<std::string> names() const;
   /// Makes the owner of `name` lose it, as if its file had been removed.
   void lose(std::string_view name);
-  /// Stops or resumes the delivery of messages to `name`; meanwhile they wait, up to 4 MiB.
+  /// Stops or resumes the delivery of messages to `name`; meanwhile they wait, up to 4 MiB, and
+  /// requests are not answered.
   void setStalled(std::string_view name, bool stalled);
 
  private:
@@ -51,7 +56,7 @@ class InMemoryPorts : public MessagePorts {
 
   [[nodiscard]] std::shared_ptr<Local> find(std::string_view name) const;
 
-  MainQueue& _queue;
+  VirtualMainQueue& _queue;
   Failures _failures;
   std::map<std::string, std::weak_ptr<Local>, std::less<>> _ports;
 };

@@ -57,7 +57,8 @@ void VirtualMainQueue::scheduleTick(std::chrono::nanoseconds due, std::weak_ptr<
     const std::shared_ptr<TimerState> timer = weak.lock();
     if (!timer) return;
     timer->handler();
-    scheduleTick(due + timer->interval, timer);
+    const auto next = due + timer->interval;
+    scheduleTick(next < _elapsed ? _elapsed + timer->interval : next, timer);
   });
 }
 

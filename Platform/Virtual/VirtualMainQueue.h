@@ -50,6 +50,10 @@ class VirtualMainQueue : public MainQueue {
   /// Lets `duration` pass, running everything that falls due on the way, at its time.
   void advance(std::chrono::nanoseconds duration);
 
+  /// Lets `duration` pass and runs nothing, as while the thread waits for something else; what
+  /// falls due meanwhile runs late.
+  void wait(std::chrono::nanoseconds duration) { moveTo(_elapsed + duration); }
+
   /// The virtual time since the queue was made.
   [[nodiscard]] std::chrono::nanoseconds elapsed() const noexcept { return _elapsed; }
   /// Blocks and timer ticks that wait.

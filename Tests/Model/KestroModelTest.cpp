@@ -6,6 +6,7 @@
 namespace kestro::testing {
 namespace {
 
+using ::testing::Contains;
 using ::testing::ElementsAre;
 using ::testing::HasSubstr;
 using ::testing::IsEmpty;
@@ -134,6 +135,29 @@ TEST_F(KestroModelTest, ReportsTheErrorOfTheTechnologyRequest) {
               ElementsAre(MatchesRegex(kCreatedPorts),
                           " ***** Could not send the GetTechnology command (got error=-2)",
                           "No log generator technology works"));
+}
+
+TEST_F(KestroModelTest, WaitsOneSecondForTheTechnologyAndNoLonger) {
+  platform.messagePorts().failures().replyDelay = 1s;
+  model->restartMonitor();
+  EXPECT_TRUE(model->isConnected());
+  EXPECT_EQ(queue().elapsed(), 1s);
+
+  platform.messagePorts().failures().replyDelay = 1s + 1ns;
+  model->restartMonitor();
+  EXPECT_THAT(errors(), Contains(" ***** Could not send the GetTechnology command (got error=-2)"));
+  EXPECT_EQ(queue().elapsed(), 2s);
+}
+
+TEST_F(KestroModelTest, WaitsOneSecondForItsCommandsToBeSent) {
+  platform.messagePorts().failures().request = {SendError::SendTimeout, {}};
+  model->restartMonitor();
+  EXPECT_EQ(queue().elapsed(), 1s);
+
+  platform.messagePorts().failures().send = SendError::SendTimeout;
+  model->restartMonitor();
+  EXPECT_THAT(errors(), Contains(" ***** Could not send the START command (got error=-1)"));
+  EXPECT_EQ(queue().elapsed(), 2s);
 }
 
 TEST_F(KestroModelTest, ReportsAReplyWithoutData) {

@@ -3,6 +3,7 @@
 #include <sys/wait.h>
 
 #include <algorithm>
+#include <array>
 #include <csignal>
 
 #include "Tests/Platform/Linux/PortFixture.h"
@@ -226,6 +227,65 @@ TEST_F(UnixRemotePortTest, WhatWasPostedElsewhereLeavesBeforeTheWait) {
   EXPECT_EQ(remote->post(1, bytesOf("now")), SendError::None);
   EXPECT_EQ(other->request(0, {}, 1s, 0ms).error, SendError::ReceiveTimeout);
   EXPECT_EQ(peer->receiveAvailable(), frame(1, 1, 0, "now"));
+}
+
+// Peers that never stop sending.
+
+/// Sends replies that nobody awaits from its end of a connection, until nobody reads them any more:
+/// faster than one can read, so that there is always more.
+class Flood {
+ public:
+  explicit Flood(RawPeer& peer) {
+    Bytes frames;  // few enough for one write to be whole
+    for (int i = 0; i < 1024; ++i) frames = joined({std::move(frames), frame(4, 0, 99, "")});
+    for (auto& thread : _threads) {
+      thread = std::thread([this, &peer, frames] {
+        while (!_stop) peer.send(frames);
+      });
+    }
+    std::this_thread::sleep_for(20ms);
+  }
+  ~Flood() {
+    _stop = true;
+    for (auto& thread : _threads) thread.join();
+  }
+  Flood(const Flood&) = delete;
+  Flood& operator=(const Flood&) = delete;
+
+ private:
+  std::atomic<bool> _stop = false;
+  std::array<std::thread, 2> _threads;
+};
+
+TEST_F(UnixRemotePortTest, AFloodOfOtherRepliesDoesNotHoldUpARequest) {
+  connectToPeer();
+  const Flood flood(*peer);
+  const auto begin = std::chrono::steady_clock::now();
+  for (int i = 0; i < 20; ++i) {
+    EXPECT_EQ(remote->request(0, {}, 1s, 10ms).error, SendError::ReceiveTimeout);
+  }
+  const auto elapsed = std::chrono::steady_clock::now() - begin;
+  EXPECT_GE(elapsed, 200ms);
+  EXPECT_LT(elapsed, 1s);
+  remote->invalidate();
+}
+
+TEST_F(UnixRemotePortTest, AFloodOfRepliesDoesNotHoldUpASendThatIsNotTaken) {
+  connectToPeer();
+  fillConnection();
+  const Flood flood(*peer);
+  const auto begin = std::chrono::steady_clock::now();
+  for (int i = 0; i < 20; ++i) EXPECT_EQ(remote->send(0, {}, 10ms), SendError::SendTimeout);
+  const auto elapsed = std::chrono::steady_clock::now() - begin;
+  EXPECT_GE(elapsed, 200ms);
+  EXPECT_LT(elapsed, 1s);
+  remote->invalidate();
+}
+
+TEST_F(UnixRemotePortTest, AReplyThatIsThereWhenTheTimeIsOverIsTaken) {
+  connectToPeer();
+  peer->send(frame(3, 0, 1, "in time"));
+  EXPECT_EQ(remote->request(0, {}, 1s, 0ms).data, bytesOf("in time"));
 }
 
 // Peers that stop reading.
