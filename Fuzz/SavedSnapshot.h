@@ -5,6 +5,7 @@
 #include "Fuzz/GeneratorChannel.h"
 #include "LogGenerator/Ondrel/Reframing.h"
 #include "Model/Snapshot.h"
+#include "Recordings/SnapshotFile.h"
 
 namespace kestro::fuzz {
 

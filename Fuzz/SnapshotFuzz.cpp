@@ -2,7 +2,7 @@
 // Bytes as a snapshot, and everything that is done with one: shown, its log exported, saved again.
 #include "CommandLine/Formats/SnapshotText.h"
 #include "Fuzz/SavedSnapshot.h"
-#include "Recordings/StorableValue.h"
+#include "Recordings/SnapshotFile.h"
 
 namespace kestro::fuzz {
 namespace {

@@ -8,9 +8,12 @@
 #include "LogGenerator/Ondrel/OndrelLogGenerator.h"
 #include "Platform/DeviceRoot.h"
 #include "Platform/SystemLog.h"
-#include "Recordings/StorableValue.h"
+#include "Recordings/SnapshotFile.h"
 
 namespace kestro {
+
+// The file's reader finds the log that the generators have stored.
+static_assert(kSnapshotDlf == kSaveContentsDlf);
 
 std::string snapshotPath(Moment moment) {
   const auto seconds = std::chrono::floor<std::chrono::seconds>(moment.time_since_epoch());
@@ -29,9 +32,7 @@ Dictionary Snapshot::dictionary(std::string_view description) const {
 }
 
 Result<Bytes> Snapshot::file(const PropertyListCoding& coding, std::string_view description) const {
-  auto xml = coding.xml(storableValue(dictionary(description)));
-  if (!xml) return failure("the snapshot cannot be serialised");
-  return *std::move(xml);
+  return snapshotFile(coding, dictionary(description));
 }
 
 bool Snapshot::save(Platform& platform, std::string_view description) const {
@@ -45,28 +46,6 @@ bool Snapshot::save(Platform& platform, std::string_view description) const {
 std::string entryDescription(const Value& entry) {
   const Dictionary dictionary = entry.dictionary();
   return std::string(dictionary[kHistoryDescription].text());
-}
-
-Result<Dictionary> parseSnapshot(const PropertyListCoding& coding, ByteView file) {
-  const auto root = coding.parse(file, PropertyListLimits::snapshotFile());
-  if (!root) return tl::unexpected(root.error());
-  if (!root->isDictionary()) {
-    return failure(
-        fmt::format("no snapshot: the list is no dictionary but of type {}", root->typeName()));
-  }
-  const Dictionary snapshot = root->dictionary();
-  if (!snapshot[kSnapshotTimestamp].isText()) {
-    return failure(fmt::format("no snapshot: it has no \"{}\"", kSnapshotTimestamp));
-  }
-  return snapshot;
-}
-
-Value dlfOfSnapshot(const Dictionary& snapshot) {
-  for (const Value& entry : snapshot[kSnapshotData].array()) {
-    Value dlf = entry.dictionary()[kSaveContentsDlf];
-    if (dlf.isData()) return dlf;
-  }
-  return {};
 }
 
 }  // namespace kestro

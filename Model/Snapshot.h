@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
-// Snapshots: the last displays with a description, as a file on the device.
+// Snapshots: the last displays with a description, and how the save screen makes a file of them on
+// the device.
 #pragma once
 
 #include <string>
@@ -17,11 +18,6 @@ namespace kestro {
 /// Where snapshots are saved on the device.
 inline constexpr std::string_view kSnapshotDirectory = "/var/mobile/Library/Logs/CrashReporter";
 
-/// Keys of the snapshot file's dictionary, in its order.
-inline constexpr std::string_view kSnapshotTimestamp = "Timestamp";
-inline constexpr std::string_view kSnapshotData = "Data";
-inline constexpr std::string_view kSnapshotDescription = "Description";
-
 /// The device path of a snapshot that is saved at this moment: the directory and
 /// "KestroSnapshot-N.kestro", N being whole seconds since 1970 UTC. Two in one second share it.
 [[nodiscard]] std::string snapshotPath(Moment moment);
@@ -37,12 +33,11 @@ class Snapshot {
   /// `entryDescription` says what to list them as.
   [[nodiscard]] Array entries() const noexcept { return _saveHistory.array(); }
 
-  /// The file's contents: timestamp, data and description. Without save contents it ends after the
+  /// What the file holds: timestamp, data and description. Without save contents it ends after the
   /// timestamp.
   [[nodiscard]] Dictionary dictionary(std::string_view description) const;
 
-  /// The file: the dictionary as an XML property list. What XML cannot hold in it is replaced, see
-  /// `storableValue`. It fails only for want of a serialisation.
+  /// The file of that dictionary, see `snapshotFile`.
   [[nodiscard]] Result<Bytes> file(const PropertyListCoding& coding,
                                    std::string_view description) const;
 
@@ -57,11 +52,5 @@ class Snapshot {
 
 /// The description of an entry of save contents; empty when it has none.
 [[nodiscard]] std::string entryDescription(const Value& entry);
-
-/// The dictionary of a snapshot file. Whatever else it holds, it has a timestamp.
-[[nodiscard]] Result<Dictionary> parseSnapshot(const PropertyListCoding& coding, ByteView file);
-
-/// The DLF log of a snapshot's dictionary, a data value; null when it has none.
-[[nodiscard]] Value dlfOfSnapshot(const Dictionary& snapshot);
 
 }  // namespace kestro

@@ -23,6 +23,7 @@
 #include "Model/Snapshot.h"
 #include "Platform/Linux/LinuxPlatform.h"
 #include "Recordings/PcapReader.h"
+#include "Recordings/SnapshotFile.h"
 
 namespace kestro {
 namespace {

@@ -10,9 +10,10 @@
 #include <vector>
 
 #include "CommandLine/Formats/DisplayFormats.h"
-#include "LogGenerator/Ondrel/OndrelLogGenerator.h"
+#include "LogGenerator/LogGenerator.h"
 #include "LogGenerator/Ondrel/Reframing.h"
 #include "Model/Snapshot.h"
+#include "Recordings/SnapshotFile.h"
 
 namespace kestro {
 namespace {
@@ -33,7 +34,7 @@ std::string leafText(const Value& value) {
   return value.isText() ? std::string(value.text()) : "(unknown)";
 }
 
-bool isDlf(const Value& entry) { return entry.dictionary()[kSaveContentsDlf].isData(); }
+bool isDlf(const Value& entry) { return entry.dictionary()[kSnapshotDlf].isData(); }
 
 /// How many packets were collected, as far as their bytes tell.
 std::string packetsText(ByteView collected) {

@@ -1,0 +1,35 @@
+// SPDX-License-Identifier: MIT
+// The file form of a snapshot: an XML property list that holds one dictionary. Its fields are
+// described in Documentation/snapshots.md.
+#pragma once
+
+#include <string_view>
+
+#include "Platform/Bytes.h"
+#include "Platform/PropertyList.h"
+#include "Platform/PropertyListCoding.h"
+#include "Platform/Result.h"
+
+namespace kestro {
+
+/// Keys of the file's dictionary, in its order.
+inline constexpr std::string_view kSnapshotTimestamp = "Timestamp";
+inline constexpr std::string_view kSnapshotData = "Data";
+inline constexpr std::string_view kSnapshotDescription = "Description";
+
+/// Key of the DLF log in that element of the data that holds it.
+inline constexpr std::string_view kSnapshotDlf = "DLF";
+
+/// The file of a snapshot's dictionary. What XML cannot hold in it is replaced, see
+/// `storableValue`. It fails only for want of a serialisation.
+[[nodiscard]] Result<Bytes> snapshotFile(const PropertyListCoding& coding,
+                                         const Dictionary& snapshot);
+
+/// The dictionary of a snapshot file. Whatever else it holds, it has a timestamp, a text. Files
+/// beyond `PropertyListLimits::snapshotFile` are refused.
+[[nodiscard]] Result<Dictionary> parseSnapshot(const PropertyListCoding& coding, ByteView file);
+
+/// The DLF log of a snapshot's dictionary, a data value; null when it has none.
+[[nodiscard]] Value dlfOfSnapshot(const Dictionary& snapshot);
+
+}  // namespace kestro
