@@ -138,9 +138,9 @@ def measurement_report(rsrp, rsrq, neighbours):
 
 def gsmtap(arfcn, payload):
     """A GSMTAP version 2 frame with LTE RRC of the uplink's dedicated channel, in UDP over IPv4."""
-    kLteRrc, kUplinkDedicated, port = 0x0D, 3, 4729
-    frame = struct.pack(">BBBBHbbIBBBB", 2, 4, kLteRrc, 0, arfcn | 0x4000, 0, 0, 0,
-                        kUplinkDedicated, 0, 0, 0) + payload
+    lte_rrc, uplink_dedicated, port = 0x0D, 3, 4729
+    frame = struct.pack(">BBBBHbbIBBBB", 2, 4, lte_rrc, 0, arfcn | 0x4000, 0, 0, 0,
+                        uplink_dedicated, 0, 0, 0) + payload
     udp = struct.pack(">HHHH", port, port, 8 + len(frame), 0) + frame
     ip = struct.pack(">BBHHHBBH4s4s", 0x45, 0, 20 + len(udp), 0, 0, 64, 17, 0,
                      bytes([127, 0, 0, 1]), bytes([127, 0, 0, 1]))

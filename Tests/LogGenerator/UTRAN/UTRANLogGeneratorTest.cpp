@@ -114,7 +114,7 @@ TEST_F(UTRANLogGeneratorTest, TakesTheFirstOfSeveralTemplates) {
 }
 
 TEST_F(UTRANLogGeneratorTest, LooksForTheWordInTheWholePath) {
-  setTemplate("Utran/Display.plist");
+  setTemplate("UTRAN/Display.plist");
   setTemplate("Display.plist", Dictionary{{"Found", "yes"}});
   make();
   generator->getDisplayFromState(state);
