@@ -40,7 +40,7 @@ inline constexpr std::string_view kExtraPacketsFamily = "Extra Packets";
 [[nodiscard]] std::vector<ListedCode> listCodes(const LogGenerator& generator);
 
 /// The codes of a technology that a generator speaks. A code belongs to the group of the first
-/// section that shows something of it.
+/// section that takes a key from it.
 [[nodiscard]] TechnologyCodes codesOfTechnology(Platform& platform, std::string_view technology);
 
 }  // namespace kestro

@@ -26,12 +26,12 @@ std::string_view nameOf(const ListedCode& code) {
 class WrappedWords {
  public:
   WrappedWords(std::string& output, std::string_view indentation)
-      : _output(output), _indentation(indentation), _column(kLineWidth) {}
+      : _output(output), _indentation(indentation) {}
 
   void append(std::string_view word) {
-    const bool isFirst = _column == kLineWidth;
+    const bool isFirst = _column == 0;
     if (!isFirst) _output += ',';
-    if (_column + 2 + word.size() > kLineWidth) {
+    if (isFirst || _column + 2 + word.size() > kLineWidth) {
       if (!isFirst) _output += '\n';
       _output += _indentation;
       _column = _indentation.size();
@@ -47,17 +47,34 @@ class WrappedWords {
  private:
   std::string& _output;
   std::string_view _indentation;
-  std::size_t _column;
+  std::size_t _column = 0;
 };
 
-void appendKeys(std::string& output, const CatalogueEntry& entry) {
-  if (entry.keys.empty()) return;
+bool isTakenOut(const CatalogueKey& key) {
+  return key.fields.size() == 1 && key.fields[0]->text.kind == TextRule::Kind::Removed;
+}
+
+std::string nameOf(const CatalogueKey& key) {
+  return fmt::format("{}{}", key.key, isTakenOut(key) ? " (taken out)" : "");
+}
+
+/// What the first key of a list has in front; empty: nothing.
+std::string_view labelOf(const CatalogueKey& key) { return key.isKept ? "kept" : key.list; }
+
+/// Keys in lines of their own, after the label, if any, of what they belong to.
+void appendKeys(std::string& output, std::span<const CatalogueKey> keys, std::string_view first) {
+  if (keys.empty()) return;
   WrappedWords words(output, "      ");
-  std::string_view list;
-  for (const CatalogueKey& key : entry.keys) {
-    const bool isNewList = key.list != list && !key.list.empty();
-    words.append(isNewList ? fmt::format("{}: {}", key.list, key.key) : std::string(key.key));
-    list = key.list;
+  std::string_view label;
+  for (const CatalogueKey& key : keys) {
+    if (key.key.empty()) {
+      words.append(key.list);  // plain texts
+      continue;
+    }
+    const std::string_view own = first.empty() ? labelOf(key) : first;
+    const bool isNew = own != label && !own.empty();
+    words.append(isNew ? fmt::format("{}: {}", own, nameOf(key)) : nameOf(key));
+    label = own;
   }
   words.end();
 }
@@ -69,7 +86,8 @@ void appendCode(std::string& output, const ListedCode& code) {
   output += '\n';
   for (const CatalogueEntry& entry : code.entries) {
     fmt::format_to(end, "    {}\n", entry.section);
-    appendKeys(output, entry);
+    appendKeys(output, entry.keys, "");
+    appendKeys(output, entry.shorterKeys, "from a shorter packet");
   }
 }
 
@@ -98,22 +116,31 @@ void writeText(JsonWriter& writer, std::string_view key, std::string_view text) 
   writer.text(text);
 }
 
-void writeEntry(JsonWriter& writer, const CatalogueEntry& entry) {
-  writer.beginObject();
-  writeText(writer, "section", entry.section);
-  writeText(writer, "group", nameInSortedDictionary(entry.group));
-  writeText(writer, "kind", entry.kind == SectionKind::List ? "list" : "dictionary");
-  writer.key("keys");
+void writeKeys(JsonWriter& writer, std::string_view name, std::span<const CatalogueKey> keys) {
+  writer.key(name);
   writer.beginArray();
-  for (const CatalogueKey& key : entry.keys) {
+  for (const CatalogueKey& key : keys) {
     writer.beginObject();
     if (!key.list.empty()) writeText(writer, "list", key.list);
     writeText(writer, "key", key.key);
     writeText(writer, "from", sourcesText(key));
     writeText(writer, "shown", shownText(key));
+    if (key.isKept) {
+      writer.key("kept");
+      writer.boolean(true);
+    }
     writer.endObject();
   }
   writer.endArray();
+}
+
+void writeEntry(JsonWriter& writer, const CatalogueEntry& entry) {
+  writer.beginObject();
+  writeText(writer, "section", entry.section);
+  writeText(writer, "group", nameInSortedDictionary(entry.group));
+  writeText(writer, "kind", entry.kind == SectionKind::List ? "list" : "dictionary");
+  writeKeys(writer, "keys", entry.keys);
+  if (!entry.shorterKeys.empty()) writeKeys(writer, "shorterKeys", entry.shorterKeys);
   writer.endObject();
 }
 

@@ -4,6 +4,7 @@
 #include <fmt/format.h>
 #include <fmt/ranges.h>
 
+#include <algorithm>
 #include <vector>
 
 namespace kestro {
@@ -32,14 +33,20 @@ std::string formattedText(const std::string& formula, const NumberFormat& format
   return formula.empty() ? number : formula + " as " + number;
 }
 
+/// "0: Idle; 3: Busy"
 std::string namesText(const TextRule& rule) {
   std::vector<std::string> names;
   for (const NamedValue& name : rule.names) {
     names.push_back(fmt::format("{}: {}", name.value, name.text));
   }
-  names.push_back("else " + (rule.otherName.empty() ? numberFormatText(rule.format)
-                                                    : std::string(rule.otherName)));
   return fmt::format("{}", fmt::join(names, "; "));
+}
+
+/// "0: Idle; 3: Busy; else Unknown"
+std::string namesOrOtherText(const TextRule& rule) {
+  const std::string other =
+      rule.otherName.empty() ? numberFormatText(rule.format) : std::string(rule.otherName);
+  return rule.names.empty() ? other : namesText(rule) + "; else " + other;
 }
 
 std::string kindText(const TextRule& rule) {
@@ -51,13 +58,13 @@ std::string kindText(const TextRule& rule) {
     case TextRule::Kind::Scaled:
       return formattedText(formulaText(rule.scale, rule.offset), rule.format);
     case TextRule::Kind::Named:
-      return namesText(rule);
+      return namesOrOtherText(rule);
     case TextRule::Kind::Computed:
       return "computed";
     case TextRule::Kind::Each:
       return "a list of all, each %d";
     case TextRule::Kind::Removed:
-      return "removed";
+      return "taken out of the section";
     case TextRule::Kind::Supplied:
       return "known from another packet";
   }
@@ -72,8 +79,28 @@ std::string conditionText(const Condition& condition, bool inRecord) {
   return fmt::format("({}) is {} to {}", place, condition.lowest, condition.highest);
 }
 
+bool hasName(const TextRule& rule, std::int64_t value) {
+  return std::ranges::find(rule.names, value, &NamedValue::value) != rule.names.end();
+}
+
+/// Whether the field is the text of a name, and each value that can come to it has one. Looked at
+/// are small unsigned places only.
+bool namesEveryValue(const Field& field) {
+  const Place& place = field.places[0];
+  if (field.text.kind != TextRule::Kind::Named || field.placeCount != 1) return false;
+  if (place.isSigned || place.bitCount > 8) return false;
+  const bool isOwnCondition = !field.condition.isAlways() && field.condition.place == place;
+  const std::int64_t lowest = isOwnCondition ? field.condition.lowest : 0;
+  const std::int64_t highest =
+      isOwnCondition ? field.condition.highest : (std::int64_t{1} << place.bitCount) - 1;
+  for (std::int64_t value = lowest; value <= highest; ++value) {
+    if (!hasName(field.text, value)) return false;
+  }
+  return true;
+}
+
 std::string fieldText(const Field& field, bool inRecord) {
-  std::string text = ruleText(field.text);
+  std::string text = namesEveryValue(field) ? namesText(field.text) : ruleText(field.text);
   if (field.condition.isAlways()) return text;
   text += " when " + conditionText(field.condition, inRecord);
   if (!field.otherwise.empty()) text += fmt::format(", else {}", field.otherwise);
@@ -87,12 +114,13 @@ std::string originText(unsigned base, unsigned perCount, const Place& counted, u
   return text + fmt::format(", {} {} each", stride, stride == 1 ? "byte" : "bytes");
 }
 
-std::vector<std::string_view> technologiesOf(const CellKind& kind) {
+/// "Serving of GSM or UMTS"
+std::string cellKindText(const CellKind& kind) {
   std::vector<std::string_view> technologies;
   for (const std::string_view technology : kind.technologies) {
     if (!technology.empty()) technologies.push_back(technology);
   }
-  return technologies;
+  return fmt::format("{} of {}", kind.type, fmt::join(technologies, " or "));
 }
 
 }  // namespace
@@ -153,18 +181,18 @@ std::string tableText(const RecordTable& table) {
   return text;
 }
 
-std::string partText(const PropertyListReading& reading) {
+std::string partText(const PropertyListReading& reading, SectionKind kind) {
   switch (reading.part) {
     case ListedPart::Root:
       return "from the property list's dictionary";
     case ListedPart::Elements:
       return "the property list's array as it is";
     case ListedPart::FirstCell:
-      return fmt::format("from the first {} of {}", reading.cells.type,
-                         fmt::join(technologiesOf(reading.cells), " or "));
+      return "from the first " + cellKindText(reading.cells);
     case ListedPart::EachCell:
-      return fmt::format("from every {} of {}", reading.cells.type,
-                         fmt::join(technologiesOf(reading.cells), " or "));
+      if (kind == SectionKind::Dictionary) return "from every " + cellKindText(reading.cells);
+      return fmt::format("a row for every {}; without one the list is empty",
+                         cellKindText(reading.cells));
   }
   return "";
 }

@@ -19,18 +19,19 @@ namespace kestro {
 [[nodiscard]] std::string ruleText(const TextRule& rule);
 
 /// Every place that a key is read from; for the value of a property list its key there. Empty for
-/// what a decoder works out itself.
+/// what a decoder works out itself, and for a key that is taken out of the section.
 [[nodiscard]] std::string sourcesText(const CatalogueKey& key);
 
-/// How a key is shown, with the conditions that choose between its fields. Empty for a key without
-/// a field.
+/// How a key is shown, with the conditions that choose between its fields. A table of names has no
+/// "else" where the packet can hold none but the values with names. Empty for a key without a
+/// field.
 [[nodiscard]] std::string shownText(const CatalogueKey& key);
 
 /// Which records make rows, and where they lie: "one for each cell; count: u8 at 15; from byte 16,
 /// 15 bytes each".
 [[nodiscard]] std::string tableText(const RecordTable& table);
 
-/// Which part of its property list a section shows.
-[[nodiscard]] std::string partText(const PropertyListReading& reading);
+/// Which part of its property list a section of this kind shows.
+[[nodiscard]] std::string partText(const PropertyListReading& reading, SectionKind kind);
 
 }  // namespace kestro

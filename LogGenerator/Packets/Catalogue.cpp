@@ -7,8 +7,25 @@
 namespace kestro {
 namespace {
 
-bool isShown(const Field& field) {
-  return field.text.kind != TextRule::Kind::Hidden && field.text.kind != TextRule::Kind::Removed;
+bool isListed(const Field& field) { return field.text.kind != TextRule::Kind::Hidden; }
+
+/// The keys of a list's rows; none when no record makes a row.
+std::vector<CatalogueKey> keysOfRows(const ListReading& list) {
+  if (list.table.keepsNone || list.use == RowsUse::Dropped) return {};
+  std::vector<CatalogueKey> keys = catalogueFields(list.table.fields, list.key, &list.table);
+  for (CatalogueKey& key : keys) {
+    key.isKept = list.use == RowsUse::Noted;
+    if (list.isPlain) key.key = {};
+  }
+  return keys;
+}
+
+std::vector<CatalogueKey> keysOfReading(const PacketReading& reading) {
+  std::vector<CatalogueKey> keys = catalogueFields(reading.fields);
+  for (const ListReading& list : reading.lists) {
+    std::ranges::copy(keysOfRows(list), std::back_inserter(keys));
+  }
+  return keys;
 }
 
 }  // namespace
@@ -16,7 +33,7 @@ bool isShown(const Field& field) {
 CatalogueKey catalogueKey(std::string_view name, std::span<const Field> fields) {
   CatalogueKey key{.key = name};
   for (const Field& field : fields) {
-    if (field.key == name && isShown(field)) key.fields.push_back(&field);
+    if (field.key == name && isListed(field)) key.fields.push_back(&field);
   }
   return key;
 }
@@ -26,7 +43,7 @@ std::vector<CatalogueKey> catalogueFields(std::span<const Field> fields, std::st
   std::vector<CatalogueKey> keys;
   for (const Field& field : fields) {
     const bool isKnown = std::ranges::find(keys, field.key, &CatalogueKey::key) != keys.end();
-    if (isKnown || !isShown(field)) continue;
+    if (isKnown || !isListed(field)) continue;
     CatalogueKey& key = keys.emplace_back(catalogueKey(field.key, fields));
     key.list = list;
     key.table = table;
@@ -40,12 +57,10 @@ CatalogueEntry catalogueReading(const Section& section, const PacketReading& rea
                        .minimumLength = reading.minimumLength,
                        .section = section.name,
                        .kind = section.kind,
-                       .keys = catalogueFields(reading.fields)};
-  for (const ListReading& list : reading.lists) {
-    if (list.use == RowsUse::Noted) entry.isNoted = true;
-    if (list.table.keepsNone || list.use != RowsUse::Shown) continue;
-    std::ranges::copy(catalogueFields(list.table.fields, list.key, &list.table),
-                      std::back_inserter(entry.keys));
+                       .keys = keysOfReading(reading)};
+  for (const PacketReading& other : section.readings) {
+    const bool isShorter = other.minimumLength < reading.minimumLength;
+    if (other.code == reading.code && isShorter) entry.shorterKeys = keysOfReading(other);
   }
   return entry;
 }
@@ -54,7 +69,6 @@ CatalogueEntry cataloguePropertyList(const Section& section) {
   const PropertyListReading& reading = *section.propertyList;
   CatalogueEntry entry{.code = reading.code,
                        .packetName = reading.packetName,
-                       .minimumLength = kPacketHeaderSize,
                        .section = section.name,
                        .kind = section.kind,
                        .propertyList = &reading};

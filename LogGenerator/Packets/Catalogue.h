@@ -11,29 +11,31 @@
 
 namespace kestro {
 
-/// One key that a packet may write.
+/// One key that a packet may write, or take out of the section (by a field that is `removed()`).
 struct CatalogueKey {
   std::string_view list{};  ///< the key of the list that the rows stand under; empty: the section
-  std::string_view key;
+  std::string_view key;     ///< empty in a list of plain texts, which have no keys
   /// The fields that write it, several where conditions choose between them; none for a key that no
   /// field of a layout writes. They are constants, like what the pointers below point at.
   std::vector<const Field*> fields{};
   const RecordTable* table = nullptr;   ///< whose records the fields lie in; null: the packet
   const ListedValue* listed = nullptr;  ///< the value of a property list; null: none
+  /// Whether the decoder keeps the value for the rows that other packets make: it is not shown.
+  bool isKept = false;
 };
 
 /// What one section takes from one log code.
 struct CatalogueEntry {
   LogCode code = 0;
   std::string_view packetName{};  ///< empty when nobody knows what the packet contains
+  /// In bytes. A shorter packet writes `shorterKeys` and nothing else. 0 when any length will do.
   std::size_t minimumLength = 0;
   std::string_view section{};
   SectionKind kind = SectionKind::Dictionary;
-  std::vector<CatalogueKey> keys{};  ///< in the layout's order, each once
+  std::vector<CatalogueKey> keys{};         ///< in the layout's order, each once
+  std::vector<CatalogueKey> shorterKeys{};  ///< mostly none
   /// The property list that the section is filled from; null: another kind of packet.
   const PropertyListReading* propertyList = nullptr;
-  /// Whether the section keeps what the packet says, for what it shows of other packets.
-  bool isNoted = false;
   /// The display's outermost group that the section stands in, under the template's own key
   /// ("01;Network"); empty: none. Valid as long as the generator.
   std::string_view group{};
@@ -41,15 +43,17 @@ struct CatalogueEntry {
 
 using CatalogueVisitor = std::function<void(const CatalogueEntry& entry)>;
 
-/// The key `name` with the shown fields that write it.
+/// The key `name` with the fields that write it, hidden ones apart.
 [[nodiscard]] CatalogueKey catalogueKey(std::string_view name, std::span<const Field> fields);
 
-/// The keys of the shown fields, each once: the packet's own, or the rows of a table's records.
+/// The keys of the fields, each once, hidden ones apart: the packet's own, or the rows of a table's
+/// records.
 [[nodiscard]] std::vector<CatalogueKey> catalogueFields(std::span<const Field> fields,
                                                         std::string_view list = {},
                                                         const RecordTable* table = nullptr);
 
-/// The entry of one reading; keys that it takes out of the section are left out.
+/// The entry of one of the section's readings, the first of its code. A reading of the same code
+/// for shorter packets gives its `shorterKeys`.
 [[nodiscard]] CatalogueEntry catalogueReading(const Section& section, const PacketReading& reading);
 
 /// The entry of the section's property list, which it must have.

@@ -67,6 +67,38 @@ TEST(CodesTable, HasCodeNameLengthSectionsAndKeys) {
             "    Other\n");
 }
 
+constexpr Field kOddFields[] = {{"Old Channel", removed()}, {"State", u8(14), decimal()}};
+constexpr Field kShorterFields[] = {{"State", u8(14), named({}, "Unknown")}};
+
+/// A key that is taken out, a list of plain texts, rows that are kept, and a key of short packets.
+std::vector<TechnologyCodes> oddSample() {
+  CatalogueEntry entry{.code = 0x1234,
+                       .packetName = "Odd",
+                       .minimumLength = 16,
+                       .section = "Serving",
+                       .keys = catalogueFields(kOddFields),
+                       .shorterKeys = catalogueFields(kShorterFields)};
+  static constexpr RecordTable kFrequencies = kCells;
+  static constexpr RecordTable kEntries = kCells;
+  entry.keys.push_back(catalogueFields(kCell, "Channels", &kFrequencies)[0]);
+  entry.keys.back().key = {};
+  entry.keys.push_back(catalogueFields(kCell, "", &kEntries)[0]);
+  entry.keys.back().isKept = true;
+  std::vector<TechnologyCodes> technologies(1);
+  technologies[0].technology = "LTE";
+  technologies[0].families = {{"01;Radio", "Radio", {{0x1234, "Odd", 16, {entry}}}}};
+  return technologies;
+}
+
+TEST(CodesTable, SaysWhatIsNotSimplyShown) {
+  EXPECT_EQ(text("table", oddSample()),
+            "LTE: Radio\n"
+            "  0x1234    Odd, from 16 bytes\n"
+            "    Serving\n"
+            "      Old Channel (taken out), State, Channels, kept: Level\n"
+            "      from a shorter packet: State\n");
+}
+
 TEST(CodesTable, BreaksLongListsOfKeys) {
   std::vector<TechnologyCodes> technologies = sample();
   auto& keys = technologies[1].families[0].codes[0].entries[0].keys;
@@ -75,6 +107,20 @@ TEST(CodesTable, BreaksLongListsOfKeys) {
   EXPECT_THAT(table, HasSubstr("      a key of thirty-six characters in all, "
                                "a key of thirty-six characters in all,\n"
                                "      a key of thirty-six characters in all\n"));
+}
+
+TEST(CodesTable, BreaksALineThatIsExactlyFull) {
+  std::vector<TechnologyCodes> technologies = sample();
+  auto& keys = technologies[1].families[0].codes[0].entries[0].keys;
+  // Six blanks, the keys, and a comma and a blank between them.
+  keys = {{.key = "a key of forty-seven characters, with its blanks"},
+          {.key = "another key, of forty-five characters in all"},
+          {.key = "the next"}};
+  ASSERT_EQ(keys[0].key.size() + 2 + keys[1].key.size(), 94U);
+  EXPECT_THAT(text("table", technologies),
+              HasSubstr("      a key of forty-seven characters, with its blanks, "
+                        "another key, of forty-five characters in all,\n"
+                        "      the next\n"));
 }
 
 TEST(CodesJson, HasEverything) {
@@ -93,6 +139,49 @@ TEST(CodesJson, HasEverything) {
   EXPECT_EQ(section["keys"][2].dump(),
             R"({"from":"s8 at +0","key":"Level","list":"Cells","shown":"%d"})");
   EXPECT_EQ(code["sections"][1]["kind"], "list");
+}
+
+TEST(CodesJson, SaysWhatIsNotSimplyShown) {
+  const auto json = nlohmann::json::parse(text("json", oddSample()));
+  const auto& section = json[0]["codes"][0]["sections"][0];
+  EXPECT_EQ(section["keys"][0].dump(),
+            R"({"from":"","key":"Old Channel","shown":"taken out of the section"})");
+  EXPECT_EQ(section["keys"][2].dump(),
+            R"({"from":"s8 at +0","key":"","list":"Channels","shown":"%d"})");
+  EXPECT_EQ(section["keys"][3].dump(),
+            R"({"from":"s8 at +0","kept":true,"key":"Level","shown":"%d"})");
+  EXPECT_EQ(section["shorterKeys"].dump(),
+            R"([{"from":"u8 at 14","key":"State","shown":"Unknown"}])");
+}
+
+TEST(CodesMarkdown, SaysWhatIsNotSimplyShown) {
+  EXPECT_THAT(
+      text("markdown", oddSample()),
+      HasSubstr("**Serving**\n"
+                "\n"
+                "| Key | From | Shown as |\n"
+                "|---|---|---|\n"
+                "| Old Channel |  | taken out of the section |\n"
+                "| State | u8 at 14 | %d |\n"
+                "\n"
+                "Channels: texts, one for each cell; count: u8 at 15; from byte 16, 1 byte each.\n"
+                "\n"
+                "| Key | From | Shown as |\n"
+                "|---|---|---|\n"
+                "| (no key) | s8 at +0 | %d |\n"
+                "\n"
+                "Not shown, but kept for the rows that other packets make, one for each cell; "
+                "count: u8 at 15; from byte 16, 1 byte each.\n"
+                "\n"
+                "| Key | From | Shown as |\n"
+                "|---|---|---|\n"
+                "| Level | s8 at +0 | %d |\n"
+                "\n"
+                "From a shorter packet:\n"
+                "\n"
+                "| Key | From | Shown as |\n"
+                "|---|---|---|\n"
+                "| State | u8 at 14 | Unknown |\n"));
 }
 
 TEST(CodesMarkdown, HasAnOverviewAndEveryKey) {

@@ -43,6 +43,7 @@ constexpr NamedValue kNames[] = {{0, "Idle"}, {3, "Busy"}};
 
 TEST(RuleText, ListsTheTextsOfATable) {
   EXPECT_EQ(ruleText(named(kNames, "Unknown")), "0: Idle; 3: Busy; else Unknown");
+  EXPECT_EQ(ruleText(named({}, "Unknown")), "Unknown");
   EXPECT_EQ(ruleText(namedElse(kNames, "[Reserved %d]")), "0: Idle; 3: Busy; else [Reserved %d]");
 }
 
@@ -57,6 +58,7 @@ TEST(RuleText, SaysWhatNoFormulaCan) {
   EXPECT_EQ(ruleText(eachDecimal()), "a list of all, each %d");
   EXPECT_EQ(ruleText(supplied()), "known from another packet");
   EXPECT_EQ(ruleText(hidden()), "as it is");
+  EXPECT_EQ(ruleText(removed()), "taken out of the section");
 }
 
 constexpr Field kLevels[] = {
@@ -75,6 +77,32 @@ TEST(KeyText, HasEveryPlaceAndEveryCondition) {
             "%d dBm when (u8 at +1, bits 0-3) is 1, else N/A; or "
             "%d dB when (u8 at +1, bits 0-3) is 2 to 4");
   EXPECT_EQ(sourcesText(keys[1]), "u8 at +5; u8 at +6");
+}
+
+constexpr NamedValue kThreeNames[] = {{0, "A"}, {1, "B"}, {2, "C"}};
+constexpr NamedValue kFourNames[] = {{0, "A"}, {1, "B"}, {2, "C"}, {3, "D"}};
+constexpr NamedValue kTwoNames[] = {{0, "A"}, {1, "B"}};
+constexpr Place kTwoBits = u8(3).bits(5, 6);
+
+std::string shownTextOf(const Field& field) {
+  return shownText({.key = field.key, .fields = {&field}});
+}
+
+TEST(KeyText, HasNoElseWhereEveryValueHasAName) {
+  EXPECT_EQ(shownTextOf({"S", kTwoBits, named(kFourNames, "X")}), "0: A; 1: B; 2: C; 3: D");
+  EXPECT_EQ(shownTextOf({"S", u8(3).bit(7), named(kTwoNames, "X")}), "0: A; 1: B");
+  EXPECT_EQ(shownTextOf(Field("S", kTwoBits, named(kThreeNames, "")).when(between(kTwoBits, 0, 2))),
+            "0: A; 1: B; 2: C when (u8 at 3, bits 5-6) is 0 to 2");
+}
+
+TEST(KeyText, HasAnElseWhereAValueHasNoName) {
+  EXPECT_EQ(shownTextOf({"S", kTwoBits, named(kThreeNames, "X")}), "0: A; 1: B; 2: C; else X");
+  EXPECT_EQ(
+      shownTextOf(Field("S", kTwoBits, named(kThreeNames, "X")).when(between(kTwoBits, 1, 3))),
+      "0: A; 1: B; 2: C; else X when (u8 at 3, bits 5-6) is 1 to 3");
+  EXPECT_EQ(shownTextOf(Field("S", kTwoBits, named(kThreeNames, "X")).when(between(u8(9), 0, 2))),
+            "0: A; 1: B; 2: C; else X when (u8 at 9) is 0 to 2");
+  EXPECT_EQ(shownTextOf({"S", s8(3).bit(0), named(kTwoNames, "X")}), "0: A; 1: B; else X");
 }
 
 TEST(KeyText, NamesTheKeyOfAPropertyList) {
@@ -117,10 +145,12 @@ TEST(PartText, NamesTheCells) {
                                  .packetName = "list",
                                  .part = ListedPart::FirstCell,
                                  .cells = {.technologies = {"A", "B"}, .type = "Serving"}};
-  EXPECT_EQ(partText(reading), "from the first Serving of A or B");
+  EXPECT_EQ(partText(reading, SectionKind::Dictionary), "from the first Serving of A or B");
   reading.part = ListedPart::EachCell;
   reading.cells.technologies = {"A"};
-  EXPECT_EQ(partText(reading), "from every Serving of A");
+  EXPECT_EQ(partText(reading, SectionKind::Dictionary), "from every Serving of A");
+  EXPECT_EQ(partText(reading, SectionKind::List),
+            "a row for every Serving of A; without one the list is empty");
 }
 
 }  // namespace

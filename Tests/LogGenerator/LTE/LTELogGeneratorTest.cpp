@@ -222,7 +222,7 @@ TEST_F(LTELogGeneratorTest, CataloguesEveryCodeOfEverySection) {
     entries.push_back(fmt::format("{:X} {} {}", entry.code, entry.section, entry.keys.size()));
   });
   EXPECT_THAT(entries,
-              ElementsAre("B0C2 Serving Cell Info 8", "B0C1 Serving Cell Info 1",
+              ElementsAre("B0C2 Serving Cell Info 9", "B0C1 Serving Cell Info 1",
                           "FF0001 Serving Cell Info 5",
                           "B179 Connected mode LTE Intra-frequency Measurement 5",
                           "B179 Measured Neighbor Cells 3", "B179 Detected Cells 1",

@@ -233,7 +233,7 @@ TEST_F(CellListTest, IsCataloguedWithoutAPacket) {
   const CatalogueEntry entry = decoder.catalogueCode(kCellMonitorCode);
   EXPECT_EQ(entry.code, 0xFF0001U);
   EXPECT_EQ(entry.packetName, "Cell-monitor list");
-  EXPECT_EQ(entry.minimumLength, 13U);
+  EXPECT_EQ(entry.minimumLength, 0U);
   EXPECT_EQ(entry.kind, SectionKind::List);
   std::vector<std::string_view> keys;
   for (const CatalogueKey& key : entry.keys) keys.push_back(key.key);

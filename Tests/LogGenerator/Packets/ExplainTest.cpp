@@ -11,6 +11,7 @@
 namespace kestro {
 namespace {
 
+using ::testing::Each;
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 
@@ -138,7 +139,7 @@ TEST_F(ExplainTest, SaysNothingOfAPacketThatIsTooShort) {
   EXPECT_THAT(values, IsEmpty());
 }
 
-TEST(CatalogueTest, ListsShownKeysOnce) {
+TEST(CatalogueTest, ListsKeysOnceAndHiddenOnesNever) {
   const CatalogueEntry entry = catalogueReading(kSection, kReadings[0]);
   EXPECT_EQ(entry.code, 0x1234U);
   EXPECT_EQ(entry.packetName, "test packet");
@@ -146,16 +147,17 @@ TEST(CatalogueTest, ListsShownKeysOnce) {
   EXPECT_EQ(entry.section, "Test");
   std::vector<std::string_view> keys;
   for (const CatalogueKey& key : entry.keys) keys.push_back(key.key);
-  EXPECT_THAT(keys, ElementsAre("Sum", "Area", "ID", "Odd"));
-  EXPECT_FALSE(entry.isNoted);
+  EXPECT_THAT(keys, ElementsAre("Sum", "Gone", "Area", "ID", "Odd"));
+  EXPECT_THAT(entry.keys, Each(::testing::Field(&CatalogueKey::isKept, false)));
+  EXPECT_THAT(entry.shorterKeys, IsEmpty());
 }
 
 TEST(CatalogueTest, SaysWhereEachKeyComesFrom) {
   const CatalogueEntry entry = catalogueReading(kSection, kReadings[0]);
-  EXPECT_THAT(entry.keys[1].fields, ElementsAre(&kExplainedFields[3]));
-  EXPECT_EQ(entry.keys[1].table, nullptr);
-  EXPECT_THAT(entry.keys[2].fields, ElementsAre(&kRecordFields[0]));
-  EXPECT_EQ(entry.keys[2].table, &kLists[0].table);
+  EXPECT_THAT(entry.keys[2].fields, ElementsAre(&kExplainedFields[3]));
+  EXPECT_EQ(entry.keys[2].table, nullptr);
+  EXPECT_THAT(entry.keys[3].fields, ElementsAre(&kRecordFields[0]));
+  EXPECT_EQ(entry.keys[3].table, &kLists[0].table);
 }
 
 constexpr Field kChoice[] = {
@@ -174,10 +176,42 @@ TEST(CatalogueTest, HasEveryFieldThatConditionsChooseBetween) {
 constexpr ListReading kNotedLists[] = {{.table = kLists[0].table, .use = RowsUse::Noted}};
 constexpr PacketReading kNotedReading = {0x1234, "test packet", 16, {}, kNotedLists};
 
-TEST(CatalogueTest, ShowsNoKeysOfRowsThatAreOnlyNoted) {
+TEST(CatalogueTest, ListsRowsThatAreOnlyNotedAsKept) {
   const CatalogueEntry entry = catalogueReading(kSection, kNotedReading);
-  EXPECT_THAT(entry.keys, IsEmpty());
-  EXPECT_TRUE(entry.isNoted);
+  EXPECT_THAT(entry.keys, ElementsAre(::testing::Field(&CatalogueKey::key, "ID"),
+                                      ::testing::Field(&CatalogueKey::key, "Odd")));
+  EXPECT_THAT(entry.keys, Each(::testing::Field(&CatalogueKey::isKept, true)));
+}
+
+constexpr ListReading kDroppedLists[] = {{.table = kLists[0].table, .use = RowsUse::Dropped}};
+constexpr PacketReading kDroppedReading = {0x1234, "test packet", 16, {}, kDroppedLists};
+
+TEST(CatalogueTest, ListsNoKeysOfRowsThatAreDropped) {
+  EXPECT_THAT(catalogueReading(kSection, kDroppedReading).keys, IsEmpty());
+}
+
+constexpr ListReading kPlainLists[] = {
+    {.table = kLists[0].table, .key = "Frequencies", .isPlain = true}};
+constexpr PacketReading kPlainReading = {0x1234, "test packet", 16, {}, kPlainLists};
+
+TEST(CatalogueTest, PlainTextsHaveAListAndNoKeys) {
+  const CatalogueEntry entry = catalogueReading(kSection, kPlainReading);
+  EXPECT_THAT(entry.keys, Each(::testing::Field(&CatalogueKey::list, "Frequencies")));
+  EXPECT_THAT(entry.keys, Each(::testing::Field(&CatalogueKey::key, "")));
+}
+
+constexpr Field kShorterFields[] = {{"Area", u8(14), decimal()}};
+constexpr PacketReading kTwoReadings[] = {
+    kReadings[0], {0x1234, "short test packet", 0, kShorterFields}, {0x1235, "other", 0, kChoice}};
+constexpr Section kShortSection = {"Test", "Test", SectionKind::Dictionary, kTwoReadings, kCodes};
+
+TEST(CatalogueTest, ListsWhatAShorterPacketWrites) {
+  const CatalogueEntry entry = catalogueReading(kShortSection, kTwoReadings[0]);
+  EXPECT_EQ(entry.minimumLength, 16U);
+  EXPECT_EQ(entry.keys.size(), 5U);
+  ASSERT_EQ(entry.shorterKeys.size(), 1U);
+  EXPECT_EQ(entry.shorterKeys[0].key, "Area");
+  EXPECT_THAT(entry.shorterKeys[0].fields, ElementsAre(&kShorterFields[0]));
 }
 
 }  // namespace
