@@ -23,7 +23,7 @@
 
 namespace kestro {
 
-/// Where the device has what makes saving worth offering.
+/// Where this exists on the device, panes have a "Save" button.
 inline constexpr std::string_view kSaveButtonPath =
     "/NorrowInternal/Library/PreferenceBundles/Carrier Settings.bundle";
 /// The preference for the signal strength as a number.
@@ -31,7 +31,7 @@ inline constexpr std::string_view kShowGSMRssi = "LumoShowGSMRSSI";
 
 /// How often it is looked whether the model is still connected: no new data tells so.
 inline constexpr std::chrono::milliseconds kConnectionCheckInterval{500};
-/// How long the first frame is waited for before connecting begins all the same.
+/// How long connecting waits, at most, for the window's first frame.
 inline constexpr std::chrono::seconds kFirstFramePatience{1};
 
 struct LaunchOptions {
@@ -67,7 +67,7 @@ class KestroApp : public QApplication, private PaneHost {
   /// Has the shell show the signal strength as a number until the exit, unless this program's own
   /// preference is set: then it is left alone.
   void getRSSIPref();
-  /// Looks whether the device has what makes saving worth offering.
+  /// Looks whether the device has `kSaveButtonPath`; `allowSaveButton` says so from then on.
   void getSaveButtonPref();
   /// Writes the shell's preference, and tells that it has changed.
   // NOLINTNEXTLINE(readability-identifier-naming)

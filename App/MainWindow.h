@@ -10,7 +10,7 @@
 
 namespace kestro {
 
-/// Is filled by a navigation stack, which it owns; empty at first.
+/// Holds a navigation stack, which fills it and which it owns. It is empty at first.
 class MainWindow : public QWidget {
   Q_OBJECT
 

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-// What kestro-cli tells whoever started it.
+// The exit status of kestro-cli.
 #pragma once
 
 namespace kestro {

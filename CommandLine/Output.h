@@ -11,7 +11,7 @@
 
 namespace kestro {
 
-/// A buffered output. A failure to write is remembered; what is written after it goes nowhere.
+/// A buffered output. A failure to write is remembered; what is written after it is dropped.
 class Output {
  public:
   [[nodiscard]] static Output standardOutput();

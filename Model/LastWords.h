@@ -11,8 +11,9 @@ namespace kestro {
 /// aborts. At most one exists at a time.
 class LastWords {
  public:
-  /// `handler` runs once, in whatever state the process is: it should say the line first, and do no
-  /// more after it than save and remove what would be lost or left behind. A failure in it aborts.
+  /// `handler` runs once, in whatever state the process is. It should say the line first; after
+  /// that it may save what would be lost and remove what would be left behind, and nothing more. A
+  /// failure in it aborts.
   explicit LastWords(std::function<void(std::string_view line)> handler);
   ~LastWords();
   LastWords(const LastWords&) = delete;

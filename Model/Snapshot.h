@@ -25,7 +25,7 @@ inline constexpr std::string_view kSnapshotDirectory = "/var/mobile/Library/Logs
 /// What a save screen keeps while it is open. The platform need not outlive it.
 class Snapshot {
  public:
-  /// A snapshot of the clock's present, with a copy of the save contents (see
+  /// A snapshot of this moment by the clock, with a copy of the save contents (see
   /// `LogGenerator::getSaveContentsFromState`; null when there is no generator).
   Snapshot(const Clock& clock, const Value& saveContents);
 
@@ -41,7 +41,7 @@ class Snapshot {
   [[nodiscard]] Result<Bytes> file(const PropertyListCoding& coding,
                                    std::string_view description) const;
 
-  /// Writes the file on the device, in place, under the path of the present. A failure leaves its
+  /// Writes the file on the device, in place, under the path for this moment. A failure leaves its
   /// line in the system log (priority error), perhaps part of the file, and yields false.
   [[nodiscard]] bool save(Platform& platform, std::string_view description) const;
 

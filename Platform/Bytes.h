@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-// Byte strings, and the one way in which this program reads and writes little-endian integers.
+// Byte strings, and little-endian integers in them.
 #pragma once
 
 #include <concepts>

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-// A telephony server of one's own, for as long as a live display runs.
+// A telephony server that a live display starts for itself, and that ends with it.
 #pragma once
 
 #include <functional>
@@ -26,15 +26,15 @@ class DemoServer {
 
   [[nodiscard]] virtual const std::string& portDirectory() const noexcept = 0;
 
-  /// Calls `ready` on the main queue once the server owns the port `serverName`; it is waited for
-  /// at most 10 s. Calls `ended` instead, or later, with the reason when the server is not or no
-  /// more there. Whoever holds the timer that is returned watches; `platform` must use this
-  /// server's port directory.
+  /// Watches the server for as long as the returned timer is held. Calls `ready` on the main queue
+  /// once the server owns the port `serverName`. Calls `ended` once, with the reason, when the
+  /// server does not own the port within 10 s, or when it ends. `platform` must use this server's
+  /// port directory.
   [[nodiscard]] virtual std::unique_ptr<Timer> watch(
       Platform& platform, const std::string& serverName, std::function<void()> ready,
       std::function<void(const std::string& reason)> ended) = 0;
 
-  /// Removes the directory at once, for who ends the process without destroying this.
+  /// Removes the directory at once. For those who end the process without destroying this object.
   virtual void removeDirectory() noexcept = 0;
 };
 

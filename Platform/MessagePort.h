@@ -26,8 +26,8 @@ enum class SendError : int {
 /// close the connection at the receiver.
 inline constexpr std::size_t kMaximumMessageSize = std::size_t{16} * 1024 * 1024;
 
-/// Answers one message on the main thread: its id and its bytes (valid during the call) in, the
-/// reply out. The reply is sent only when the sender asked for one.
+/// Answers one message, on the main thread. It is given the message's id and bytes (valid during
+/// the call) and returns the reply, which is sent only when the sender asked for one.
 using ReceiveHandler =
     std::function<std::optional<Bytes>(std::int32_t messageId, ByteView message)>;
 

@@ -29,7 +29,7 @@ class Platform {
   [[nodiscard]] virtual SystemLog& systemLog() = 0;
   /// The developer's console: standard error, apart from the system log.
   [[nodiscard]] virtual TextSink& consoleLog() = 0;
-  /// Where the lines go that decoders have for the standard output.
+  /// Takes the lines that decoders write to standard output.
   [[nodiscard]] virtual TextSink& standardOutput() = 0;
   [[nodiscard]] virtual Clock& clock() = 0;
   [[nodiscard]] virtual Bundle& bundle() = 0;

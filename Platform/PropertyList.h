@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-// The property-list family of values: the common currency between all layers.
+// The values of property lists, which all layers exchange.
 #pragma once
 
 #include <cstdint>
@@ -54,7 +54,7 @@ class Value {
   static constexpr std::size_t kInlineCapacity = 15;
 
   constexpr Value() noexcept = default;
-  // Texts and containers are values; writing the conversion out everywhere would hide the data.
+  // Implicit, so that code that builds values reads like the data that it builds.
   // NOLINTBEGIN(google-explicit-constructor)
   Value(std::string_view text);
   Value(const char* text) : Value(std::string_view(text)) {}
@@ -148,18 +148,18 @@ class Value {
     return object->strong == 1 && object->weak == 0;
   }
 
-  /// The values of the dictionary that this value alone refers to, in the order of their keys and
-  /// to be written over, when its keys are the very list `keys`; otherwise none. Valid until a key
-  /// comes or goes.
+  /// For writing over: the values of a dictionary, in the order of its keys. Empty unless this
+  /// value alone refers to the dictionary and the dictionary's list of keys is `keys` itself, not a
+  /// copy of it. Valid until a key is added or removed.
   [[nodiscard]] std::span<Value> soleRow(const KeyList& keys) const noexcept;
 
   /// A copy that shares no container with this value. Containers may be nested to any depth that
   /// the call stack bears; parsed ones are at most 128 levels deep.
   [[nodiscard]] Value deepCopy() const;
 
-  /// Structural equality: the same type and contents; dictionaries with the same entries in the
-  /// same order. Containers are compared by contents, a container with itself without a look
-  /// inside.
+  /// Whether type and contents are the same. Dictionaries are equal when they have the same entries
+  /// in the same order; containers are compared by what they hold. A container equals itself
+  /// without being walked.
   friend bool operator==(const Value& left, const Value& right) noexcept {
     if (left.sameBits(right)) return true;
     return left._tag == right._tag && left._tag > kNull && left.equalContents(right);
@@ -186,8 +186,8 @@ class Value {
   [[nodiscard]] bool sameBits(const Value& other) const noexcept {
     return std::memcmp(this, &other, sizeof(Value)) == 0;
   }
-  // The 16 bytes, read and written whole: a processor that reads what was just written piece by
-  // piece waits for the pieces.
+  // Reads and writes the 16 bytes as a whole: a processor has to wait when it reads as a whole what
+  // was just written in pieces.
   struct Bits {
     std::uint64_t words[2];
   };
@@ -351,10 +351,10 @@ class Dictionary {
   [[nodiscard]] const Value& valueAt(std::size_t index) const noexcept;
   /// `index` must be below `size()`.
   void setValueAt(std::size_t index, Value value) noexcept;
-  /// The values in the order of their keys, to be written over. Valid until a key comes or goes.
+  /// For writing over: the values in the order of their keys. Valid until a key comes or goes.
   [[nodiscard]] std::span<Value> valuesToRewrite() noexcept;
-  /// Exchanges all entries at once; the keys must be distinct, and as many as the values. Keys that
-  /// other dictionaries share stay theirs: `keys` is empty then.
+  /// Exchanges all entries for those given. The keys must be distinct, and as many as the values.
+  /// Where other dictionaries share the old list of keys, they keep it and `keys` becomes empty.
   void swapEntries(std::vector<Value>& keys, std::vector<Value>& values);
 
   [[nodiscard]] Iterator begin() const { return {*this, 0}; }

@@ -11,9 +11,9 @@
 
 namespace kestro {
 
-/// What a property list may hold before it is refused as unparsable. The count of nodes takes a
-/// shared reference of a binary list anew each time it is reached, and every dictionary entry as a
-/// key and a value.
+/// What a property list may hold before it is refused as unparsable. When nodes are counted, an
+/// object of a binary list that is referred to several times counts each time, and a dictionary
+/// entry counts as two: its key and its value.
 struct PropertyListLimits {
   std::size_t levels = 128;  ///< of containers inside one another
   std::size_t nodes = 200'000;

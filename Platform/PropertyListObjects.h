@@ -175,7 +175,7 @@ inline void releaseArray(ArrayObject* object) noexcept {
   if (object != nullptr && --object->strong == 0) endContainer(object, emptyArray);
 }
 
-/// What is handed out for what is not there.
+/// What is returned, by reference, where there is no value.
 inline constinit const Value kNullValue;
 
 }  // namespace kestro::detail

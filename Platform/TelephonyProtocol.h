@@ -38,9 +38,9 @@ inline constexpr std::string_view kTelephonyTechnologyChanged = "TechnologyChang
 /// On a channel port: the request for the technology, and the reply's entry of the same name.
 inline constexpr std::string_view kTelephonyGetTechnology = "GetTechnology";
 
-/// On a channel port: the command that starts the messages, with the only state there is, and the
-/// codes of the packets that are wanted (arrays of integers); all of them when it has neither
-/// array.
+/// On a channel port: the command that starts the messages. Its state is always "Streaming". Its
+/// two arrays of integers are the codes of the packets that are wanted; without both of them all
+/// packets are.
 inline constexpr std::string_view kTelephonySetState = "SetState";
 inline constexpr std::string_view kTelephonyStreaming = "Streaming";
 inline constexpr std::string_view kTelephonySetOndrelLogCodes = "SetOndrelLogCodes";

@@ -21,7 +21,7 @@ inline constexpr std::string_view kSnapshotDescription = "Description";
 inline constexpr std::string_view kSnapshotDlf = "DLF";
 
 /// The file of a snapshot's dictionary. What XML cannot hold in it is replaced, see
-/// `storableValue`. It fails only for want of a serialisation.
+/// `storableValue`. It fails only when the dictionary cannot be serialised.
 [[nodiscard]] Result<Bytes> snapshotFile(const PropertyListCoding& coding,
                                          const Dictionary& snapshot);
 

@@ -30,7 +30,7 @@ class CsvReader {
   explicit CsvReader(std::istream& input) : _input(input) {}
 
   /// The next record, or nothing at the end. An error says what is wrong with one record, and on
-  /// which line it begins; reading may go on and continues behind it.
+  /// which line it begins; the next call goes on with the record after it.
   [[nodiscard]] Result<std::optional<CsvRecord>> next();
 
   /// Whether reading ended because the system could read no further.

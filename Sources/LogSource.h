@@ -16,7 +16,7 @@ namespace kestro {
 /// What a source says next: a message, a technology, or both at one moment.
 struct SourceEvent {
   /// When the event is due, in the source's own time since its beginning; never before the event
-  /// before it. Absent for a source that happens now: the event is due at once.
+  /// before it. Absent when the source is live: the event is due at once.
   std::optional<std::chrono::microseconds> time;
   /// The technology from this event on; a constant text of Platform/TelephonyService.h.
   std::string_view technology;
@@ -33,8 +33,8 @@ struct SourceEnded {};
 
 using SourceStep = std::variant<SourceEvent, SourceWaits, SourceEnded>;
 
-/// A source of log messages. It knows nothing of clients, and nobody's clock but its own: whoever
-/// plays it decides when to ask. Main thread only.
+/// A source of log messages. It knows nothing of clients and reads no clock: whoever plays it
+/// decides when to ask. Main thread only.
 class LogSource {
  public:
   LogSource() = default;

@@ -22,8 +22,9 @@ inline constexpr Moment kSimulationBegin{std::chrono::seconds(1'330'862'400)};
 /// The time from one step of a simulated drive to the next.
 inline constexpr std::chrono::milliseconds kSimulationStep{500};
 
-/// Whether what hardly ever changes is said again in a step, counted from 0: every two seconds in a
-/// drive's first twenty, for those who have only just connected, and every twenty seconds then.
+/// Whether what hardly ever changes is repeated in this step (the first is 0): every two seconds in
+/// the first twenty seconds of a drive, so that clients that have just connected soon see it, and
+/// every twenty seconds after that.
 [[nodiscard]] constexpr bool repeatsRareLists(unsigned step) noexcept {
   constexpr unsigned kEarlySteps = 4;
   constexpr unsigned kSteps = 40;

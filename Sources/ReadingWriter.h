@@ -9,7 +9,7 @@
 
 namespace kestro {
 
-/// A packet being written, as long as the reading's minimum at least.
+/// A packet that is being written. It is at least as long as the reading's minimum.
 class ReadingWriter {
  public:
   /// `reading` must be a constant.
@@ -19,7 +19,8 @@ class ReadingWriter {
   ReadingWriter(const Section& section, LogCode code) : ReadingWriter(*readingOf(section, code)) {}
 
   [[nodiscard]] PacketWriter::Fields fields() { return _writer.fields(_reading.fields); }
-  /// A table of the packet, its count set. All counts go before the first record.
+  /// Sets the count of the table of list number `list` and returns the table. Set all counts before
+  /// the first record is written.
   const RecordTable& table(std::size_t count, std::size_t list = 0) {
     const RecordTable& records = _reading.lists[list].table;
     _writer.setCount(records, count);

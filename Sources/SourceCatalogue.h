@@ -13,7 +13,7 @@
 
 namespace kestro {
 
-/// The wish that a source follows its data from technology to technology.
+/// Asks a source to follow its data from technology to technology.
 inline constexpr std::string_view kAutomaticTechnology = "auto";
 
 /// Which source is wanted: "KIND" or "KIND:ARGUMENT".

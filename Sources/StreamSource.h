@@ -16,8 +16,9 @@
 namespace kestro {
 
 /// Yields the messages of a stream as they arrive. Each is framed by its length in 4 bytes, least
-/// significant byte first; a length of 0 is a sign of life and yields nothing. A length above
-/// kMaximumMessageSize, or an end within a message, is an error: behind it no frame can be found.
+/// significant byte first; a length of 0 only says that the writer is still there, and yields
+/// nothing. A length above kMaximumMessageSize, or an end within a message, is an error: behind it
+/// no frame can be found.
 class StreamSource : public LogSource {
  public:
   /// Opens `path` ("-" is standard input). `technology` is a constant text of

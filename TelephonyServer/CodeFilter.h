@@ -16,8 +16,8 @@ class CodeFilter {
   /// Accepts the messages with one of these codes; extra codes have their offset.
   explicit CodeFilter(std::vector<LogCode> codes);
 
-  /// Whether the message is wanted. One that is too short to have a code is not, unless everything
-  /// is.
+  /// Whether the message is wanted. A message that is too short to have a code is wanted only if
+  /// all messages are.
   [[nodiscard]] bool accepts(ByteView message) const noexcept;
 
  private:

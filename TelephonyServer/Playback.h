@@ -39,8 +39,8 @@ struct PlaybackOptions {
 
 /// Hands a source's events to a listener when they are due. Time passes whether or not anybody is
 /// there to listen; events that are late (a busy machine) follow at once, in portions that leave
-/// room for everything else on the main thread. A clock that is set moves the source on by ten
-/// seconds too much, or by one too few, at most.
+/// room for everything else on the main thread. When the clock is set, the source jumps ahead by at
+/// most ten seconds, or stands still for at most one.
 class Playback {
  public:
   /// The references must outlive the playback. `report` gets a line when the source ends, fails or

@@ -30,8 +30,8 @@ class Server : public PlaybackListener {
   /// How many log channels there can be at once, and how many registrations for notifications.
   static constexpr std::size_t kMaximumChannels = 512;
   static constexpr std::size_t kMaximumRegistrations = 512;
-  /// What that many clients take: each has its registration, its channel's port, the connections to
-  /// both of its own ports, and, while it connects, one to the server's.
+  /// How many descriptors that many clients take: each has its registration, its channel's port,
+  /// the connections to both of its own ports, and, while it connects, one to the server's.
   static constexpr std::size_t kMaximumDescriptors = kMaximumRegistrations + 6 * kMaximumChannels;
   /// A longer message cannot wait for a client, and is left out for all of them.
   static constexpr std::size_t kMaximumStreamedMessage = std::size_t{4} * 1024 * 1024 - 16;

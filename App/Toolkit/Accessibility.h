@@ -4,8 +4,8 @@
 
 namespace kestro {
 
-/// Tables are lists of items, the wheel is an animation, an alert is one. Call it once, with
-/// the application object there.
+/// Tells them that a table is a list of items, the turning wheel an animation, and an alert an
+/// alert. Call it once, after the application object was made.
 void installAccessibility();
 
 }  // namespace kestro

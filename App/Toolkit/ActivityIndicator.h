@@ -7,7 +7,8 @@
 
 namespace kestro {
 
-/// Small and grey; it takes its place but shows nothing while it is stopped, as it is at first.
+/// Small and grey. It is stopped at first; while it is stopped it keeps its place but shows
+/// nothing.
 class ActivityIndicator : public QWidget {
   Q_OBJECT
 

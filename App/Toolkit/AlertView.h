@@ -20,7 +20,7 @@ class AlertView : public QWidget {
   [[nodiscard]] const QString& message() const noexcept { return _message; }
   [[nodiscard]] BarButton& button() const noexcept { return *_button; }
 
-  /// Shows it and gives it the focus, which goes back to where it was in the end.
+  /// Shows it and gives it the focus. When it closes, the focus goes back to where it was.
   void open();
 
  protected:

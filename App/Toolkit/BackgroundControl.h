@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
-// An area that can be touched between the things that stand in it.
+// The free area of a screen, around and between its other widgets, as a button without a look of
+// its own: it tells that the user pressed beside everything else.
 #pragma once
 
 #include <QAbstractButton>

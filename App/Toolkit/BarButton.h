@@ -16,7 +16,7 @@ class BarButton : public QAbstractButton {
 
   /// Back has an arrow before its text; Filled has a frame in the accent colour.
   void setShape(Shape shape);
-  /// A strong button stands for what is most likely wanted.
+  /// A strong button is for what the user most likely wants next.
   void setStrong(bool strong);
 
   [[nodiscard]] QSize sizeHint() const override;

@@ -21,7 +21,7 @@ struct Colours {
 
 [[nodiscard]] Colours coloursOf(const QPalette& palette);
 
-/// `share` (0 to 1) of `second` in `first`.
+/// The mixture of both colours in which `second` has the part `share`, from 0 to 1.
 [[nodiscard]] QColor mixed(const QColor& first, const QColor& second, qreal share);
 
 /// How well one colour is seen on the other, from 1 to 21.

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT
-// The column that content stands in: as wide as the window, up to where lines are still easily
-// followed by the eye.
+// The column that content stands in: as wide as the window, but no wider than a line that the eye
+// can follow easily.
 #pragma once
 
 #include <algorithm>

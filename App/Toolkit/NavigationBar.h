@@ -17,13 +17,14 @@ class NavigationBar : public QWidget {
 
   explicit NavigationBar(QWidget* parent = nullptr);
 
-  /// The title, and that of the screen that the back button leads to; null without a way back.
+  /// Sets the title of this screen, and that of the screen that the back button leads to. A null
+  /// `backTitle` means that there is no way back.
   void setTitles(const QString& title, const QString& backTitle);
   [[nodiscard]] const QString& title() const noexcept { return _title; }
   [[nodiscard]] BarButton& backButton() const noexcept { return *_back; }
 
-  /// Begins a change to other titles, which are set next: they come in from the right, or from the
-  /// left on the way back.
+  /// Begins a change of titles. The new titles are set next; they come in from the right, or, on
+  /// the way back, from the left.
   void beginTransition(bool isForward);
   /// How far the change is, from 0 to 1; at 1 it is over.
   void setTransition(qreal progress);

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-// A stack of screens between a navigation bar and a toolbar, of which the top one is seen.
+// A stack of screens between a navigation bar and a toolbar. Only the top screen is seen.
 #pragma once
 
 #include <QPointer>
@@ -17,8 +17,8 @@
 namespace kestro {
 
 /// The stack owns its screens; one that was popped lives until it has slid out. Backspace, Escape,
-/// the system's "back" keys and mouse button, and the bar's button pop the top screen; the toolbar
-/// buttons' shortcuts press them.
+/// the system's "back" keys and mouse button, and the bar's button pop the top screen. The shortcut
+/// of a toolbar button presses it.
 class NavigationController : public QWidget {
   Q_OBJECT
 
@@ -44,7 +44,7 @@ class NavigationController : public QWidget {
   /// Pops what is above the screen with this index.
   void popToIndex(std::size_t index, bool animated);
 
-  /// Shows a widget over everything until it is dismissed; the stack takes it. One at a time.
+  /// Shows a widget over everything until `dismiss`. The stack owns it. There is one at a time.
   void present(std::unique_ptr<QWidget> sheet, bool animated);
   /// Takes the sheet away; it lives until it has slid out.
   void dismiss(bool animated);

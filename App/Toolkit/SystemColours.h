@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-// The desktop's wish for light or dark colours, where the toolkit does not know it itself.
+// Whether the desktop wants light or dark colours, where the toolkit does not find out by itself.
 #pragma once
 
 #include <QDBusVariant>

@@ -30,7 +30,7 @@ class TableCell : public QWidget {
   /// The area for content, from (0, 0): the cell without its margins and its accessory.
   [[nodiscard]] QRectF contentBounds() const;
 
-  /// Moves content that is wider than its area by so many pixels; false when it is not moved.
+  /// Moves content that is wider than its area by `distance` pixels. False when nothing moved.
   virtual bool scrollContentBy(qreal distance);
 
   /// Marks the content as changed for a moment.

@@ -20,7 +20,7 @@ namespace kestro {
 /// Only rows on the screen have cells. It scrolls by wheel, scroll bar, keys and, kinetically, by
 /// touch; a sideways movement moves the content of the row under it. Arrows, Page Up and Down, Home
 /// and End move the focus from row to row; Enter selects the focused row, as a click or tap does a
-/// row. The focus shows once a key has moved it. Everything that is not used is left to the parent.
+/// row. The focus shows once a key has moved it. Events that it has no use for go to its parent.
 class TableView : public QAbstractScrollArea {
   Q_OBJECT
 

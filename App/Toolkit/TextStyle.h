@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT
-// One font as this program sets texts in it: on one line, with figures of equal width, so that
-// values do not jitter as they change.
+// How this program draws texts in one font: on one line, with all digits equally wide, so that a
+// value does not move sideways as it changes.
 #pragma once
 
 #include <QFont>
@@ -33,15 +33,15 @@ class TextStyle {
   bool _figuresDiffer;  ///< whether the font's own figures differ in width
 };
 
-/// The system's font at a size of so many points of a screen at its usual text size; the system's
-/// text scaling enlarges it. The reference is valid until the system's font changes.
+/// The system's font. `points` is its height in pixels at the usual text size; where the system
+/// wants larger texts, it is enlarged. The reference is valid until the system's font changes.
 [[nodiscard]] const TextStyle& systemTextStyle(int points, QFont::Weight weight = QFont::Normal);
 
 /// Another family's font at that size.
 [[nodiscard]] QFont scaledFont(const QFont& family, int points, QFont::Weight weight);
 
-/// How much larger than usual the system wants texts, from 1 to 2, for a font of `pixels` height
-/// that it asks for.
+/// How much larger than usual the system wants texts, from 1 to 2. `pixels` is the height of the
+/// font that it asks for.
 [[nodiscard]] qreal textScale(qreal pixels);
 
 }  // namespace kestro

@@ -1,19 +1,20 @@
 // SPDX-License-Identifier: MIT
-// A scroll bar that does not draw the eye.
+// A slim scroll bar.
 #pragma once
 
 #include <QScrollBar>
 
 namespace kestro {
 
-/// A slim handle on the colour of what is scrolled; it works as any scroll bar does.
+/// Only a slim handle is drawn, on the background of what is scrolled. It works as any scroll bar
+/// does.
 class ThinScrollBar : public QScrollBar {
   Q_OBJECT
 
  public:
   explicit ThinScrollBar(QWidget* parent = nullptr);
 
-  /// What it stands on.
+  /// Sets the colour behind it.
   void setGround(const QColor& ground);
 
   [[nodiscard]] QSize sizeHint() const override;

@@ -38,11 +38,11 @@ class Toolbar : public QWidget {
 
   explicit Toolbar(QWidget* parent = nullptr);
 
-  /// Shows these items; the widgets of earlier ones stay where kinds are the same in number and
-  /// order. New ones fade in when it is `animated`.
+  /// Shows these items. Where their kinds are those of the items before, in number and order, the
+  /// widgets stay and only change what they show. New widgets fade in when `animated`.
   void setItems(std::vector<ToolbarItem> items, bool animated);
   [[nodiscard]] const std::vector<ToolbarItem>& items() const noexcept { return _items; }
-  /// What shows an item.
+  /// The widget that shows an item.
   [[nodiscard]] QWidget* widgetOfItem(std::size_t index) const { return _widgets.at(index); }
 
  protected:

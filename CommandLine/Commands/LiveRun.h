@@ -19,7 +19,7 @@ class LiveTask {
   LiveTask(const LiveTask&) = delete;
   LiveTask& operator=(const LiveTask&) = delete;
 
-  /// Called once; the server of the options is there, as far as it is ours to start.
+  /// Called once. Where the options ask for a demo, its server is there by now.
   virtual void start() = 0;
   /// The process was asked to end.
   virtual void stop() = 0;
@@ -27,8 +27,8 @@ class LiveTask {
   virtual void resized() {}
 };
 
-/// Ends the event loop, in a later turn of it; the first call counts. `complaint`, unless empty, is
-/// written to standard error when the task is gone.
+/// Ends the event loop, in a later turn of it. Only the first call counts. `complaint`, unless
+/// empty, is written to standard error after the task was destroyed.
 using Finish = std::function<void(int exitStatus, std::string complaint)>;
 
 using LiveTaskMaker = std::function<std::unique_ptr<LiveTask>(LinuxPlatform& platform, Finish)>;

@@ -15,7 +15,7 @@
 
 namespace kestro {
 
-/// What is known of a packet before its values are.
+/// What is known of a packet before its values are read.
 struct PacketHead {
   std::uint64_t message = 0;  ///< the number of its message
   Moment time;

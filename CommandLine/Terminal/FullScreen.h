@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-// The terminal while the live display has it.
+// The terminal while it shows the live display.
 #pragma once
 
 #include <vector>
@@ -29,8 +29,8 @@ class FullScreen {
   /// Replaces the screen's contents; the lines must fit into `size`.
   void draw(const std::vector<StyledLine>& lines);
 
-  /// Gives the terminal back at once, if somebody has it; for who ends the process without
-  /// destroying what it holds. Safe in a signal handler.
+  /// Gives the terminal back at once, if a FullScreen has it. For those who end the process without
+  /// destroying that object. Safe in a signal handler.
   static void restore() noexcept;
 
  private:

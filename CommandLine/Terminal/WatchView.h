@@ -13,7 +13,7 @@
 
 namespace kestro {
 
-/// What is to be seen at a moment.
+/// What a view shows at one moment.
 struct WatchState {
   Moment time;           ///< of the last refresh
   std::string status;    ///< "Connecting..." or "Updated …"
@@ -21,7 +21,7 @@ struct WatchState {
   NodePointer previous;  ///< the tree of the refresh before, or null
 };
 
-/// Who shows it.
+/// Shows such states, in one format.
 class WatchView {
  public:
   WatchView() = default;

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-// The one door to the Linux platform. Qt, libplist, sockets, syslog and D-Bus stay behind it.
+// The only header of the Linux platform, and of all that it uses, that other folders include.
 #pragma once
 
 #include <functional>
@@ -42,8 +42,8 @@ class LinuxPlatform : public Platform {
   /// Calls `handler` on the main thread when the terminal's size changes (SIGWINCH).
   virtual void setResizeHandler(std::function<void()> handler) = 0;
 
-  /// Waits, for at most a second, until the system log has every line so far. Who ends the process
-  /// without destroying the platform calls this first.
+  /// Waits, for at most a second, until the system log has every line so far. Call it first where
+  /// the process is ended without destroying the platform.
   virtual void flushSystemLog() = 0;
 
   /// Makes the default device root with the folders that saving needs, where the root itself is

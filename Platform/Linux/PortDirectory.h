@@ -62,8 +62,8 @@ class PortDirectory {
   /// replaced. Waits at most 1 s for somebody who is just taking a name.
   [[nodiscard]] Result<PortListener> listen(const std::string& name) const;
 
-  /// Removes what processes that ended without a word have left behind: the sockets nobody listens
-  /// to any more. Does nothing while somebody else keeps the lock.
+  /// Removes the sockets that nobody listens to any more, left behind by processes that were
+  /// killed. Does nothing while somebody else keeps the lock.
   void removeDeadOwners() const;
 
   /// A non-blocking socket connected to the owner of the port name `name`; without value when

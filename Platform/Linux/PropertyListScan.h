@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: MIT
-// The look at a property list before the library parses it. The library trusts its input: it takes
+// The check of a property list before the library parses it. The library trusts its input: it takes
 // time and memory without bound for lists that unfold or nest, cuts texts at a NUL, reads octal
-// numbers and forgets what it does not understand. Whatever passes here it parses completely,
-// quickly, and with one meaning.
+// numbers and drops what it does not understand. A list that passes this check is parsed
+// completely, quickly, and with one meaning.
 #pragma once
 
 #include "Platform/Bytes.h"
@@ -11,7 +11,7 @@
 
 namespace kestro {
 
-/// What the scan knows and the library's interface cannot tell.
+/// What the check finds out and the library does not tell.
 struct PropertyListFacts {
   /// Whether some integer is above 2^63 - 1. The library shows those and the negative ones alike.
   bool hasLargeIntegers = false;

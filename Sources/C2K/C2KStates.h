@@ -13,7 +13,7 @@ namespace kestro {
 
 enum class OneXState : std::uint8_t {
   PowerUp,
-  Initial,  ///< behind a call
+  Initial,  ///< after a call
   Acquisition,
   Sync,
   Paging,

@@ -21,8 +21,8 @@ class SentCounters {
   explicit SentCounters(const ThroughputLayout& layout)
       : _layout(layout), _counters(layout.counters.size(), 0) {}
 
-  /// Counts as many packets of the counter's size as the bits fill, together with those left over
-  /// before. The counter must count packets of a size.
+  /// Adds the bits to those left over before, and counts as many packets of the counter's size as
+  /// they fill. The counter must be of packets of one size.
   void send(std::size_t counter, double bits);
 
   /// The counters as they are, under the next sequence number. One packet a second makes the

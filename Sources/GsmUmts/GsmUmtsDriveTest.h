@@ -15,7 +15,7 @@ namespace kestro {
 /// 63), the cell identity is the log's. Both: the area. What the log does not hold is made up:
 /// network code (999-990), scrambling code (the whole identity modulo 512), ARFCN and BSIC of the
 /// GSM cell, states, SIM and contexts. The UMTS cell's identity has no place in the display. A
-/// packet one of whose values the log has not had yet is not sent.
+/// packet is not sent before the log has had each of its values.
 class GsmUmtsDriveTestEncoder : public DriveTestEncoder {
  public:
   /// `coding` must outlive the encoder.

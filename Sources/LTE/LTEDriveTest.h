@@ -15,7 +15,7 @@ namespace kestro {
 /// tracking area and the neighbour's levels are the log's. What the log does not hold is made up:
 /// channel numbers and bandwidth (one 20 MHz carrier of band 3), physical cell identities (the
 /// cell's identity modulo 504, the neighbour's the next one), the number of antennas, reselection
-/// parameters, SIM and contexts. A packet one of whose values the log has not had yet is not sent.
+/// parameters, SIM and contexts. A packet is not sent before the log has had each of its values.
 class LTEDriveTestEncoder : public DriveTestEncoder {
  public:
   /// `coding` must outlive the encoder.

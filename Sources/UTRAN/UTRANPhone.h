@@ -22,7 +22,7 @@ enum class UTRANMode : std::uint8_t { Disconnected, Connecting, Fach, Dch, CellP
 /// The mode as the display names it.
 [[nodiscard]] std::string_view utranModeName(UTRANMode mode) noexcept;
 
-/// The connection to the network: set up for a transfer, and given up by and by behind one.
+/// The connection to the network: set up for a transfer, and given up step by step after it.
 class UTRANConnection {
  public:
   void advance(std::chrono::milliseconds time, Activity activity) noexcept;

@@ -107,7 +107,7 @@ class RadioLayer {
   std::vector<SimulatedCell> _cells;
 };
 
-/// The power of several signals together, in dBm as they are.
+/// The power of several signals together. All powers are in dBm.
 class PowerSum {
  public:
   void add(double level) noexcept;

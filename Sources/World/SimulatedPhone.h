@@ -14,7 +14,7 @@ namespace kestro {
 
 enum class RadioAccess : std::uint8_t { GSM, UMTS };
 
-/// What the data connection does: nothing, a transfer, or the wait behind one.
+/// What the data connection does: nothing, a transfer, or the wait after one.
 enum class Activity : std::uint8_t { Idle, Transfer, Tail };
 
 /// Transfers that come and go by themselves, in a rhythm that repeats from run to run.
