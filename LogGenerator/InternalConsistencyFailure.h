@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-// The failure of an assumption that a generator makes about its channel.
+// What a generator throws when its channel sends what it never should.
 #pragma once
 
 #include <stdexcept>

@@ -11,7 +11,7 @@ namespace kestro {
 extern const PacketReading kEVDOActiveSetReading;
 extern const PacketReading kEVDOFingersReading;
 
-/// Shows one list of pilots. How long a packet with so many of them is, its code decides.
+/// Shows one list of pilots. The code decides how long a packet with so many pilots has to be.
 class EVDOPilots : public C2KParser {
  public:
   void parse(PacketView packet, C2KOutput& output) override;

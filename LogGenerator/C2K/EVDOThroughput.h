@@ -34,8 +34,8 @@ struct ThroughputLayout {
 extern const ThroughputLayout kForwardThroughput;
 extern const ThroughputLayout kReverseThroughput;
 
-/// Shows the data rate between one packet and the next. The first packet only primes it; a packet
-/// whose number is not above the last one's leaves the rate that is shown.
+/// Shows the data rate between one packet and the next. The first packet only gives the numbers to
+/// count from; a packet whose number is not above the last one's leaves the rate that is shown.
 class EVDOThroughput : public C2KParser {
  public:
   /// `layout` must be a constant.

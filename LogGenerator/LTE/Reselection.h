@@ -6,8 +6,8 @@
 
 namespace kestro {
 
-/// A candidate's fields lie over the next candidate's first bytes: of several candidates only the
-/// last one says what was meant.
+/// A candidate's fields overlap the first bytes of the next one. So of several candidates only the
+/// last one is shown as it was meant.
 inline constexpr LogCode kLTEReselectionCode = 0xB186;
 
 extern const Section kReselectionCandidatesSection;

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-// Collected messages as records of a DLF log, without the bytes that are none.
+// Turns collected messages into records of a DLF log, and leaves out bytes that are no record.
 #pragma once
 
 #include <cstddef>
@@ -12,7 +12,7 @@
 
 namespace kestro {
 
-/// What frames of the messages that a generator collected between two refreshes.
+/// How many records the messages hold that a generator collected between two refreshes.
 struct CollectedRecords {
   std::uint64_t count = 0;
   /// The bytes behind the last record, from the first message on whose length cannot be its own.
@@ -21,14 +21,14 @@ struct CollectedRecords {
 
 /// Appends the record of every message in `collected` to `dlf`: a message is a type byte and a
 /// record, which begins with its length in 16 bits, and may have a 2-byte prefix. Ends at the first
-/// message that does not frame; behind it no other can be found.
+/// message whose length cannot be right: where the next one begins is not known then.
 CollectedRecords appendRecords(Bytes& dlf, ByteView collected);
 
-/// A DLF log in which every packet frames.
+/// A DLF log in which every packet is a whole record.
 struct ReframedDlf {
   Bytes dlf;
   std::uint64_t packetCount = 0;
-  /// What does not frame, and is left out.
+  /// The bytes of one history entry that are no whole record, and are left out.
   struct Unframed {
     std::size_t entry;  ///< number in the history, from 1
     std::size_t size;   ///< how many bytes at its end

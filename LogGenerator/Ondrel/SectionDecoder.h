@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-// The decoder that is nothing but its section's description.
+// The decoder that does what its section's description says.
 #pragma once
 
 #include <memory>

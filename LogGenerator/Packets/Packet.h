@@ -16,7 +16,7 @@ class PropertyListCoding;
 /// parsed when a decoder first asks for it and kept for the others.
 class Packet {
  public:
-  // Whatever has a packet's bytes has a packet.
+  // Implicit: a packet is its bytes, so bytes can be given where a packet is wanted.
   // NOLINTBEGIN(google-explicit-constructor)
   Packet(ByteView bytes) noexcept : _bytes(bytes) {}
   Packet(const Bytes& bytes) noexcept : _bytes(bytes) {}
