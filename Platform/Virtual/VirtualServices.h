@@ -7,6 +7,7 @@
 #include <map>
 #include <memory>
 #include <optional>
+#include <ostream>
 #include <string>
 #include <utility>
 #include <vector>
@@ -30,6 +31,10 @@ class RecordingSystemLog : public SystemLog {
     LogPriority priority;
     std::string text;
     bool operator==(const Line&) const = default;
+    /// "3 text", for the failures of tests.
+    friend std::ostream& operator<<(std::ostream& stream, const Line& line) {
+      return stream << static_cast<int>(line.priority) << ' ' << line.text;
+    }
   };
 
   RecordingSystemLog() : SystemLog(LogPriority::Debug) {}

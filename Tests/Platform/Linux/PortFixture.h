@@ -13,6 +13,7 @@
 #include <initializer_list>
 #include <memory>
 #include <optional>
+#include <ostream>
 #include <string>
 #include <string_view>
 #include <thread>
@@ -75,6 +76,9 @@ class PortFixture : public ::testing::Test {
     std::int32_t id;
     std::string text;
     bool operator==(const Message&) const = default;
+    friend void PrintTo(const Message& message, std::ostream* stream) {
+      *stream << message.id << ' ' << message.text;
+    }
   };
 
   PortFixture();
