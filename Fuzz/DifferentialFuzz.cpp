@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 // Packets of one technology: its generator shows what a plain reader of the same layouts shows.
 #include <algorithm>
+#include <set>
 #include <utility>
 #include <vector>
 
@@ -8,6 +9,7 @@
 #include "Fuzz/PlainReader/PlainReader.h"
 #include "Fuzz/Technology.h"
 #include "Platform/PropertyListDescription.h"
+#include "Tests/Support/SubscribedCodes.h"
 
 namespace kestro::fuzz {
 namespace {
@@ -26,6 +28,9 @@ class Comparison {
       _channel.platform().bundle().setResource(fmt::format("{}.plist", name), contents);
     }
     _channel.start();
+    const std::set<LogCode> known(_reader->codes().begin(), _reader->codes().end());
+    require(testing::subscribedCodes(_channel.generator()) == known,
+            "the plain reader knows the codes that the generator asks for, and no others");
   }
 
   void takeStep(Input& input) {

@@ -15,6 +15,7 @@
 #include "Model/KestroModelNode.h"
 #include "Platform/Linux/LinuxPlatform.h"
 #include "Platform/Virtual/QuietPlatform.h"
+#include "Tests/Support/ProgramTemplates.h"
 
 namespace kestro::fuzz {
 
@@ -30,13 +31,7 @@ class GeneratorChannel {
   }
 
   /// Gives the generator the program's own templates.
-  void addTemplates() {
-    static const std::unique_ptr<Bundle> bundle = createBundle();
-    for (const std::string& path : bundle->resourcesOfType("plist")) {
-      const auto contents = bundle->resource(path.substr(0, path.rfind('.')), "plist");
-      if (contents) _platform.bundle().setResource(path, *contents);
-    }
-  }
+  void addTemplates() { testing::addTemplates(_platform); }
 
   /// A generator that goes on with the state, as after a reconnection.
   void start() { _generator = LogGenerator::generatorFromTechnology(_platform, _technology); }
@@ -79,6 +74,8 @@ class GeneratorChannel {
     static_cast<void>(propertyListCoding().binary(contents));
   }
 
+  /// What `start` made.
+  [[nodiscard]] const LogGenerator& generator() const noexcept { return *_generator; }
   [[nodiscard]] VirtualPlatform& platform() noexcept { return _platform; }
   [[nodiscard]] Dictionary& state() noexcept { return _state; }
 

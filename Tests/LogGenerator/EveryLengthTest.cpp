@@ -15,30 +15,21 @@
 #include "Platform/TelephonyService.h"
 #include "Platform/Virtual/VirtualPlatform.h"
 #include "Tests/Support/PacketBytes.h"
+#include "Tests/Support/ProgramTemplates.h"
+#include "Tests/Support/SubscribedCodes.h"
 
 namespace kestro::testing {
 namespace {
-
-constexpr std::string_view kTechnologies[] = {
-    kTqLogChannelTechnology_IFX, kTqLogChannelTechnology_Ondrel_GSM,
-    kTqLogChannelTechnology_Ondrel_CDMA, kTqLogChannelTechnology_Ondrel_LTE,
-    kTqLogChannelTechnology_Ondrel_UTRAN2};
 
 /// A generator of one technology with the program's templates, and its state.
 class Channel {
  public:
   explicit Channel(std::string_view technology) {
-    const auto bundle = createBundle();
-    for (const std::string& path : bundle->resourcesOfType("plist")) {
-      const std::string name = path.substr(0, path.rfind('.'));
-      if (auto contents = bundle->resource(name, "plist")) {
-        _platform.bundle().setResource(path, std::move(*contents));
-      }
-    }
+    addTemplates(_platform);
     _generator = LogGenerator::generatorFromTechnology(_platform, technology);
   }
 
-  [[nodiscard]] LogGenerator* generator() const noexcept { return _generator.get(); }
+  [[nodiscard]] const LogGenerator& generator() const noexcept { return *_generator; }
   [[nodiscard]] const Value& display() const { return _state[kStateDisplay]; }
   [[nodiscard]] const PropertyListCoding& coding() const noexcept { return *_coding; }
 
@@ -75,22 +66,14 @@ std::string nameOf(const ::testing::TestParamInfo<Subscription>& info) {
   return fmt::format("{}_0x{:04X}", info.param.technology, info.param.code);
 }
 
-void addCodes(const Array& codes, LogCode offset, std::string_view technology,
-              std::vector<Subscription>& subscriptions) {
-  for (const Value& code : codes) {
-    subscriptions.push_back({technology, offset + static_cast<LogCode>(code.integerBits())});
-  }
-}
-
 /// What the technologies' start commands ask for.
 std::vector<Subscription> allSubscriptions() {
   std::vector<Subscription> subscriptions;
-  for (const std::string_view technology : kTechnologies) {
+  for (const std::string_view technology : LogGenerator::technologies()) {
     const Channel channel(technology);
-    if (channel.generator() == nullptr) continue;
-    const Dictionary command = channel.generator()->getStartCommand();
-    addCodes(command["SetOndrelLogCodes"].array(), 0, technology, subscriptions);
-    addCodes(command["SetTqExtraCodes"].array(), kExtraCodes, technology, subscriptions);
+    for (const LogCode code : subscribedCodes(channel.generator())) {
+      subscriptions.push_back({technology, code});
+    }
   }
   return subscriptions;
 }

@@ -11,6 +11,7 @@
 #include "Sources/SourceCatalogue.h"
 #include "TelephonyServer/ChannelCommand.h"
 #include "Tests/Soak/CountingGenerator.h"
+#include "Tests/Support/ProgramTemplates.h"
 
 namespace kestro::soak {
 namespace {
@@ -34,11 +35,7 @@ std::size_t countNodes(const KestroModelNode& node) {
 
 LiveSystem::LiveSystem(std::string_view technology, double speed, std::size_t premadeCount)
     : _technology(technology), _speed(speed) {
-  const auto bundle = createBundle();
-  for (const std::string& path : bundle->resourcesOfType("plist")) {
-    auto contents = bundle->resource(path.substr(0, path.rfind('.')), "plist");
-    if (contents) _platform.bundle().setResource(path, std::move(*contents));
-  }
+  testing::addTemplates(_platform);
   _platform.systemLog().setThreshold(LogPriority::Error);
   connectService();
   _model = KestroModel::create(

@@ -18,8 +18,7 @@ namespace kestro::testing {
 template <class Simulation>
 class SimulationFixture : public ::testing::Test {
  protected:
-  SimulationFixture(std::string_view technology, const std::string& templateName)
-      : display(technology, templateName) {}
+  explicit SimulationFixture(std::string_view technology) : display(technology) {}
 
   /// The packets of the next step, shown.
   std::vector<Bytes> step() {

@@ -9,15 +9,15 @@
 #include "LogGenerator/LogGenerator.h"
 #include "Platform/Linux/LinuxPlatform.h"
 #include "Platform/Virtual/VirtualPlatform.h"
+#include "Tests/Support/ProgramTemplates.h"
 
 namespace kestro::testing {
 
 /// Shows what a technology's generator makes of messages, with the program's own template.
 class DisplayReader {
  public:
-  DisplayReader(std::string_view technology, const std::string& templateName) {
-    const auto contents = createBundle()->resource(templateName, "plist");
-    if (contents) _platform.bundle().setResource(templateName + ".plist", *contents);
+  explicit DisplayReader(std::string_view technology) {
+    addTemplates(_platform);
     _platform.systemLog().setThreshold(LogPriority::Error);
     _generator = LogGenerator::generatorFromTechnology(_platform, technology);
     static_cast<void>(_generator->generateLogUsingState(_state));

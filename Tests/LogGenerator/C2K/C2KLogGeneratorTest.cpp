@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "LogGenerator/C2K/C2KLogGenerator.h"
 #include "Tests/LogGenerator/C2K/C2KFixture.h"
+#include "Tests/Support/ProgramTemplates.h"
 
 namespace kestro::testing {
 namespace {
@@ -310,10 +311,7 @@ TEST_F(C2KLogGeneratorTest, ListsWhatEachSectionTakesFromEachCode) {
 
 class C2KTemplateTest : public C2KFixture {
  protected:
-  C2KTemplateTest() {
-    platform.bundle().setResource("C2KTemplate.plist",
-                                  createBundle()->resource("C2KTemplate", "plist").value());
-  }
+  C2KTemplateTest() { addTemplates(platform); }
 };
 
 TEST_F(C2KTemplateTest, ShowsEveryLookupNameOnce) {

@@ -34,7 +34,7 @@ class GsmUmtsDriveTestTest : public ::testing::Test {
   }
 
   TemporaryDirectory _directory;
-  testing::DisplayReader display{kTqLogChannelTechnology_Ondrel_GSM, "Ondrel_GSM"};
+  testing::DisplayReader display{kTqLogChannelTechnology_Ondrel_GSM};
   GsmUmtsDriveTestEncoder _encoder{display.coding()};
   std::vector<Bytes> packets;
 };

@@ -19,7 +19,6 @@ namespace {
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 using testing::TemporaryDirectory;
-using ::testing::UnorderedElementsAre;
 
 const std::string kLTEColumns =
     "Timestamp,NetworkMode,RSRP,RSRQ,RSSI,LACHEX,RAWCELLID,NRxRSRP,NRxRSRQ\n";
@@ -40,7 +39,7 @@ class LTEDriveTestTest : public ::testing::Test {
   }
 
   TemporaryDirectory _directory;
-  testing::DisplayReader display{kTqLogChannelTechnology_Ondrel_LTE, "LTE"};
+  testing::DisplayReader display{kTqLogChannelTechnology_Ondrel_LTE};
   LTEDriveTestEncoder _encoder{display.coding()};
   std::vector<LogCode> codes;
 };
