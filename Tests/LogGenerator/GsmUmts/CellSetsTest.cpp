@@ -25,11 +25,6 @@ class ActiveSetTest : public DecoderFixture<ActiveSet> {
   }
 };
 
-TEST_F(ActiveSetTest, HasItsNameAndCode) {
-  EXPECT_EQ(decoder.getSectionName(), "Active Set");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x417AU));
-}
-
 TEST_F(ActiveSetTest, ShowsAMemberCell) {
   // Byte 7 = 0x91, byte 8 = 0x01: 0x191 = 401. 83563 is above 83562: -8 dB. R = -112: 40 - 106 - 8.
   decode(setInformation(1, 0xFF90).u8(23, 0x91).u8(24, 0x01).u32(63, 83563));
@@ -124,15 +119,6 @@ TEST_F(ActiveSetTest, ReadsZerosPastTheEnd) {
                                     Pair("Energy Per Chip", "0 dB")));
 }
 
-TEST_F(ActiveSetTest, ReportsOtherCodes) {
-  decode(oneCell(1));
-  takeLines();
-  decode(setInformation(0).bytes(), 0x4005);
-  EXPECT_THAT(list(), SizeIs(1));
-  EXPECT_THAT(takeLines(), ElementsAre(warningLine("ActiveSet"),
-                                       errorLine("Received an unknown log message: 16389")));
-}
-
 // --- DetectedSet, MonitoredSet, VirtualActiveSet -------------------------------------------------
 
 struct EmptySet {
@@ -160,11 +146,6 @@ EmptySet EmptySetTest<VirtualActiveSet>::names() {
 using EmptySets = ::testing::Types<DetectedSet, MonitoredSet, VirtualActiveSet>;
 TYPED_TEST_SUITE(EmptySetTest, EmptySets);
 
-TYPED_TEST(EmptySetTest, HasItsNameAndCode) {
-  EXPECT_EQ(this->decoder.getSectionName(), this->names().section);
-  EXPECT_THAT(this->decoder.getLogCodeArray(), ElementsAre(0x417AU));
-}
-
 TYPED_TEST(EmptySetTest, IsEmptyWhateverCellsAPacketHas) {
   for (const unsigned count : {0U, 1U, 255U}) {
     this->list().append("old");
@@ -187,15 +168,6 @@ TYPED_TEST(EmptySetTest, NeedsSixteenBytes) {
   this->decode(setInformation(0).length(15));
   EXPECT_THAT(this->list(), SizeIs(1));
   EXPECT_THAT(this->takeLines(), ElementsAre(warningLine(this->names().className)));
-}
-
-TYPED_TEST(EmptySetTest, ReportsOtherCodes) {
-  this->list().append("old");
-  this->decode(setInformation(0).bytes(), 0xFF0001);
-  EXPECT_THAT(this->list(), SizeIs(1));
-  EXPECT_THAT(this->takeLines(),
-              ElementsAre(warningLine(this->names().className),
-                          errorLine("Received an unknown log message: 16711681")));
 }
 
 // --- UMTSSet: idle-mode ranking ------------------------------------------------------------------
@@ -224,11 +196,6 @@ class UMTSSetTest : public DecoderFixture<UMTSSet> {
     return cell;
   }
 };
-
-TEST_F(UMTSSetTest, HasItsNameAndCodes) {
-  EXPECT_EQ(decoder.getSectionName(), "UMTS Set");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x4005U, 0xFF0001U));
-}
 
 TEST_F(UMTSSetTest, ShowsARankedCell) {
   // -91 = 0xFFA5, -70 = 0xBA, -15 = 0xF1, -13 = 0xFFF3
@@ -285,13 +252,6 @@ TEST_F(UMTSSetTest, NeedsFifteenBytes) {
   EXPECT_THAT(takeLines(), ElementsAre(warningLine("UMTSSet")));
   decode(packet(0x4005).length(15));
   EXPECT_THAT(list(), IsEmpty());
-}
-
-TEST_F(UMTSSetTest, ReportsOtherCodes) {
-  decode(ranking().bytes(), 0x417A);
-  EXPECT_THAT(list(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(warningLine("UMTSSet"),
-                                       errorLine("Received an unknown log message: 16762")));
 }
 
 // --- UMTSSet: cell monitor -----------------------------------------------------------------------

@@ -45,11 +45,6 @@ class GSMServingCellTest : public DecoderFixture<GSMServingCell> {
   static Dictionary serving() { return gsmCell("kTqCellMonitorCellTypeServing"); }
 };
 
-TEST_F(GSMServingCellTest, HasItsNameAndCodes) {
-  EXPECT_EQ(decoder.getSectionName(), "GSM Serving Cell");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x5134U, 0x5137U, 0x5076U, 0xFF0001U));
-}
-
 TEST_F(GSMServingCellTest, ShowsTheIdentityFirst) {
   decode(identity());
   EXPECT_THAT(entries(),
@@ -108,13 +103,6 @@ TEST_F(GSMServingCellTest, KeepsWhatAPacketDoesNotCarry) {
               ElementsAre(Pair("Cell ID", "54321"), Pair("ARFCN", "78"), Pair("BSIC", "44"),
                           Pair("RSSI", "63 dBm"), Pair("C1 Value", "30"), Pair("C2 Value", "28"),
                           Pair("MA Dedicated ARFCN", "99")));
-}
-
-TEST_F(GSMServingCellTest, ReportsOtherCodes) {
-  decode(identity().bytes(), 0x51FF);
-  EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(warningLine("GSMServingCell"),
-                                       errorLine("Received an unknown log message: 20991")));
 }
 
 TEST_F(GSMServingCellTest, ShowsTheFirstListedServingCell) {
@@ -194,11 +182,6 @@ class NeighboringCellsTest : public DecoderFixture<NeighboringCells> {
   }
   static Dictionary listed() { return gsmCell("kTqCellMonitorCellTypeNeighbor"); }
 };
-
-TEST_F(NeighboringCellsTest, HasItsNameAndCodes) {
-  EXPECT_EQ(decoder.getSectionName(), "Neighboring Cells");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x5137U, 0x51FFU, 0xFF0001U));
-}
 
 TEST_F(NeighboringCellsTest, ShowsNeighbours) {
   decode(neighbours({77, 512}));
@@ -280,15 +263,6 @@ TEST_F(NeighboringCellsTest, NeedsTwentyNineBytes) {
   EXPECT_THAT(list(), SizeIs(1));
 }
 
-TEST_F(NeighboringCellsTest, ReportsOtherCodes) {
-  decode(neighbours({77}));
-  takeLines();
-  decode(neighbours({}).bytes(), 0x5134);
-  EXPECT_THAT(list(), SizeIs(1));
-  EXPECT_THAT(takeLines(), ElementsAre(warningLine("NeighboringCells"),
-                                       errorLine("Received an unknown log message: 20788")));
-}
-
 TEST_F(NeighboringCellsTest, ShowsListedNeighboursWithTwiceTheirLevel) {
   decodeList(0xFF0001, Array{listed(), gsmCell("kTqCellMonitorCellTypeServing"),
                              changed(listed(), "kTqCellMonitorARFCN", Value::integer(512))});
@@ -351,11 +325,6 @@ TEST_F(NeighboringCellsTest, IsEmptiedByALostList) {
 
 class GSMSetTest : public DecoderFixture<GSMSet> {};
 
-TEST_F(GSMSetTest, HasItsNameAndCode) {
-  EXPECT_EQ(decoder.getSectionName(), "GSM Set");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x4005U));
-}
-
 TEST_F(GSMSetTest, ShowsRankedCells) {
   // -75 = 0xB5, -3 = 0xFFFD
   decode(packet(0x4005).u8(14, 2).u16(15, 77).u16(17, 44).u8(19, 0xB5).u16(20, 0xFFFD).u16(22, 78));
@@ -394,13 +363,6 @@ TEST_F(GSMSetTest, NeedsFifteenBytes) {
   EXPECT_THAT(list(), IsEmpty());
 }
 
-TEST_F(GSMSetTest, ReportsOtherCodes) {
-  decode(packet(0x4005).u8(14, 1).length(22).bytes(), 0xFF0001);
-  EXPECT_THAT(list(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(warningLine("GSMSet"),
-                                       errorLine("Received an unknown log message: 16711681")));
-}
-
 // --- MobileAllocation ----------------------------------------------------------------------------
 
 class MobileAllocationTest : public DecoderFixture<MobileAllocation> {
@@ -411,11 +373,6 @@ class MobileAllocationTest : public DecoderFixture<MobileAllocation> {
     return texts;
   }
 };
-
-TEST_F(MobileAllocationTest, HasItsNameAndCode) {
-  EXPECT_EQ(decoder.getSectionName(), "Mobile Allocation");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x51F8U));
-}
 
 TEST_F(MobileAllocationTest, ShowsSequenceNumberAndFrequencies) {
   decode(packet(0x51F8).u8(13, 33).u8(14, 3).u16(15, 514).u16(17, 65535).u16(19, 512));
@@ -442,13 +399,6 @@ TEST_F(MobileAllocationTest, NeedsFifteenBytes) {
   decode(packet(0x51F8).u8(13, 33).length(14));
   EXPECT_THAT(entries(), IsEmpty());
   EXPECT_THAT(takeLines(), ElementsAre(warningLine("MobileAllocation")));
-}
-
-TEST_F(MobileAllocationTest, ReportsOtherCodes) {
-  decode(packet(0x51F8).length(15).bytes(), 0x51F6);
-  EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(warningLine("MobileAllocation"),
-                                       errorLine("Received an unknown log message: 20982")));
 }
 
 }  // namespace

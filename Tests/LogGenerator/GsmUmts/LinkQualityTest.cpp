@@ -27,11 +27,6 @@ class BLERTest : public DecoderFixture<BLER> {
   std::vector<Entries> rows() { return rowsUnder(section(), "Transport Channels"); }
 };
 
-TEST_F(BLERTest, HasItsNameAndCode) {
-  EXPECT_EQ(decoder.getSectionName(), "BLER");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x4116U));
-}
-
 TEST_F(BLERTest, ShowsWindowAndChannels) {
   decode(channels(2, 500).u8(16, 24).u32(17, 100000).u32(21, 217).u8(25, 31).u32(26, 5).u32(30, 4));
   EXPECT_THAT(keysOf(section()), ElementsAre("Window Size", "Transport Channels"));
@@ -72,13 +67,6 @@ TEST_F(BLERTest, NeedsSixteenBytes) {
   EXPECT_THAT(takeLines(), ElementsAre(warningLine("BLER")));
 }
 
-TEST_F(BLERTest, ReportsOtherCodes) {
-  decode(channels(0, 500).bytes(), 0x4221);
-  EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(warningLine("BLER"),
-                                       errorLine("Received an unknown log message: 16929")));
-}
-
 // --- HSDPAInformation ----------------------------------------------------------------------------
 
 class HSDPAInformationTest : public DecoderFixture<HSDPAInformation> {
@@ -89,11 +77,6 @@ class HSDPAInformationTest : public DecoderFixture<HSDPAInformation> {
   std::vector<Entries> primary() { return rowsUnder(section(), "Primary HARQ Process"); }
   std::vector<Entries> secondary() { return rowsUnder(section(), "Secondary HARQ Process"); }
 };
-
-TEST_F(HSDPAInformationTest, HasItsNameAndCode) {
-  EXPECT_EQ(decoder.getSectionName(), "HSDPA Info");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x4221U));
-}
 
 TEST_F(HSDPAInformationTest, ShowsTheHeader) {
   decode(statistics(0, 0).u8(13, 3).u8(14, 100).u8(15, 0x0B));
@@ -170,13 +153,6 @@ TEST_F(HSDPAInformationTest, NeedsEighteenBytes) {
   decode(statistics(0, 0).length(17));
   EXPECT_THAT(entries(), IsEmpty());
   EXPECT_THAT(takeLines(), ElementsAre(warningLine("HSDPAInformation")));
-}
-
-TEST_F(HSDPAInformationTest, ReportsOtherCodes) {
-  decode(statistics(0, 0).bytes(), 0x4116);
-  EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(warningLine("HSDPAInformation"),
-                                       errorLine("Received an unknown log message: 16662")));
 }
 
 }  // namespace

@@ -51,11 +51,6 @@ constexpr const char* kRegistrationStates[] = {
 
 class ProcessCOTest : public DecoderFixture<ProcessCO> {};
 
-TEST_F(ProcessCOTest, HasItsNameAndCodes) {
-  EXPECT_EQ(decoder.getSectionName(), "Process CO");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x7131U, 0x7132U));
-}
-
 TEST_F(ProcessCOTest, ShowsTheMMStateAlone) {
   decode(states(0x7131, 19, 8, 1));
   EXPECT_THAT(entries(), ElementsAre(Pair("MM State", "MM_IDLE")));
@@ -97,21 +92,9 @@ TEST_F(ProcessCOTest, NeedsSixteenBytes) {
   EXPECT_THAT(takeLines(), ElementsAre(warningLine("ProcessCO"), warningLine("ProcessCO")));
 }
 
-TEST_F(ProcessCOTest, ReportsOtherCodes) {
-  decode(states(0x7130, 1));
-  EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(warningLine("ProcessCO"),
-                                       errorLine("Received an unknown log message: 28976")));
-}
-
 // --- ProcessCS -----------------------------------------------------------------------------------
 
 class ProcessCSTest : public DecoderFixture<ProcessCS> {};
-
-TEST_F(ProcessCSTest, HasItsNameAndCodes) {
-  EXPECT_EQ(decoder.getSectionName(), "Process CS");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x7131U, 0x7132U));
-}
 
 TEST_F(ProcessCSTest, ShowsStateSubStateAndUpdateStatus) {
   decode(states(0x7131, 19, 8, 1));
@@ -157,20 +140,9 @@ TEST_F(ProcessCSTest, NeedsSixteenBytes) {
   EXPECT_THAT(entries(), IsEmpty());
 }
 
-TEST_F(ProcessCSTest, ReportsOtherCodes) {
-  decode(states(0x7135, 1));
-  EXPECT_THAT(takeLines(), ElementsAre(warningLine("ProcessCS"),
-                                       errorLine("Received an unknown log message: 28981")));
-}
-
 // --- ProcessPS -----------------------------------------------------------------------------------
 
 class ProcessPSTest : public DecoderFixture<ProcessPS> {};
-
-TEST_F(ProcessPSTest, HasItsNameAndCodes) {
-  EXPECT_EQ(decoder.getSectionName(), "Process PS");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x7130U, 0x7132U));
-}
 
 TEST_F(ProcessPSTest, ShowsTheGMMStates) {
   decode(states(0x7130, 3, 9, 0));
@@ -243,13 +215,6 @@ TEST_F(ProcessPSTest, NeedsSixteenBytes) {
   EXPECT_THAT(entries(), IsEmpty());
 }
 
-TEST_F(ProcessPSTest, ReportsOtherCodes) {
-  decode(states(0x7131, 1));
-  EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(warningLine("ProcessPS"),
-                                       errorLine("Received an unknown log message: 28977")));
-}
-
 // --- ServingPLMN ---------------------------------------------------------------------------------
 
 class ServingPLMNTest : public DecoderFixture<ServingPLMN> {
@@ -266,11 +231,6 @@ class ServingPLMNTest : public DecoderFixture<ServingPLMN> {
   }
   static Dictionary umts() { return serving("kTqCellMonitorRadioAccessTechnologyUMTS"); }
 };
-
-TEST_F(ServingPLMNTest, HasItsNameAndCodes) {
-  EXPECT_EQ(decoder.getSectionName(), "Serving PLMN");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x7135U, 0x7132U, 0xFF0001U));
-}
 
 TEST_F(ServingPLMNTest, ShowsTheNetworkAndItsAreas) {
   decode(network(0x13, 0x00, 0x62).u8(14, 3).u8(18, 0x12).u8(19, 0x34).u8(20, 17));
@@ -329,13 +289,6 @@ TEST_F(ServingPLMNTest, NeedsThirtyTwoBytesOfNetwork) {
 TEST_F(ServingPLMNTest, NeedsSixteenBytesOfSelectionMode) {
   decode(states(0x7132, 0, 1).length(15));
   EXPECT_THAT(entries(), IsEmpty());
-}
-
-TEST_F(ServingPLMNTest, ReportsOtherCodes) {
-  decode(states(0x7131, 0));
-  EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(warningLine("ServingPLMN"),
-                                       errorLine("Received an unknown log message: 28977")));
 }
 
 TEST_F(ServingPLMNTest, ShowsTheFirstListedServingCell) {
@@ -405,11 +358,6 @@ class EquivalentPLMNListTest : public DecoderFixture<EquivalentPLMNList> {
   static PacketBytes networks(unsigned count) { return packet(0x7150).u8(16, count); }
 };
 
-TEST_F(EquivalentPLMNListTest, HasItsNameAndCode) {
-  EXPECT_EQ(decoder.getSectionName(), "Equivalent PLMN List");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x7150U));
-}
-
 TEST_F(EquivalentPLMNListTest, ReadsSixInterleavedDigits) {
   decode(networks(1).u8(17, 2).u8(18, 4).u8(19, 6).u8(20, 5).u8(21, 2).u8(22, 7));
   ASSERT_THAT(list(), SizeIs(1));
@@ -449,13 +397,6 @@ TEST_F(EquivalentPLMNListTest, NeedsSeventeenBytes) {
   decode(networks(1).length(23));
   decode(packet(0x7150).length(16));
   EXPECT_THAT(list(), SizeIs(1));
-}
-
-TEST_F(EquivalentPLMNListTest, ReportsOtherCodes) {
-  decode(networks(1).bytes(), 0x7135);
-  EXPECT_THAT(list(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(warningLine("EquivalentPLMNList"),
-                                       errorLine("Received an unknown log message: 28981")));
 }
 
 }  // namespace

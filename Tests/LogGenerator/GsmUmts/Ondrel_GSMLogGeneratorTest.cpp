@@ -1,62 +1,61 @@
 // SPDX-License-Identifier: MIT
 #include "LogGenerator/GsmUmts/Ondrel_GSMClassIndex.h"
 #include "LogGenerator/GsmUmts/Ondrel_GSMLogGenerator.h"
-#include "Platform/Bundle.h"
 #include "Platform/TelephonyService.h"
+#include "Tests/LogGenerator/Ondrel/DecoderRows.h"
 #include "Tests/Support/CountingPropertyListCoding.h"
 #include "Tests/Support/DecoderFixture.h"
+#include "Tests/Support/ProgramTemplates.h"
 
 namespace kestro::testing {
 namespace {
 
 using ::testing::ElementsAre;
-using ::testing::ElementsAreArray;
 using ::testing::IsEmpty;
 using ::testing::SizeIs;
 using ::testing::StartsWith;
 
-struct SectionRow {
-  const char* name;
-  const char* className;
-  SectionKind kind;
-  std::vector<LogCode> codes;
-};
-
-constexpr SectionKind kList = SectionKind::List;
-constexpr SectionKind kDictionary = SectionKind::Dictionary;
-
 /// The decoders in the order in which they are made.
-const std::vector<SectionRow>& rows() {
-  static const std::vector<SectionRow> kRows = {
-      {"Active Set", "ActiveSet", kList, {0x417A}},
-      {"Coding Scheme", "CodingScheme", kDictionary, {}},
+const std::vector<DecoderRow>& rows() {
+  static const std::vector<DecoderRow> kRows = {
+      {"Active Set", kList, "ActiveSet", kReported, {0x417A}},
+      {"Coding Scheme", kDictionary, "CodingScheme", kSilent, {}},
       {"GPRS Information",
-       "GPRSInformation",
        kDictionary,
+       "GPRSInformation",
+       kReported,
        {0x51F5, 0x7135, 0x51F6, 0x51FB, 0x51FD, 0x51F4, 0x5137}},
-      {"GSM Serving Cell", "GSMServingCell", kDictionary, {0x5134, 0x5137, 0x5076, 0xFF0001}},
-      {"Mobile Allocation", "MobileAllocation", kDictionary, {0x51F8}},
-      {"Neighboring Cells", "NeighboringCells", kList, {0x5137, 0x51FF, 0xFF0001}},
-      {"PDP Context Info", "PDPContextList", kList, {0xFF0002}},
-      {"Process PS", "ProcessPS", kDictionary, {0x7130, 0x7132}},
-      {"UMTS RR Measurement", "UMTSRRMeasurement", kDictionary, {}},
-      {"Cell Change Counters", "CellChangeCounters", kDictionary, {}},
-      {"Detected Set", "DetectedSet", kList, {0x417A}},
-      {"GSM Set", "GSMSet", kList, {0x4005}},
-      {"Non-Ranked GSM Set", "NonRankedGSMSet", kList, {}},
-      {"Process CO", "ProcessCO", kDictionary, {0x7131, 0x7132}},
-      {"Serving PLMN", "ServingPLMN", kDictionary, {0x7135, 0x7132, 0xFF0001}},
-      {"UMTS Set", "UMTSSet", kList, {0x4005, 0xFF0001}},
-      {"Equivalent PLMN List", "EquivalentPLMNList", kList, {0x7150}},
-      {"GSM RR Info", "GSMRRInfo", kDictionary, {0x512C, 0x5137, 0x5072, 0x51F6}},
-      {"Monitored Set", "MonitoredSet", kList, {0x417A}},
-      {"Non-Ranked UMTS Set", "NonRankedUMTSSet", kList, {}},
-      {"Process CS", "ProcessCS", kDictionary, {0x7131, 0x7132}},
-      {"UMTS RR Info", "UMTSRRInfo", kDictionary, {0x4125, 0x4031, 0x4127, 0x4157, 0xFF0001}},
-      {"BLER", "BLER", kDictionary, {0x4116}},
-      {"Virtual Active Set", "VirtualActiveSet", kList, {0x417A}},
-      {"SIM Info", "SimInfo", kDictionary, {0xFF0000}},
-      {"HSDPA Info", "HSDPAInformation", kDictionary, {0x4221}},
+      {"GSM Serving Cell",
+       kDictionary,
+       "GSMServingCell",
+       kReported,
+       {0x5134, 0x5137, 0x5076, 0xFF0001}},
+      {"Mobile Allocation", kDictionary, "MobileAllocation", kReported, {0x51F8}},
+      {"Neighboring Cells", kList, "NeighboringCells", kReported, {0x5137, 0x51FF, 0xFF0001}},
+      {"PDP Context Info", kList, "PDPContextList", kSilent, {0xFF0002}},
+      {"Process PS", kDictionary, "ProcessPS", kReported, {0x7130, 0x7132}},
+      {"UMTS RR Measurement", kDictionary, "UMTSRRMeasurement", kSilent, {}},
+      {"Cell Change Counters", kDictionary, "CellChangeCounters", kSilent, {}},
+      {"Detected Set", kList, "DetectedSet", kReported, {0x417A}},
+      {"GSM Set", kList, "GSMSet", kReported, {0x4005}},
+      {"Non-Ranked GSM Set", kList, "NonRankedGSMSet", kSilent, {}},
+      {"Process CO", kDictionary, "ProcessCO", kReported, {0x7131, 0x7132}},
+      {"Serving PLMN", kDictionary, "ServingPLMN", kReported, {0x7135, 0x7132, 0xFF0001}},
+      {"UMTS Set", kList, "UMTSSet", kReported, {0x4005, 0xFF0001}},
+      {"Equivalent PLMN List", kList, "EquivalentPLMNList", kReported, {0x7150}},
+      {"GSM RR Info", kDictionary, "GSMRRInfo", kReported, {0x512C, 0x5137, 0x5072, 0x51F6}},
+      {"Monitored Set", kList, "MonitoredSet", kReported, {0x417A}},
+      {"Non-Ranked UMTS Set", kList, "NonRankedUMTSSet", kSilent, {}},
+      {"Process CS", kDictionary, "ProcessCS", kReported, {0x7131, 0x7132}},
+      {"UMTS RR Info",
+       kDictionary,
+       "UMTSRRInfo",
+       kReported,
+       {0x4125, 0x4031, 0x4127, 0x4157, 0xFF0001}},
+      {"BLER", kDictionary, "BLER", kReported, {0x4116}},
+      {"Virtual Active Set", kList, "VirtualActiveSet", kReported, {0x417A}},
+      {"SIM Info", kDictionary, "SimInfo", kSilent, {0xFF0000}},
+      {"HSDPA Info", kDictionary, "HSDPAInformation", kReported, {0x4221}},
   };
   return kRows;
 }
@@ -75,82 +74,9 @@ class Ondrel_GSMTest : public ::testing::Test {
 
 // --- The index -----------------------------------------------------------------------------------
 
-TEST_F(Ondrel_GSMTest, TheIndexKnowsEverySection) {
+TEST_F(Ondrel_GSMTest, TheIndexHasADecoderForEverySection) {
   const Ondrel_GSMClassIndex index(platform);
-  for (const SectionRow& row : rows()) {
-    const Base* decoder = index.getClass(row.name);
-    ASSERT_NE(decoder, nullptr) << row.name;
-    EXPECT_EQ(decoder->sectionKind(), row.kind) << row.name;
-    EXPECT_THAT(decoder->getLogCodeArray(), ElementsAreArray(row.codes)) << row.name;
-  }
-}
-
-TEST_F(Ondrel_GSMTest, EverySectionIsDescribedAsItsDecoderIsNamed) {
-  constexpr const Section* kDescribed[] = {
-      &kActiveSetSection,
-      &kCodingSchemeSection,
-      &kGPRSInformationSection,
-      &kGSMServingCellSection,
-      &kMobileAllocationSection,
-      &kNeighboringCellsSection,
-      &kPDPContextListSection,
-      &kProcessPSSection,
-      &kUMTSRRMeasurementSection,
-      &kCellChangeCountersSection,
-      &kDetectedSetSection,
-      &kGSMSetSection,
-      &kNonRankedGSMSetSection,
-      &kProcessCOSection,
-      &kServingPLMNSection,
-      &kUMTSSetSection,
-      &kEquivalentPLMNListSection,
-      &kGSMRRInfoSection,
-      &kMonitoredSetSection,
-      &kNonRankedUMTSSetSection,
-      &kProcessCSSection,
-      &kUMTSRRInfoSection,
-      &kBLERSection,
-      &kVirtualActiveSetSection,
-      &kSimInfoSection,
-      &kHSDPAInformationSection,
-  };
-  ASSERT_EQ(std::size(kDescribed), rows().size());
-  for (std::size_t i = 0; i < rows().size(); ++i) {
-    const Section& section = *kDescribed[i];
-    EXPECT_EQ(section.name, rows()[i].name);
-    EXPECT_EQ(section.logLine, rows()[i].className);
-    EXPECT_THAT(section.codes, ElementsAreArray(rows()[i].codes));
-  }
-}
-
-TEST_F(Ondrel_GSMTest, DecodersAreMadeInOrder) {
-  const Ondrel_GSMClassIndex index(platform);
-  std::vector<std::string> counts;
-  for (const SectionRow& row : rows()) {
-    counts.push_back("Array Count: " + std::to_string(row.codes.size()));
-  }
-  EXPECT_THAT(lines(), ElementsAreArray(counts));
-}
-
-TEST_F(Ondrel_GSMTest, SubscribersAreCalledInTheOrderOfTheDecoders) {
-  const Ondrel_GSMClassIndex index(platform);
-  const auto subscribers = [&](LogCode code) {
-    std::vector<std::string_view> names;
-    for (const Base* decoder : *index.getSubscribers(code)) {
-      names.push_back(decoder->getSectionName());
-    }
-    return names;
-  };
-  EXPECT_THAT(subscribers(0x417A),
-              ElementsAre("Active Set", "Detected Set", "Monitored Set", "Virtual Active Set"));
-  EXPECT_THAT(subscribers(0x5137), ElementsAre("GPRS Information", "GSM Serving Cell",
-                                               "Neighboring Cells", "GSM RR Info"));
-  EXPECT_THAT(subscribers(0x7132),
-              ElementsAre("Process PS", "Process CO", "Serving PLMN", "Process CS"));
-  EXPECT_THAT(subscribers(0x4005), ElementsAre("GSM Set", "UMTS Set"));
-  EXPECT_THAT(subscribers(0xFF0001), ElementsAre("GSM Serving Cell", "Neighboring Cells",
-                                                 "Serving PLMN", "UMTS Set", "UMTS RR Info"));
-  EXPECT_EQ(index.getSubscribers(0xB17F), nullptr);
+  expectDecoders(index, platform, rows());
 }
 
 TEST_F(Ondrel_GSMTest, TheIndexLeavesItsLineBeforeTheBasesOne) {
@@ -163,11 +89,7 @@ TEST_F(Ondrel_GSMTest, TheIndexLeavesItsLineBeforeTheBasesOne) {
 
 class Ondrel_GSMLogGeneratorTest : public Ondrel_GSMTest {
  protected:
-  Ondrel_GSMLogGeneratorTest() {
-    const auto displayTemplate = createBundle()->resource("Ondrel_GSM", "plist");
-    EXPECT_TRUE(displayTemplate.has_value());
-    platform.bundle().setResource("Ondrel_GSM.plist", displayTemplate.value_or(Bytes()));
-  }
+  Ondrel_GSMLogGeneratorTest() { addTemplates(platform); }
 
   void receive(const PacketBytes& bytes) { generator->updateStateWithData(state, bytes.bytes()); }
 
@@ -289,10 +211,10 @@ TEST_F(Ondrel_GSMLogGeneratorTest, TheTemplateHasEverySectionOnceAndOfItsKind) {
     for (const auto& entry : group.value.dictionary()) found.emplace_back(entry.key.text());
   }
   std::vector<std::string> expected;
-  for (const SectionRow& row : rows()) {
-    expected.emplace_back(row.name);
-    EXPECT_EQ(section(row.name).isArray(), row.kind == kList) << row.name;
-    EXPECT_EQ(section(row.name).isDictionary(), row.kind == kDictionary) << row.name;
+  for (const DecoderRow& row : rows()) {
+    expected.emplace_back(row.section);
+    EXPECT_EQ(section(row.section).isArray(), row.kind == kList) << row.section;
+    EXPECT_EQ(section(row.section).isDictionary(), row.kind == kDictionary) << row.section;
   }
   EXPECT_THAT(found, ::testing::UnorderedElementsAreArray(expected));
 }

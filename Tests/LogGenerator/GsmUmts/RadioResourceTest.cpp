@@ -18,11 +18,6 @@ class GSMRRInfoTest : public DecoderFixture<GSMRRInfo> {
   }
 };
 
-TEST_F(GSMRRInfoTest, HasItsNameAndCodes) {
-  EXPECT_EQ(decoder.getSectionName(), "GSM RR Info");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0x512CU, 0x5137U, 0x5072U, 0x51F6U));
-}
-
 TEST_F(GSMRRInfoTest, ShowsTheState) {
   decode(state(5).u8(14, 1).u8(15, 255).u8(16, 3));
   EXPECT_THAT(entries(), ElementsAre(Pair("RR State", "RR_IDLE"), Pair("RR Sub State", "1"),
@@ -120,16 +115,6 @@ TEST_F(GSMRRInfoTest, KeepsWhatAPacketDoesNotCarry) {
   decode(measurements().u8(15, 49));
   EXPECT_THAT(entries(), SizeIs(9));
   EXPECT_EQ(text("Serving Rx Level"), "49");
-}
-
-TEST_F(GSMRRInfoTest, ReportsOtherCodes) {
-  for (const auto& [code, line] :
-       {std::pair<LogCode, const char*>{0x5134, "Received an unknown log message: 20788"},
-        {0x51F7, "Received an unknown log message: 20983"}}) {
-    decode(measurements().bytes(), code);
-    EXPECT_THAT(entries(), IsEmpty());
-    EXPECT_THAT(takeLines(), ElementsAre(warningLine("GSMRRInfo"), errorLine(line)));
-  }
 }
 
 }  // namespace

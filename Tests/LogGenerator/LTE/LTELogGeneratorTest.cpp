@@ -6,9 +6,10 @@
 
 #include "LogGenerator/LTE/LTEClassIndex.h"
 #include "LogGenerator/LTE/LTELogGenerator.h"
-#include "Platform/Bundle.h"
 #include "Platform/TelephonyService.h"
+#include "Tests/LogGenerator/Ondrel/DecoderRows.h"
 #include "Tests/Support/DecoderFixture.h"
+#include "Tests/Support/ProgramTemplates.h"
 
 namespace kestro::testing {
 namespace {
@@ -31,9 +32,7 @@ constexpr const char* kSections[] = {"Serving Cell Info",
 
 class LTETest : public ::testing::Test {
  protected:
-  LTETest() {
-    platform.bundle().setResource("LTE.plist", *createBundle()->resource("LTE", "plist"));
-  }
+  LTETest() { addTemplates(platform); }
 
   std::unique_ptr<PropertyListCoding> coding = createPropertyListCoding();
   VirtualPlatform platform{*coding};
@@ -41,41 +40,26 @@ class LTETest : public ::testing::Test {
 
 // --- The index -----------------------------------------------------------------------------------
 
-class LTEClassIndexTest : public LTETest {
- protected:
-  std::vector<std::string_view> subscribers(LogCode code) {
-    std::vector<std::string_view> names;
-    for (const Base* decoder : *index->getSubscribers(code)) {
-      names.push_back(decoder->getSectionName());
-    }
-    return names;
-  }
-
-  std::unique_ptr<LTEClassIndex> index = std::make_unique<LTEClassIndex>(platform);
-};
-
-TEST_F(LTEClassIndexTest, HasADecoderForEverySection) {
-  for (const char* section : kSections) {
-    ASSERT_NE(index->getClass(section), nullptr) << section;
-    EXPECT_EQ(index->getClass(section)->getSectionName(), section);
-  }
+TEST_F(LTETest, TheIndexHasADecoderForEverySection) {
+  const DecoderRow rows[] = {
+      {kSections[0], kDictionary, "LTE Serving Cell Info", kReported, {0xB0C2, 0xB0C1, 0xFF0001}},
+      {kSections[1], kDictionary, kSections[1], kReported, {0xB179}},
+      {kSections[2], kList, kSections[2], kReported, {0xB179}},
+      {kSections[3], kList, kSections[3], kReported, {0xB179}},
+      {kSections[4], kDictionary, kSections[4], kReported, {0xB17F}},
+      {kSections[5], kDictionary, kSections[5], kReported, {0xB180}},
+      {kSections[6], kList, kSections[6], kReported, {0xB180}},
+      {kSections[7], kDictionary, kSections[7], kReported, {0xB186}},
+      {kSections[8], kList, kSections[8], kReported, {0xB186}},
+      {kSections[9], kDictionary, "SimInfo", kSilent, {0xFF0000}},
+      {kSections[10], kList, "PDPContextList", kSilent, {0xFF0002}},
+  };
+  const LTEClassIndex index(platform);
+  expectDecoders(index, platform, rows);
 }
 
-TEST_F(LTEClassIndexTest, HandsPacketsOutInCreationOrder) {
-  EXPECT_THAT(subscribers(0xB0C2), ElementsAre(kSections[0]));
-  EXPECT_THAT(subscribers(0xB0C1), ElementsAre(kSections[0]));
-  EXPECT_THAT(subscribers(0xFF0001), ElementsAre(kSections[0]));
-  EXPECT_THAT(subscribers(0xB179), ElementsAre(kSections[1], kSections[2], kSections[3]));
-  EXPECT_THAT(subscribers(0xB17F), ElementsAre(kSections[4]));
-  EXPECT_THAT(subscribers(0xB180), ElementsAre(kSections[5], kSections[6]));
-  EXPECT_THAT(subscribers(0xB186), ElementsAre(kSections[7], kSections[8]));
-  EXPECT_THAT(subscribers(0xFF0000), ElementsAre(kSections[9]));
-  EXPECT_THAT(subscribers(0xFF0002), ElementsAre(kSections[10]));
-  EXPECT_EQ(index->getSubscribers(0xB178), nullptr);
-}
-
-TEST_F(LTEClassIndexTest, LeavesItsLineBeforeItsBases) {
-  index.reset();
+TEST_F(LTETest, TheIndexLeavesItsLineBeforeTheBasesOne) {
+  { const LTEClassIndex index(platform); }
   EXPECT_THAT(platform.standardOutput().lines(),
               ElementsAre("Deallocing LTEClassIndex", "Deallocing ClassIndex"));
 }
@@ -180,18 +164,13 @@ TEST_F(LTELogGeneratorTest, AnExtraPacketOfCodeTwoCarriesThePacketDataContexts) 
 
 // --- The template --------------------------------------------------------------------------------
 
-struct Placed {
-  std::string group;
-  std::string name;
-  ValueType type;
-  bool operator==(const Placed&) const = default;
-};
-
-std::vector<Placed> placedSections(const Dictionary& display) {
-  std::vector<Placed> placed;
+/// "Group/Section: list" or "Group/Section: dictionary" for every section.
+std::vector<std::string> placedSections(const Dictionary& display) {
+  std::vector<std::string> placed;
   for (const auto& [group, contents] : display) {
     for (const auto& [name, section] : contents.dictionary()) {
-      placed.push_back({std::string(group.text()), std::string(name.text()), section.type()});
+      const char* kind = section.isArray() ? "list" : section.isDictionary() ? "dictionary" : "?";
+      placed.push_back(fmt::format("{}/{}: {}", group.text(), name.text(), kind));
     }
   }
   return placed;
@@ -199,21 +178,18 @@ std::vector<Placed> placedSections(const Dictionary& display) {
 
 TEST_F(LTELogGeneratorTest, TheTemplateHoldsEverySectionWhereAnEngineerLooksForIt) {
   EXPECT_FALSE(generator->generateLogUsingState(state).isDictionary());
-  constexpr ValueType kDictionaryValue = ValueType::Dictionary;
-  constexpr ValueType kArrayValue = ValueType::Array;
   EXPECT_EQ(display()["_sorted"], Value("_sorted"));
-  EXPECT_EQ(placedSections(display()),
-            (std::vector<Placed>{{"01;Serving Cell", kSections[0], kDictionaryValue},
-                                 {"01;Serving Cell", kSections[4], kDictionaryValue},
-                                 {"01;Serving Cell", kSections[1], kDictionaryValue},
-                                 {"02;Neighbors", kSections[2], kArrayValue},
-                                 {"02;Neighbors", kSections[3], kArrayValue},
-                                 {"02;Neighbors", kSections[5], kDictionaryValue},
-                                 {"02;Neighbors", kSections[6], kArrayValue},
-                                 {"03;Reselection", kSections[7], kDictionaryValue},
-                                 {"03;Reselection", kSections[8], kArrayValue},
-                                 {"04;SIM", kSections[9], kDictionaryValue},
-                                 {"05;Packet Data", kSections[10], kArrayValue}}));
+  EXPECT_THAT(
+      placedSections(display()),
+      ElementsAre("01;Serving Cell/Serving Cell Info: dictionary",
+                  "01;Serving Cell/Serving Cell Measurements: dictionary",
+                  "01;Serving Cell/Connected mode LTE Intra-frequency Measurement: dictionary",
+                  "02;Neighbors/Measured Neighbor Cells: list", "02;Neighbors/Detected Cells: list",
+                  "02;Neighbors/Neighbor Measurements: dictionary",
+                  "02;Neighbors/Neighbor Cells List: list",
+                  "03;Reselection/Reselection Candidates: dictionary",
+                  "03;Reselection/Reselection Candidates List: list", "04;SIM/SIM Info: dictionary",
+                  "05;Packet Data/PDP Context Info: list"));
 }
 
 TEST_F(LTELogGeneratorTest, CataloguesEveryCodeOfEverySection) {

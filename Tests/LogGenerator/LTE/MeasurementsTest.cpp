@@ -35,11 +35,6 @@ PacketBytes intraFrequency() {
 
 class ConnectedModeMeasurementMiscTest : public DecoderFixture<ConnectedModeMeasurementMisc> {};
 
-TEST_F(ConnectedModeMeasurementMiscTest, HasItsNameAndCode) {
-  EXPECT_EQ(decoder.getSectionName(), "Connected mode LTE Intra-frequency Measurement");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xB179U));
-}
-
 TEST_F(ConnectedModeMeasurementMiscTest, ShowsTheServingCell) {
   decode(intraFrequency());
   // 165 / 4 - 140, 83 / 8 - 20 = -9.625, whose tie goes to the even digit.
@@ -76,20 +71,7 @@ TEST_F(ConnectedModeMeasurementMiscTest, NeedsTwentyNineBytes) {
               ElementsAre(warningLine("Connected mode LTE Intra-frequency Measurement")));
 }
 
-TEST_F(ConnectedModeMeasurementMiscTest, ReportsOtherCodes) {
-  decode(intraFrequency().bytes(), 0xB17F);
-  EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(),
-              ElementsAre(warningLine("Connected mode LTE Intra-frequency Measurement"),
-                          errorLine("Received an unknown log message: 45439")));
-}
-
 class MeasuredNeighborCellsTest : public DecoderFixture<MeasuredNeighborCells> {};
-
-TEST_F(MeasuredNeighborCellsTest, HasItsNameAndCode) {
-  EXPECT_EQ(decoder.getSectionName(), "Measured Neighbor Cells");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xB179U));
-}
 
 TEST_F(MeasuredNeighborCellsTest, ShowsEveryNeighbor) {
   decode(intraFrequency());
@@ -139,21 +121,7 @@ TEST_F(MeasuredNeighborCellsTest, RecordsPastTheEndReadAsZero) {
                           Pair("Filtered RSRQ", "-20.00 dB")));
 }
 
-TEST_F(MeasuredNeighborCellsTest, ReportsOtherCodes) {
-  decode(intraFrequency());
-  takeLines();
-  decode(intraFrequency().bytes(), 0xFFB179);
-  EXPECT_THAT(list(), SizeIs(2));
-  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Measured Neighbor Cells"),
-                                       errorLine("Received an unknown log message: 16757113")));
-}
-
 class DetectedCellsTest : public DecoderFixture<DetectedCells> {};
-
-TEST_F(DetectedCellsTest, HasItsNameAndCode) {
-  EXPECT_EQ(decoder.getSectionName(), "Detected Cells");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xB179U));
-}
 
 TEST_F(DetectedCellsTest, ShowsTheCellsBehindTheMeasuredOnes) {
   decode(intraFrequency());
@@ -187,15 +155,6 @@ TEST_F(DetectedCellsTest, NeedsTwentyNineBytes) {
   EXPECT_THAT(list(), SizeIs(3));
 }
 
-TEST_F(DetectedCellsTest, ReportsOtherCodes) {
-  decode(intraFrequency());
-  takeLines();
-  decode(intraFrequency().bytes(), 0xB17A);
-  EXPECT_THAT(list(), SizeIs(3));
-  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Detected Cells"),
-                                       errorLine("Received an unknown log message: 45434")));
-}
-
 // --- 0xB17F: serving-cell measurement ------------------------------------------------------------
 
 class ServingCellMeasurementTest : public DecoderFixture<ServingCellMeasurement> {
@@ -215,11 +174,6 @@ class ServingCellMeasurementTest : public DecoderFixture<ServingCellMeasurement>
     return text(key);
   }
 };
-
-TEST_F(ServingCellMeasurementTest, HasItsNameAndCode) {
-  EXPECT_EQ(decoder.getSectionName(), "Serving Cell Measurements");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xB17FU));
-}
 
 TEST_F(ServingCellMeasurementTest, ShowsEveryFieldInOrder) {
   decode(measurement());
@@ -307,13 +261,6 @@ TEST_F(ServingCellMeasurementTest, OverwritesItsKeysInPlace) {
   EXPECT_EQ(text("Measured RSRP"), "-140.00 dBm");
 }
 
-TEST_F(ServingCellMeasurementTest, ReportsOtherCodes) {
-  decode(measurement().bytes(), 0xB180);
-  EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Serving Cell Measurements"),
-                                       errorLine("Received an unknown log message: 45440")));
-}
-
 // --- 0xB180: neighbour measurements --------------------------------------------------------------
 
 /// A header and two neighbours; the 16 bits at 19 hold Qrxlevmin and the count less one.
@@ -337,11 +284,6 @@ PacketBytes neighbors() {
 
 class NeighborMeasurementMiscTest : public DecoderFixture<NeighborMeasurementMisc> {};
 
-TEST_F(NeighborMeasurementMiscTest, HasItsNameAndCode) {
-  EXPECT_EQ(decoder.getSectionName(), "Neighbor Measurements");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xB180U));
-}
-
 TEST_F(NeighborMeasurementMiscTest, ShowsTheHeader) {
   decode(neighbors());
   EXPECT_THAT(entries(), ElementsAre(Pair("Version", "2"), Pair("E-ARFCN", "6300"),
@@ -361,18 +303,7 @@ TEST_F(NeighborMeasurementMiscTest, NeedsTwentyOneBytes) {
   EXPECT_EQ(text("Version"), "2");
 }
 
-TEST_F(NeighborMeasurementMiscTest, ReportsOtherCodes) {
-  decode(neighbors().bytes(), 0xB179);
-  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Neighbor Measurements"),
-                                       errorLine("Received an unknown log message: 45433")));
-}
-
 class NeighborCellsListTest : public DecoderFixture<NeighborCellsList> {};
-
-TEST_F(NeighborCellsListTest, HasItsNameAndCode) {
-  EXPECT_EQ(decoder.getSectionName(), "Neighbor Cells List");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xB180U));
-}
 
 TEST_F(NeighborCellsListTest, ShowsEveryNeighbor) {
   decode(neighbors());
@@ -457,13 +388,6 @@ TEST_F(NeighborCellsListTest, NeedsTwentyOneBytes) {
   decode(neighbors().length(20));
   EXPECT_THAT(list(), SizeIs(2));
   EXPECT_THAT(takeLines(), ElementsAre(warningLine("Neighbor Cells List")));
-}
-
-TEST_F(NeighborCellsListTest, ReportsOtherCodes) {
-  decode(neighbors().bytes(), 0xB181);
-  EXPECT_THAT(list(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Neighbor Cells List"),
-                                       errorLine("Received an unknown log message: 45441")));
 }
 
 }  // namespace

@@ -27,11 +27,6 @@ PacketBytes candidate(unsigned technology) {
 
 class ReselectionCandidatesMiscTest : public DecoderFixture<ReselectionCandidatesMisc> {};
 
-TEST_F(ReselectionCandidatesMiscTest, HasItsNameAndCode) {
-  EXPECT_EQ(decoder.getSectionName(), "Reselection Candidates");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xB186U));
-}
-
 TEST_F(ReselectionCandidatesMiscTest, ShowsTheHeader) {
   decode(candidate(0));
   EXPECT_THAT(entries(), ElementsAre(Pair("Version", "3"), Pair("Serving EARFCN", "1300"),
@@ -47,19 +42,7 @@ TEST_F(ReselectionCandidatesMiscTest, NeedsTwentyOneBytes) {
   EXPECT_EQ(text("Version"), "3");
 }
 
-TEST_F(ReselectionCandidatesMiscTest, ReportsOtherCodes) {
-  decode(candidate(0).bytes(), 0xB187);
-  EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Reselection Candidates"),
-                                       errorLine("Received an unknown log message: 45447")));
-}
-
 class ReselectionCandidatesListTest : public DecoderFixture<ReselectionCandidatesList> {};
-
-TEST_F(ReselectionCandidatesListTest, HasItsNameAndCode) {
-  EXPECT_EQ(decoder.getSectionName(), "Reselection Candidates List");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xB186U));
-}
 
 TEST_F(ReselectionCandidatesListTest, ShowsAnLTECandidate) {
   decode(candidate(0));
@@ -172,13 +155,6 @@ TEST_F(ReselectionCandidatesListTest, NeedsTwentyOneBytes) {
   decode(candidate(0));
   decode(candidate(0).u16(19, 0).length(20));
   EXPECT_THAT(list(), SizeIs(1));
-}
-
-TEST_F(ReselectionCandidatesListTest, ReportsOtherCodes) {
-  decode(candidate(0).bytes(), 0xB185);
-  EXPECT_THAT(list(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Reselection Candidates List"),
-                                       errorLine("Received an unknown log message: 45445")));
 }
 
 }  // namespace

@@ -35,11 +35,6 @@ class LTEServingCellInfoTest : public DecoderFixture<LTEServingCellInfo> {
   }
 };
 
-TEST_F(LTEServingCellInfoTest, HasItsNameAndCodes) {
-  EXPECT_EQ(decoder.getSectionName(), "Serving Cell Info");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xB0C2U, 0xB0C1U, 0xFF0001U));
-}
-
 TEST_F(LTEServingCellInfoTest, ShowsTheSystemInformation) {
   decode(systemInformation());
   EXPECT_THAT(entries(),
@@ -92,13 +87,6 @@ TEST_F(LTEServingCellInfoTest, NeedsTwentyTwoBytesOfAntennas) {
   decode(packet(0xB0C1).u8(20, 2).length(21));
   EXPECT_THAT(entries(), IsEmpty());
   EXPECT_THAT(takeLines(), ElementsAre(warningLine("LTE Serving Cell Info")));
-}
-
-TEST_F(LTEServingCellInfoTest, ReportsOtherCodes) {
-  decode(packet(0xB0C3).length(60));
-  EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(warningLine("LTE Serving Cell Info"),
-                                       errorLine("Received an unknown log message: 45251")));
 }
 
 TEST_F(LTEServingCellInfoTest, ShowsTheServingCellOfTheCellMonitor) {

@@ -31,11 +31,6 @@ class SimInfoTest : public DecoderFixture<SimInfo> {
   }
 };
 
-TEST_F(SimInfoTest, HasItsNameAndCode) {
-  EXPECT_EQ(decoder.getSectionName(), "SIM Info");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xFF0000U));
-}
-
 TEST_F(SimInfoTest, ShowsEveryFileInOrder) {
   decodeList(kSimFilesCode, files());
   EXPECT_THAT(entries(),
@@ -123,11 +118,6 @@ TEST_F(SimInfoTest, IsCataloguedWithAllItsKeys) {
 // --- PDPContextList ------------------------------------------------------------------------------
 
 class PDPContextListTest : public DecoderFixture<PDPContextList> {};
-
-TEST_F(PDPContextListTest, HasItsNameAndCode) {
-  EXPECT_EQ(decoder.getSectionName(), "PDP Context Info");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xFF0002U));
-}
 
 TEST_F(PDPContextListTest, ShowsTheElementsAsTheyAre) {
   const Array contexts{Dictionary{{"APN", "internet"}, {"State", Value::integer(1)}}, "text"};

@@ -25,12 +25,6 @@ class UTRANNeighborsTest : public DecoderFixture<UTRANNeighbhorMeasurements> {
   static PacketBytes withLastByte(unsigned byte) { return oneNeighbor().u8(171, byte); }
 };
 
-TEST_F(UTRANNeighborsTest, HasItsNameAndCode) {
-  EXPECT_EQ(decoder.getSectionName(), "Neighbor Cell List");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xD00AU));
-  EXPECT_EQ(decoder.sectionKind(), SectionKind::List);
-}
-
 TEST_F(UTRANNeighborsTest, ShowsANeighbor) {
   decode(oneNeighbor());
   ASSERT_THAT(list(), SizeIs(1));
@@ -112,12 +106,6 @@ TEST_F(UTRANNeighborsTest, NeedsTwentyOneBytes) {
   EXPECT_THAT(list(), IsEmpty());
 }
 
-TEST_F(UTRANNeighborsTest, IgnoresOtherCodesSilently) {
-  decode(oneNeighbor().bytes(), 0xD00E);
-  EXPECT_THAT(list(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(warningLine("NeighbhorMeasurements List")));
-}
-
 // --- 0xD00E: GSM neighbours ----------------------------------------------------------------------
 
 class GSMNeighborsTest : public DecoderFixture<GSMNeighbhorMeasurements> {
@@ -148,12 +136,6 @@ class GSMNeighborsTest : public DecoderFixture<GSMNeighbhorMeasurements> {
     return result;
   }
 };
-
-TEST_F(GSMNeighborsTest, HasItsNameAndCode) {
-  EXPECT_EQ(decoder.getSectionName(), "GSM Neighbor Cell List");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xD00EU));
-  EXPECT_EQ(decoder.sectionKind(), SectionKind::List);
-}
 
 TEST_F(GSMNeighborsTest, IsEmptiedByEveryPacket) {
   list().append("before");
@@ -188,13 +170,6 @@ TEST_F(GSMNeighborsTest, NeedsSeventeenBytes) {
   EXPECT_THAT(list(), SizeIs(1));
 }
 
-TEST_F(GSMNeighborsTest, IgnoresOtherCodesSilently) {
-  list().append("before");
-  decode(twoNeighbors().bytes(), 0xD00C);
-  EXPECT_THAT(list(), SizeIs(1));
-  EXPECT_THAT(takeLines(), ElementsAre(warningLine("GSM Neighbor Cell List")));
-}
-
 // --- 0xD00C: transport channels ------------------------------------------------------------------
 
 class TRCHBLERTest : public DecoderFixture<TRCHBLERMeasurement> {
@@ -204,12 +179,6 @@ class TRCHBLERTest : public DecoderFixture<TRCHBLERMeasurement> {
     return packet(0xD00C).u16(14, 2U << 6).u8(17, 1).u8(18, 30).u8(19, 255).u8(20, 254);
   }
 };
-
-TEST_F(TRCHBLERTest, HasItsNameAndCode) {
-  EXPECT_EQ(decoder.getSectionName(), "TRCH BLER");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xD00CU));
-  EXPECT_EQ(decoder.sectionKind(), SectionKind::List);
-}
 
 TEST_F(TRCHBLERTest, ShowsEveryChannel) {
   decode(twoChannels());
@@ -247,12 +216,6 @@ TEST_F(TRCHBLERTest, NeedsSeventeenBytes) {
   EXPECT_THAT(list(), IsEmpty());
 }
 
-TEST_F(TRCHBLERTest, IgnoresOtherCodesSilently) {
-  decode(twoChannels().bytes(), 0xD00A);
-  EXPECT_THAT(list(), IsEmpty());
-  EXPECT_THAT(takeLines(), SizeIs(1));
-}
-
 class CCTRCHSIRTest : public DecoderFixture<CCTRCHSIRMeasurement> {
  protected:
   /// One transport channel and one coded composite one: 289 + 34 = 323.
@@ -278,12 +241,6 @@ class CCTRCHSIRTest : public DecoderFixture<CCTRCHSIRMeasurement> {
     return texts;
   }
 };
-
-TEST_F(CCTRCHSIRTest, HasItsNameAndCode) {
-  EXPECT_EQ(decoder.getSectionName(), "CCTRCH SIR");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xD00CU));
-  EXPECT_EQ(decoder.sectionKind(), SectionKind::List);
-}
 
 TEST_F(CCTRCHSIRTest, ShowsAChannelWithItsSixRatios) {
   decode(oneOfEach());
@@ -327,12 +284,6 @@ TEST_F(CCTRCHSIRTest, NeedsSeventeenBytes) {
   EXPECT_THAT(list(), SizeIs(1));
   decode(oneOfEach().u8(15, 0).length(17));
   EXPECT_THAT(list(), IsEmpty());
-}
-
-TEST_F(CCTRCHSIRTest, IgnoresOtherCodesSilently) {
-  decode(oneOfEach().bytes(), 0xD00E);
-  EXPECT_THAT(list(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(warningLine("CCTRCH SIR Measurement")));
 }
 
 }  // namespace

@@ -21,12 +21,6 @@ class RRCStateTest : public DecoderFixture<RRC_State> {
   }
 };
 
-TEST_F(RRCStateTest, HasItsNameAndCode) {
-  EXPECT_EQ(decoder.getSectionName(), "RRC Info");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xD0E0U));
-  EXPECT_EQ(decoder.sectionKind(), SectionKind::Dictionary);
-}
-
 TEST_F(RRCStateTest, ShowsTheMode) {
   decode(state(1, 3));
   EXPECT_THAT(entries(), ElementsAre(Pair("State", "Cell DCH")));

@@ -33,12 +33,6 @@ class UTRANServingCellInfoTest : public DecoderFixture<UTRANServingCellInfo> {
   }
 };
 
-TEST_F(UTRANServingCellInfoTest, HasItsNameAndCodes) {
-  EXPECT_EQ(decoder.getSectionName(), "Serving Cell Info");
-  EXPECT_THAT(decoder.getLogCodeArray(), ElementsAre(0xD0E2U, 0xFF0001U));
-  EXPECT_EQ(decoder.sectionKind(), SectionKind::Dictionary);
-}
-
 TEST_F(UTRANServingCellInfoTest, ShowsTheSystemInformation) {
   decode(systemInformation());
   EXPECT_THAT(entries(),
@@ -162,12 +156,6 @@ TEST_F(UTRANServingCellInfoTest, PassesOverAnEmptyListAndOverARootThatIsNone) {
   EXPECT_THAT(entries(), IsEmpty());
   EXPECT_THAT(takeLines(),
               ElementsAre(warningLine("Serving Cell Info"), warningLine("Serving Cell Info")));
-}
-
-TEST_F(UTRANServingCellInfoTest, IgnoresOtherCodesSilently) {
-  decode(systemInformation().bytes(), 0xD0E0);
-  EXPECT_THAT(entries(), IsEmpty());
-  EXPECT_THAT(takeLines(), ElementsAre(warningLine("Serving Cell Info")));
 }
 
 }  // namespace

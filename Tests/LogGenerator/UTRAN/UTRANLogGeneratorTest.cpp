@@ -5,10 +5,12 @@
 #include <string>
 #include <vector>
 
+#include "LogGenerator/UTRAN/UTRANClassIndex.h"
 #include "LogGenerator/UTRAN/UTRANLogGenerator.h"
 #include "Platform/Linux/LinuxPlatform.h"
 #include "Platform/PropertyListCoding.h"
 #include "Platform/Virtual/VirtualPlatform.h"
+#include "Tests/LogGenerator/Ondrel/DecoderRows.h"
 #include "Tests/Support/PacketBytes.h"
 
 namespace kestro::testing {
@@ -17,7 +19,6 @@ namespace {
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 using ::testing::Pair;
-using Line = RecordingSystemLog::Line;
 
 const Value kSections = Dictionary{{"RRC Info", Dictionary()},
                                    {"Serving Cell Info", Dictionary()},
@@ -57,6 +58,21 @@ class UTRANLogGeneratorTest : public ::testing::Test {
   std::unique_ptr<UTRANLogGenerator> generator;
   Dictionary state;
 };
+
+TEST_F(UTRANLogGeneratorTest, TheIndexHasADecoderForEverySection) {
+  const DecoderRow rows[] = {
+      {"RRC Info", kDictionary, "RRC Info", kSilent, {0xD0E0}},
+      {"Serving Cell Info", kDictionary, "Serving Cell Info", kSilent, {0xD0E2, 0xFF0001}},
+      {"Neighbor Cell List", kList, "NeighbhorMeasurements List", kSilent, {0xD00A}},
+      {"GSM Neighbor Cell List", kList, "GSM Neighbor Cell List", kSilent, {0xD00E}},
+      {"TRCH BLER", kList, "TRCH BLER Measurement", kSilent, {0xD00C}, LogPriority::Notice},
+      {"CCTRCH SIR", kList, "CCTRCH SIR Measurement", kSilent, {0xD00C}},
+      {"PDP Context Info", kList, "PDPContextList", kSilent, {0xFF0002}},
+      {"SIM Info", kDictionary, "SimInfo", kSilent, {0xFF0000}},
+  };
+  const UTRANClassIndex index(platform);
+  expectDecoders(index, platform, rows);
+}
 
 TEST_F(UTRANLogGeneratorTest, LogsItsConstructionInOrder) {
   setTemplate("UTRAN.plist");
