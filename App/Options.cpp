@@ -3,30 +3,28 @@
 
 #include <fmt/format.h>
 
-#include <CLI/CLI.hpp>
 #include <QString>
 #include <QStringList>
+#include <utility>
+#include <variant>
+#include <vector>
+
+#include "Options/ArgumentParser.h"
 
 namespace kestro {
 namespace {
 
-constexpr int kWrongUsage = 2;
 constexpr int kSmallestSide = 240;
 constexpr int kLargestSide = 16384;
-constexpr double kDefaultDelay = 5;
 constexpr double kLongestDelay = 86400;
 
-constexpr const char* kDescription =
-    "Shows, live, what the cellular baseband is doing, and saves snapshots of it.";
-constexpr const char* kFooter = R"(Keys:
-  arrows, Page Up and Down, Home, End   move from row to row
+constexpr const char* kKeys =
+    R"(  arrows, Page Up and Down, Home, End   move from row to row
   Enter          opens the row
   Backspace, Escape                     go back
   Ctrl-S         saves a snapshot, where saving is offered
-  Ctrl-C         copies the row as "key<TAB>value"
-
-Examples:
-  kestro --demo --size=390x780
+  Ctrl-C         copies the row as "key<TAB>value")";
+constexpr const char* kExamples = R"(  kestro --demo --size=390x780
   kestro --demo=capture:drive.pcap
   kestro --demo --screenshot=kestro.png --after=5)";
 
@@ -43,45 +41,54 @@ std::optional<QSize> sizeFrom(const std::string& text) {
   return size;
 }
 
-std::string checkSize(const std::string& text) {
+std::string sizeProblem(const std::string& text) {
   if (sizeFrom(text)) return "";
   return fmt::format("'{}' is no size, such as 390x780 ({} to {} each way)", text, kSmallestSide,
                      kLargestSide);
 }
 
-void addWindowOptions(CLI::App& program, Options& options) {
-  program
-      .add_option_function<std::string>(
-          "--size", [&options](const std::string& text) { options.windowSize = sizeFrom(text); },
-          "The window's size in pixels; otherwise it covers the screen")
-      ->check(CLI::Validator(checkSize, ""))
-      ->option_text("WxH");
-  program.add_flag("--plain", options.plain, "Do not mark values that have changed");
-  auto* screenshot =
-      program.add_option("--screenshot", options.screenshot, "Write a picture of the window, end")
-          ->option_text("FILE");
-  program.add_option("--after", options.after, "How long to wait for the picture")
-      ->check(CLI::Range(0.0, kLongestDelay))
-      ->needs(screenshot)
-      ->option_text(fmt::format("SECONDS (default: {})", kDefaultDelay));
+std::vector<OptionRow> windowOptions(Options& options) {
+  return {
+      {.name = "--size",
+       .value = "WxH",
+       .help = "The window's size in pixels; otherwise it covers the screen",
+       .target = &options.size,
+       .problem = sizeProblem},
+      {.name = "--plain", .help = "Do not mark values that have changed", .target = &options.plain},
+      {.name = "--screenshot",
+       .value = "FILE",
+       .help = "Write a picture of the window, end",
+       .target = &options.screenshot},
+      {.name = "--after",
+       .value = "SECONDS",
+       .help = "How long to wait for the picture",
+       .target = &options.after,
+       .range = NumberRange{0, kLongestDelay},
+       .needs = "--screenshot"},
+  };
 }
 
 }  // namespace
 
+std::optional<QSize> Options::windowSize() const { return sizeFrom(size); }
+
+CommandRow Options::program(const Bundle& bundle, Options& options) {
+  CommandRow program{
+      .name = "kestro",
+      .help = "Shows, live, what the cellular baseband is doing, and saves snapshots of it.",
+      .options = {versionOption("kestro", bundle)},
+      .sections = {{.title = "Keys", .text = kKeys}, {.title = "Examples", .text = kExamples}}};
+  for (auto& row : liveOptions(options.live)) program.options.push_back(std::move(row));
+  for (auto& row : windowOptions(options)) program.options.push_back(std::move(row));
+  return program;
+}
+
 std::optional<int> Options::parse(const Bundle& bundle, int argumentCount, char** arguments,
                                   Options& options) {
   options = {};
-  options.after = kDefaultDelay;
-  CLI::App program(kDescription, "kestro");
-  addVersionOption(program, bundle);
-  addLiveOptions(program, options.live);
-  addWindowOptions(program, options);
-  program.footer(kFooter);
-  try {
-    program.parse(argumentCount, arguments);
-  } catch (const CLI::ParseError& error) {
-    return program.exit(error) == 0 ? 0 : kWrongUsage;
-  }
+  const CommandRow rows = program(bundle, options);
+  const auto parsed = parseArguments(rows, argumentCount, arguments);
+  if (const auto* text = std::get_if<OptionsText>(&parsed)) return tell(*text);
   return std::nullopt;
 }
 

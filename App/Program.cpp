@@ -64,7 +64,7 @@ class Run {
       _platform->systemLog().write(LogPriority::Error, made.error().message);
     }
     _platform->setTerminationHandler([this] { finish(kDone, ""); });
-    _app.applicationDidFinishLaunching(*_platform, {.windowSize = _options.windowSize,
+    _app.applicationDidFinishLaunching(*_platform, {.windowSize = _options.windowSize(),
                                                     .plain = _options.plain,
                                                     .connectsAtLaunch = _demo == nullptr});
     if (_demo != nullptr) watchDemo();

@@ -1,15 +1,14 @@
 // SPDX-License-Identifier: MIT
-// Options that several programs have, declared once. What CLI11 refuses of them is wrong usage.
+// Rows that several programs have.
 #pragma once
 
 #include <string>
+#include <string_view>
+#include <vector>
 
+#include "Options/CommandRow.h"
 #include "Platform/Bundle.h"
 #include "Platform/SystemLog.h"
-
-namespace CLI {
-class App;
-}  // namespace CLI
 
 namespace kestro {
 
@@ -20,18 +19,24 @@ struct LiveOptions {
   LogPriority logThreshold = LogPriority::Notice;
 };
 
-/// Declares --server, --demo, which excludes it, and --log-priority. `options`, which holds the
-/// defaults, must live until the arguments are parsed.
-void addLiveOptions(CLI::App& program, LiveOptions& options);
+/// --server, --demo, which excludes it, and --log-priority. `options` holds the defaults.
+[[nodiscard]] std::vector<OptionRow> liveOptions(LiveOptions& options);
 
-/// Declares --log-priority: the number of a LogPriority; `threshold` as above.
-void addLogPriorityOption(CLI::App& program, LogPriority& threshold);
+/// --log-priority: the number of a LogPriority.
+[[nodiscard]] OptionRow logPriorityOption(LogPriority& threshold);
 
-/// Declares --version, which prints the program's name and the bundle's version and asks to end
-/// with 0. `bundle` must live until the arguments are parsed.
-void addVersionOption(CLI::App& program, const Bundle& bundle);
+/// The name of a port.
+[[nodiscard]] OptionRow portNameOption(std::string name, std::string help, std::string& portName);
 
-/// What is wrong with a port's name that somebody typed; empty when nothing is.
-[[nodiscard]] std::string portNameProblem(const std::string& name);
+/// --version: the program's name and the bundle's version.
+[[nodiscard]] OptionRow versionOption(std::string_view program, const Bundle& bundle);
+
+/// Names without a meaning that must be told, as an option's choices.
+template <class Names>
+[[nodiscard]] std::vector<HelpRow> choicesOf(const Names& names) {
+  std::vector<HelpRow> choices;
+  for (const auto& name : names) choices.push_back({std::string(name), ""});
+  return choices;
+}
 
 }  // namespace kestro

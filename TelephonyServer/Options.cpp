@@ -4,11 +4,7 @@
 #include <fmt/format.h>
 #include <fmt/ranges.h>
 
-#include <CLI/CLI.hpp>
-#include <charconv>
-#include <sstream>
 #include <string_view>
-#include <system_error>
 #include <utility>
 #include <vector>
 
@@ -17,7 +13,6 @@
 namespace kestro {
 namespace {
 
-constexpr int kWrongUsage = 2;
 constexpr double kSlowestPlayback = 0.001;
 constexpr double kFastestPlayback = 1e6;
 
@@ -30,95 +25,91 @@ std::string indented(std::string_view text, std::string_view indent) {
   return result;
 }
 
-std::string footer() {
-  std::string text = "Sources:\n";
+constexpr const char* kPlayingText =
+    R"(The source's time passes whether or not a client is connected. When it has ended, the
+server stays: clients keep their channels, and no more messages come.)";
+constexpr const char* kExamples = R"(  kestro-telephonyd
+  kestro-telephonyd --source=capture:drive.pcap --speed=10 --loop
+  kestro-telephonyd --source=drive-test:log.csv --technology=IFX
+  bridge | kestro-telephonyd --source=stream:- --technology=LTE)";
+constexpr const char* kPortsText =
+    R"(Ports live in $KESTRO_PORT_DIR, else $XDG_RUNTIME_DIR/kestro, else /tmp/kestro-<uid>.
+Exit status: 0 ended as asked, 1 nothing could be done, 2 wrong usage.)";
+
+std::string sourcesText() {
+  std::string text;
   for (const auto& kind : sourceKinds()) {
     text += fmt::format("  {}\n{}\n", kind.form, indented(kind.description, "      "));
   }
-  text +=
-      "\nThe source's time passes whether or not a client is connected. When it has ended, the\n"
-      "server stays: clients keep their channels, and no more messages come.\n"
-      "\nExamples:\n"
-      "  kestro-telephonyd\n"
-      "  kestro-telephonyd --source=capture:drive.pcap --speed=10 --loop\n"
-      "  kestro-telephonyd --source=drive-test:log.csv --technology=IFX\n"
-      "  bridge | kestro-telephonyd --source=stream:- --technology=LTE\n"
-      "\nPorts live in $KESTRO_PORT_DIR, else $XDG_RUNTIME_DIR/kestro, else /tmp/kestro-<uid>.\n"
-      "Exit status: 0 ended as asked, 1 nothing could be done, 2 wrong usage.";
   return text;
 }
 
-/// What is wrong with a speed; nothing when it is none. (A range check alone accepts "nan".)
-std::string speedProblem(const std::string& text) {
-  double speed = 0;
-  const char* end = text.data() + text.size();
-  const auto [stop, error] = std::from_chars(text.data(), end, speed);
-  const bool isNumber = error == std::errc() && stop == end;
-  if (isNumber && speed >= kSlowestPlayback && speed <= kFastestPlayback) return {};
-  return fmt::format("{} is not a number from {} to {:.0f}", text, kSlowestPlayback,
-                     kFastestPlayback);
+std::vector<OptionRow> sourceOptions(ServerArguments& arguments) {
+  return {
+      {.name = "--source",
+       .value = "KIND[:ARGUMENT]",
+       .help = "Where the messages come from (below)",
+       .target = &arguments.source},
+      {.name = "--technology",
+       .value = "NAME",
+       .help = fmt::format("What the messages are, whatever the source says:\n{}",
+                           fmt::join(technologyChoices(), ", ")),
+       .target = &arguments.technology,
+       .choices = choicesOf(technologyChoices())},
+      {.name = "--speed",
+       .value = "X",
+       .help = "Seconds of the source in one second",
+       .target = &arguments.options.playback.speed,
+       .range = NumberRange{kSlowestPlayback, kFastestPlayback}},
+      {.name = "--loop",
+       .help = "Begin again when the source has ended",
+       .target = &arguments.options.playback.loop},
+  };
 }
 
-/// The command line's texts, before they are understood.
-struct Texts {
-  std::string source = std::string(sourceKinds().front().name);
-  std::string technology;
-  int parent = 0;
-};
-
-void declare(CLI::App& app, ServerOptions& options, Texts& texts) {
-  const std::vector<std::string> technologies(technologyChoices().begin(),
-                                              technologyChoices().end());
-  app.add_option("--source", texts.source, "Where the messages come from (below)")
-      ->option_text(fmt::format("KIND[:ARGUMENT] (default: {})", texts.source));
-  app.add_option("--technology", texts.technology,
-                 fmt::format("What the messages are, whatever the source says:\n{}",
-                             fmt::join(technologies, ", ")))
-      ->check(CLI::IsMember(technologies))
-      ->option_text("NAME");
-  app.add_option("--speed", options.playback.speed, "Seconds of the source in one second")
-      ->check(CLI::Validator(speedProblem, ""))
-      ->option_text(fmt::format("X (default: {})", options.playback.speed));
-  app.add_flag("--loop", options.playback.loop, "Begin again when the source has ended");
-  app.add_option("--name", options.portName, "The server's port")
-      ->check(CLI::Validator(portNameProblem, ""))
-      ->option_text(fmt::format("NAME (default: {})", options.portName));
-  addLogPriorityOption(app, options.logThreshold);
-  app.add_option("--exit-with-parent", texts.parent)->expected(0, 1)->group("");
-}
-
-Result<void> understand(const CLI::App& app, const Texts& texts, ServerOptions& options) {
-  auto source = parseSource(texts.source, technologyChosen(texts.technology));
+Result<void> understand(ServerArguments& arguments) {
+  ServerOptions& options = arguments.options;
+  auto source = parseSource(arguments.source, technologyChosen(arguments.technology));
   if (!source) return tl::unexpected(source.error());
   options.source = std::move(*source);
-  options.exitsWithParent = app.count("--exit-with-parent") > 0;
-  if (texts.parent > 0) options.parent = texts.parent;
+  options.exitsWithParent = arguments.parent.has_value();
+  if (arguments.parent > 0) options.parent = arguments.parent;
   return {};
 }
 
 }  // namespace
 
+CommandRow serverProgram(const Bundle& bundle, ServerArguments& arguments) {
+  arguments.source = sourceKinds().front().name;
+  CommandRow program{.name = "kestro-telephonyd",
+                     .help = "Streams the log messages of a phone's baseband to Kestro's displays.",
+                     .options = {versionOption("kestro-telephonyd", bundle)},
+                     .sections = {{.title = "Sources", .text = sourcesText()},
+                                  {.text = kPlayingText},
+                                  {.title = "Examples", .text = kExamples},
+                                  {.text = kPortsText}}};
+  for (auto& row : sourceOptions(arguments)) program.options.push_back(std::move(row));
+  program.options.push_back(
+      portNameOption("--name", "The server's port", arguments.options.portName));
+  program.options.push_back(logPriorityOption(arguments.options.logThreshold));
+  program.options.push_back({.name = "--exit-with-parent",
+                             .value = "PROCESS",
+                             .target = &arguments.parent,
+                             .impliedValue = "",
+                             .isHidden = true});
+  return program;
+}
+
 std::variant<ServerOptions, OptionsText> parseServerOptions(const Bundle& bundle, int argumentCount,
                                                             const char* const* arguments) {
-  CLI::App app("Streams the log messages of a phone's baseband to Kestro's displays.",
-               "kestro-telephonyd");
-  addVersionOption(app, bundle);
-  app.footer(footer());
-  ServerOptions options;
-  Texts texts;
-  declare(app, options, texts);
-  try {
-    app.parse(argumentCount, arguments);
-  } catch (const CLI::ParseError& error) {
-    std::ostringstream out;
-    std::ostringstream err;
-    const int status = app.exit(error, out, err);
-    return OptionsText{out.str() + err.str(), status == 0 ? 0 : kWrongUsage};
-  }
-  if (const auto understood = understand(app, texts, options); !understood) {
+  ServerArguments given;
+  const CommandRow program = serverProgram(bundle, given);
+  const auto parsed = parseArguments(program, argumentCount, arguments);
+  if (const auto* text = std::get_if<OptionsText>(&parsed)) return *text;
+  if (const auto understood = understand(given); !understood) {
     return OptionsText{understood.error().message + "\n", kWrongUsage};
   }
-  return options;
+  return given.options;
 }
 
 }  // namespace kestro

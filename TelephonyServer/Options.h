@@ -6,6 +6,8 @@
 #include <string>
 #include <variant>
 
+#include "Options/ArgumentParser.h"
+#include "Options/CommandRow.h"
 #include "Platform/Bundle.h"
 #include "Platform/SystemLog.h"
 #include "Sources/SourceCatalogue.h"
@@ -25,13 +27,16 @@ struct ServerOptions {
   std::optional<int> parent;
 };
 
-/// What the program has to say instead of running: a help text, its version, or what is wrong with
-/// its command line.
-struct OptionsText {
-  std::string text;
-  /// 0 for help or the version that was asked for, 2 for wrong usage.
-  int exitStatus = 0;
+/// What stands on the command line, before it is understood.
+struct ServerArguments {
+  ServerOptions options;
+  std::string source;
+  std::string technology;
+  std::optional<int> parent;
 };
+
+/// The program's rows, which fill `arguments` when they are parsed; both must live until then.
+[[nodiscard]] CommandRow serverProgram(const Bundle& bundle, ServerArguments& arguments);
 
 /// Reads the command line; the version is the bundle's. Prints nothing.
 [[nodiscard]] std::variant<ServerOptions, OptionsText> parseServerOptions(

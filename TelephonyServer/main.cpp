@@ -2,12 +2,12 @@
 // kestro-telephonyd: the telephony server.
 #include <fmt/format.h>
 
-#include <cstdio>
 #include <string>
 #include <string_view>
 #include <utility>
 #include <variant>
 
+#include "Options/ArgumentParser.h"
 #include "Platform/Linux/LinuxPlatform.h"
 #include "Platform/TextSink.h"
 #include "TelephonyServer/DescriptorLimit.h"
@@ -45,10 +45,7 @@ int serve(LinuxPlatform& platform, const ServerOptions& options) {
 
 int runServer(int argumentCount, const char* const* arguments) {
   const auto parsed = parseServerOptions(*createBundle(), argumentCount, arguments);
-  if (const auto* text = std::get_if<OptionsText>(&parsed)) {
-    std::fputs(text->text.c_str(), text->exitStatus == 0 ? stdout : stderr);
-    return text->exitStatus;
-  }
+  if (const auto* text = std::get_if<OptionsText>(&parsed)) return tell(*text);
   const auto& options = std::get<ServerOptions>(parsed);
   if (options.exitsWithParent && !endWithParent(options.parent)) return 0;
   allowDescriptors(Server::kMaximumDescriptors);

@@ -1,30 +1,22 @@
 // SPDX-License-Identifier: MIT
 #include "CommandLine/Commands/CodesCommand.h"
 
-#include <fmt/format.h>
-#include <fmt/ranges.h>
-
-#include <CLI/CLI.hpp>
 #include <algorithm>
 #include <memory>
 #include <string>
 #include <vector>
 
+#include "CommandLine/Commands/Command.h"
 #include "CommandLine/ExitStatus.h"
 #include "CommandLine/Formats/CodesFormats.h"
 #include "CommandLine/OfflinePlatform.h"
 #include "CommandLine/Output.h"
+#include "Options/ProgramOptions.h"
 
 namespace kestro {
 namespace {
 
-constexpr const char* kCodesFooter = R"(Formats:
-  table     code by code: the packet, its least length, the sections and their keys
-  markdown  a document, with where every key is read and how it is shown
-  json      all of that for programs: an array of technologies
-
-Examples:
-  kestro-cli codes --technology=LTE
+constexpr const char* kCodesExamples = R"(  kestro-cli codes --technology=LTE
   kestro-cli codes --format=json | jq '.[].codes[] | .code + " " + .name')";
 
 struct CodesOptions {
@@ -50,18 +42,18 @@ int runCodes(const CodesOptions& options) {
 
 }  // namespace
 
-Command addCodesCommand(CLI::App& program) {
+CommandRow codesCommand() {
   const auto options = std::make_shared<CodesOptions>();
-  CLI::App* command =
-      program.add_subcommand("codes", "List every log code with its sections and keys");
-  const auto technologies = LogGenerator::technologies();
-  const std::vector<std::string> names(technologies.begin(), technologies.end());
-  command->add_option("--technology", options->technology, "Only the codes of this one")
-      ->check(CLI::IsMember(names))
-      ->option_text(fmt::format("{}", fmt::join(names, "|")));
-  addFormatOption(*command, options->format, formatNames(codesFormats()));
-  command->footer(kCodesFooter);
-  return {command, [options] { return runCodes(*options); }};
+  return {.name = "codes",
+          .help = "List every log code with its sections and keys",
+          .options = {{.name = "--technology",
+                       .help = "Only the codes of this one",
+                       .target = &options->technology,
+                       .choices = choicesOf(LogGenerator::technologies())},
+                      formatOption(options->format, formatRows(codesFormats()))},
+          .sections = {{.title = "Formats", .rows = formatRows(codesFormats())},
+                       {.title = "Examples", .text = kCodesExamples}},
+          .run = [options] { return runCodes(*options); }};
 }
 
 }  // namespace kestro

@@ -2,10 +2,10 @@
 // kestro-cli codes: every log code with its sections and keys.
 #pragma once
 
-#include "CommandLine/Commands/Command.h"
+#include "Options/CommandRow.h"
 
 namespace kestro {
 
-[[nodiscard]] Command addCodesCommand(CLI::App& program);
+[[nodiscard]] CommandRow codesCommand();
 
 }  // namespace kestro

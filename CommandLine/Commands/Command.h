@@ -1,43 +1,37 @@
 // SPDX-License-Identifier: MIT
-// What the parts of kestro-cli have in common.
+// What the commands of kestro-cli have in common: rows, and what becomes of their values.
 #pragma once
 
 #include <chrono>
-#include <functional>
 #include <string>
 #include <vector>
 
-namespace CLI {
-class App;
-class Option;
-}  // namespace CLI
+#include "Options/CommandRow.h"
 
 namespace kestro {
 
-/// One command of the program. Each has a file pair with a function that declares it; the list in
-/// CommandLine.cpp names them.
-struct Command {
-  CLI::App* declaration;     ///< name, options and help; the program owns it
-  std::function<int()> run;  ///< does it with the options that were parsed; returns an ExitStatus
-};
+/// How `decode` and `explain` tell of a recording's messages.
+inline constexpr const char* kTimesAndNumbers =
+    "Times are the capture's, in UTC. Messages are numbered from 1, counting every record.";
 
-/// Declares an option that takes seconds, with fractions, from 0 to a year; `seconds` holds the
-/// default.
-CLI::Option* addSecondsOption(CLI::App& command, const std::string& name, double& seconds,
-                              const std::string& description);
+/// An option that takes seconds, with fractions, from 0 to a year; `seconds` holds the default.
+[[nodiscard]] OptionRow secondsOption(std::string name, std::string help, double& seconds);
 
-/// Declares --format, which takes one of the names; the first is the default.
-CLI::Option* addFormatOption(CLI::App& command, std::string& format,
-                             const std::vector<std::string>& names);
+/// A recorded capture, which must be given.
+[[nodiscard]] OptionRow captureArgument(std::string& path);
 
-/// The names in a list of formats.
+/// The names and explanations in a list of formats.
 template <class Formats>
-[[nodiscard]] std::vector<std::string> formatNames(const Formats& formats) {
-  std::vector<std::string> names;
-  names.reserve(formats.size());
-  for (const auto& format : formats) names.emplace_back(format.name);
-  return names;
+[[nodiscard]] std::vector<HelpRow> formatRows(const Formats& formats) {
+  std::vector<HelpRow> rows;
+  for (const auto& format : formats) {
+    rows.push_back({std::string(format.name), std::string(format.help)});
+  }
+  return rows;
 }
+
+/// --format, which takes one of these names; the first is the default.
+[[nodiscard]] OptionRow formatOption(std::string& format, std::vector<HelpRow> formats);
 
 /// Seconds as a duration, to the microsecond.
 [[nodiscard]] std::chrono::microseconds durationOfSeconds(double seconds);

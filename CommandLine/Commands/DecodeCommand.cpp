@@ -1,13 +1,13 @@
 // SPDX-License-Identifier: MIT
 #include "CommandLine/Commands/DecodeCommand.h"
 
-#include <CLI/CLI.hpp>
 #include <algorithm>
 #include <memory>
 #include <string>
 #include <utility>
 #include <vector>
 
+#include "CommandLine/Commands/Command.h"
 #include "CommandLine/Commands/RecordingFeed.h"
 #include "CommandLine/ExitStatus.h"
 #include "CommandLine/Formats/DecodeWriter.h"
@@ -19,15 +19,7 @@
 namespace kestro {
 namespace {
 
-constexpr const char* kDecodeFooter = R"(Formats:
-  tree    the display after the last message, for people
-  json    one object: "technology", "messages" (how many) and the last "display"
-  ndjson  one line a refresh: "time", "message" (the last one's number) and "display"
-  csv     one line for each value and refresh: time,message,path,value
-Times are the capture's, in UTC. Messages are numbered from 1, counting every record.
-
-Examples:
-  kestro-cli decode drive.pcap
+constexpr const char* kDecodeExamples = R"(  kestro-cli decode drive.pcap
   kestro-cli decode drive.pcap --format=json | jq '.display'
   kestro-cli decode drive.pcap --format=csv --refresh-every=0 > every-message.csv)";
 
@@ -116,21 +108,25 @@ int runDecode(const DecodeOptions& options) {
 
 }  // namespace
 
-Command addDecodeCommand(CLI::App& program) {
+CommandRow decodeCommand() {
   const auto options = std::make_shared<DecodeOptions>();
-  CLI::App* command = program.add_subcommand("decode", "Decode a recorded capture");
-  command->add_option("CAPTURE", options->capture, "The capture, a pcap file")
-      ->required()
-      ->option_text(" ");
-  addFormatOption(*command, options->format, formatNames(decodeFormats()));
-  addSecondsOption(*command, "--refresh-every", options->refreshSeconds,
-                   "The capture's time between refreshes; 0: after every message");
-  command
-      ->add_option("--log-json", options->logFile,
-                   "Write every line of the system log there, as {\"priority\",\"message\"}")
-      ->option_text("FILE");
-  command->footer(kDecodeFooter);
-  return {command, [options] { return runDecode(*options); }};
+  return {.name = "decode",
+          .help = "Decode a recorded capture",
+          .options = {captureArgument(options->capture),
+                      formatOption(options->format, formatRows(decodeFormats())),
+                      secondsOption("--refresh-every",
+                                    "The capture's time between refreshes; 0: after every message",
+                                    options->refreshSeconds),
+                      {.name = "--log-json",
+                       .value = "FILE",
+                       .help = "Write every line of the system log there, as "
+                               "{\"priority\",\"message\"}",
+                       .target = &options->logFile}},
+          .sections = {{.title = "Formats",
+                        .rows = formatRows(decodeFormats()),
+                        .text = kTimesAndNumbers},
+                       {.title = "Examples", .text = kDecodeExamples}},
+          .run = [options] { return runDecode(*options); }};
 }
 
 }  // namespace kestro

@@ -2,10 +2,10 @@
 // kestro-cli decode: a recorded capture as displays.
 #pragma once
 
-#include "CommandLine/Commands/Command.h"
+#include "Options/CommandRow.h"
 
 namespace kestro {
 
-[[nodiscard]] Command addDecodeCommand(CLI::App& program);
+[[nodiscard]] CommandRow decodeCommand();
 
 }  // namespace kestro

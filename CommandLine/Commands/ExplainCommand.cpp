@@ -3,12 +3,13 @@
 
 #include <fmt/format.h>
 
-#include <CLI/CLI.hpp>
 #include <algorithm>
 #include <memory>
+#include <optional>
 #include <string>
 #include <utility>
 
+#include "CommandLine/Commands/Command.h"
 #include "CommandLine/Commands/RecordingFeed.h"
 #include "CommandLine/ExitStatus.h"
 #include "CommandLine/Formats/ExplainWriter.h"
@@ -24,30 +25,24 @@ namespace {
 
 constexpr LogCode kHighestCode = 0xFFFFFF;
 
-constexpr const char* kExplainFooter =
+constexpr const char* kExplainText =
     R"(For every packet: time, log code, name and length; then for every value the section that takes it,
 its row in a list, its key, the bytes that it was read from with their offset, the bits of the
 integer that they make, the raw value and the text that is shown. Offsets count from the packet's
 first byte. A value that was computed has a line for each place; one that comes from a property list
 has its key there instead of bytes. "--" is a byte past the packet's end, which reads as 0; "BE" an
 integer whose most significant byte comes first. A value without a text is not shown; nor is a
-list's count, whose text, if it has one, is the number of records where another number is stored.
+list's count, whose text, if it has one, is the number of records where another number is stored.)";
 
-Formats:
-  table  for people, a table a packet
-  json   one object: "technology" and "messages", one packet a line
-Times are the capture's, in UTC. Messages are numbered from 1, counting every record.
-
-Examples:
-  kestro-cli explain drive.pcap | less
+constexpr const char* kExplainExamples =
+    R"(  kestro-cli explain drive.pcap | less
   kestro-cli explain drive.pcap --message=12
   kestro-cli explain drive.pcap --code=0xB179 --format=json | jq '.messages[].values[].text')";
 
 struct ExplainOptions {
   std::string capture;
-  std::uint64_t message = 0;  ///< 0: every one
-  std::uint32_t code = 0;
-  bool hasCode = false;
+  std::optional<std::uint64_t> message;  ///< absent: every one
+  std::optional<LogCode> code;
   std::string format;
 };
 
@@ -78,11 +73,11 @@ class Explanation {
  private:
   [[nodiscard]] bool isWanted(std::uint64_t nextMessage) const {
     if (!_output.failureMessage().empty()) return false;
-    return _options.message == 0 || nextMessage <= _options.message;
+    return !_options.message || nextMessage <= *_options.message;
   }
 
   void explain(const RecordedMessage& message) {
-    if (_options.message != 0 && message.number != _options.message) return;
+    if (_options.message && message.number != _options.message) return;
     PacketHead head{
         .message = message.number, .time = message.time, .packet = packetOfMessage(message.bytes)};
     head.prefixLength = message.bytes.size() - head.packet.size();
@@ -90,7 +85,7 @@ class Explanation {
       head.code = logCodeOf(PacketView(head.packet));
       head.name = _names->nameOf(*head.code);
     }
-    if (_options.hasCode && head.code != _options.code) return;
+    if (_options.code && head.code != _options.code) return;
     write(head, message.bytes);
   }
 
@@ -113,7 +108,7 @@ class Explanation {
 
   [[nodiscard]] int finish() {
     if (_feed.status() == kExitNothingDone) return kExitNothingDone;
-    const bool isChosen = _options.message != 0 || _options.hasCode;
+    const bool isChosen = _options.message || _options.code;
     if (isChosen && !_hasBegun && _output.failureMessage().empty()) return fail(nothingFound());
     begin();
     _writer->finish();
@@ -124,8 +119,8 @@ class Explanation {
 
   [[nodiscard]] std::string nothingFound() const {
     std::string what = "no message";
-    if (_options.message != 0) what += fmt::format(" {}", _options.message);
-    if (_options.hasCode) what += fmt::format(" of log code {}", logCodeText(_options.code));
+    if (_options.message) what += fmt::format(" {}", *_options.message);
+    if (_options.code) what += fmt::format(" of log code {}", logCodeText(*_options.code));
     return fmt::format("{}: there is {}", _options.capture, what);
   }
 
@@ -159,26 +154,28 @@ int runExplain(const ExplainOptions& options) {
 
 }  // namespace
 
-Command addExplainCommand(CLI::App& program) {
+CommandRow explainCommand() {
   const auto options = std::make_shared<ExplainOptions>();
-  CLI::App* command = program.add_subcommand(
-      "explain", "Tell which bytes every value of a recorded packet comes from");
-  command->add_option("CAPTURE", options->capture, "The capture, a pcap file")
-      ->required()
-      ->option_text(" ");
-  command->add_option("--message", options->message, "Only the message of this number")
-      ->check(CLI::PositiveNumber)
-      ->option_text("N");
-  const CLI::Option* code =
-      command->add_option("--code", options->code, "Only packets of this log code")
-          ->check(CLI::Range(LogCode{0}, kHighestCode))
-          ->option_text("CODE");
-  addFormatOption(*command, options->format, formatNames(explainFormats()));
-  command->footer(kExplainFooter);
-  return {command, [options, code] {
-            options->hasCode = !code->empty();
-            return runExplain(*options);
-          }};
+  return {.name = "explain",
+          .help = "Tell which bytes every value of a recorded packet comes from",
+          .options = {captureArgument(options->capture),
+                      {.name = "--message",
+                       .value = "N",
+                       .help = "Only the message of this number",
+                       .target = &options->message,
+                       .range = NumberRange{1}},
+                      {.name = "--code",
+                       .value = "CODE",
+                       .help = "Only packets of this log code",
+                       .target = &options->code,
+                       .range = NumberRange{0, kHighestCode}},
+                      formatOption(options->format, formatRows(explainFormats()))},
+          .sections = {{.text = kExplainText},
+                       {.title = "Formats",
+                        .rows = formatRows(explainFormats()),
+                        .text = kTimesAndNumbers},
+                       {.title = "Examples", .text = kExplainExamples}},
+          .run = [options] { return runExplain(*options); }};
 }
 
 }  // namespace kestro

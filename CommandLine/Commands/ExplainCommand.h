@@ -2,10 +2,10 @@
 // kestro-cli explain: where every value of a recorded packet comes from.
 #pragma once
 
-#include "CommandLine/Commands/Command.h"
+#include "Options/CommandRow.h"
 
 namespace kestro {
 
-[[nodiscard]] Command addExplainCommand(CLI::App& program);
+[[nodiscard]] CommandRow explainCommand();
 
 }  // namespace kestro

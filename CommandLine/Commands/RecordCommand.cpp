@@ -1,11 +1,11 @@
 // SPDX-License-Identifier: MIT
 #include "CommandLine/Commands/RecordCommand.h"
 
-#include <CLI/CLI.hpp>
 #include <memory>
 #include <string>
 #include <utility>
 
+#include "CommandLine/Commands/Command.h"
 #include "CommandLine/Commands/LiveRun.h"
 #include "CommandLine/Commands/RecordSession.h"
 #include "CommandLine/ExitStatus.h"
@@ -15,13 +15,12 @@
 namespace kestro {
 namespace {
 
-constexpr const char* kRecordFooter =
+constexpr const char* kRecordText =
     R"(Nothing is decoded. The recording ends with Ctrl-C or after its duration, and goes on over lost
 connections; when the baseband changes its technology it goes on in FILE-2.pcap, FILE-3.pcap and
-so on. Existing files are replaced. Messages of more than 262,144 bytes are dropped and counted.
+so on. Existing files are replaced. Messages of more than 262,144 bytes are dropped and counted.)";
 
-Examples:
-  kestro-cli record -o drive.pcap
+constexpr const char* kRecordExamples = R"(  kestro-cli record -o drive.pcap
   kestro-cli record -o minute.pcap --duration=60 --demo)";
 
 struct RecordOptions {
@@ -63,21 +62,26 @@ class RecordTask : public LiveTask {
 
 }  // namespace
 
-Command addRecordCommand(CLI::App& program) {
+CommandRow recordCommand() {
   const auto options = std::make_shared<RecordOptions>();
-  CLI::App* command = program.add_subcommand("record", "Record the log channel as a capture");
-  command->add_option("-o,--output", options->path, "The capture to write")
-      ->required()
-      ->option_text("FILE.pcap");
-  addSecondsOption(*command, "--duration", options->durationSeconds,
-                   "End after so long; 0: only with Ctrl-C");
-  addLiveOptions(*command, options->live);
-  command->footer(kRecordFooter);
-  return {command, [options] {
-            return runLive(options->live, [&](LinuxPlatform& platform, Finish finish) {
-              return std::make_unique<RecordTask>(*options, platform, std::move(finish));
-            });
-          }};
+  CommandRow command{
+      .name = "record",
+      .help = "Record the log channel as a capture",
+      .options = {{.name = "-o,--output",
+                   .value = "FILE.pcap",
+                   .help = "The capture to write",
+                   .target = &options->path,
+                   .isRequired = true},
+                  secondsOption("--duration", "End after so long; 0: only with Ctrl-C",
+                                options->durationSeconds)},
+      .sections = {{.text = kRecordText}, {.title = "Examples", .text = kRecordExamples}},
+      .run = [options] {
+        return runLive(options->live, [&](LinuxPlatform& platform, Finish finish) {
+          return std::make_unique<RecordTask>(*options, platform, std::move(finish));
+        });
+      }};
+  for (auto& row : liveOptions(options->live)) command.options.push_back(std::move(row));
+  return command;
 }
 
 }  // namespace kestro

@@ -2,10 +2,10 @@
 // kestro-cli record: the log channel as a capture.
 #pragma once
 
-#include "CommandLine/Commands/Command.h"
+#include "Options/CommandRow.h"
 
 namespace kestro {
 
-[[nodiscard]] Command addRecordCommand(CLI::App& program);
+[[nodiscard]] CommandRow recordCommand();
 
 }  // namespace kestro

@@ -3,7 +3,6 @@
 
 #include <fmt/format.h>
 
-#include <CLI/CLI.hpp>
 #include <algorithm>
 #include <filesystem>
 #include <memory>
@@ -11,6 +10,7 @@
 #include <utility>
 #include <vector>
 
+#include "CommandLine/Commands/Command.h"
 #include "CommandLine/Commands/RecordingFeed.h"
 #include "CommandLine/ExitStatus.h"
 #include "CommandLine/Formats/SnapshotText.h"
@@ -28,36 +28,30 @@
 namespace kestro {
 namespace {
 
-constexpr const char* kSnapshotFooter =
+constexpr const char* kSnapshotText =
     R"(A snapshot holds the last five displays with a description and, for binary log channels, their
-packets as a DLF log: what the window saves, in the same format.
-
-Examples:
-  kestro-cli snapshot save drive.pcap -o drive.kestro --description="drop at the tunnel"
+packets as a DLF log: what the window saves, in the same format.)";
+constexpr const char* kSnapshotExamples =
+    R"(  kestro-cli snapshot save drive.pcap -o drive.kestro --description="drop at the tunnel"
   kestro-cli snapshot show drive.kestro
-  kestro-cli snapshot export-dlf drive.kestro -o drive.dlf
+  kestro-cli snapshot export-dlf drive.kestro -o drive.dlf)";
 
-`kestro-cli snapshot ACTION --help` explains an action.)";
-
-constexpr const char* kSaveFooter =
+constexpr const char* kSaveText =
     R"(The capture is replayed with a refresh every 2 s of its time, as `decode` does, and saved as if the
 save button were pressed at its last message: all times in the snapshot are the capture's. An
-existing file is replaced when the snapshot is complete.
+existing file is replaced when the snapshot is complete.)";
+constexpr const char* kSaveExample =
+    R"(  kestro-cli snapshot save drive.pcap -o drive.kestro --description="drop at the tunnel")";
 
-Example:
-  kestro-cli snapshot save drive.pcap -o drive.kestro --description="drop at the tunnel")";
+constexpr const char* kShowExample = "  kestro-cli snapshot show drive.kestro | less";
 
-constexpr const char* kShowFooter = R"(Example:
-  kestro-cli snapshot show drive.kestro | less)";
-
-constexpr const char* kExportFooter =
+constexpr const char* kExportText =
     R"(The DLF log is written as it was saved: of each history entry only the first packet frames, those
 behind it have their type byte in front of their record. With --reframe these bytes (and the 2-byte
 prefixes that some messages have) are left out, so that every packet frames; what is no packet even
-so is named and left out, and the exit status is 3. An existing file is replaced.
-
-Examples:
-  kestro-cli snapshot export-dlf drive.kestro -o drive.dlf
+so is named and left out, and the exit status is 3. An existing file is replaced.)";
+constexpr const char* kExportExamples =
+    R"(  kestro-cli snapshot export-dlf drive.kestro -o drive.dlf
   kestro-cli snapshot export-dlf drive.kestro -o drive.dlf --reframe)";
 
 struct SnapshotOptions {
@@ -152,59 +146,65 @@ int runExport(const SnapshotOptions& options) {
 
 // --- Options
 
-using Options = std::shared_ptr<SnapshotOptions>;
+using SharedOptions = std::shared_ptr<SnapshotOptions>;
 
-void addInput(CLI::App& action, const Options& options, const char* name, const char* what) {
-  action.add_option(name, options->input, what)->required()->option_text(" ");
+OptionRow snapshotArgument(const SharedOptions& options) {
+  return {.name = "FILE", .help = "The snapshot", .target = &options->input, .isRequired = true};
 }
 
-void addOutput(CLI::App& action, const Options& options, const char* what) {
-  action.add_option("-o,--output", options->output, what)->required()->option_text("FILE");
+OptionRow outputOption(const SharedOptions& options, const char* what) {
+  return {.name = "-o,--output",
+          .value = "FILE",
+          .help = what,
+          .target = &options->output,
+          .isRequired = true};
 }
 
-Command addSave(CLI::App& snapshot, const Options& options) {
-  CLI::App* action = snapshot.add_subcommand("save", "Save the end of a capture as a snapshot");
-  addInput(*action, options, "CAPTURE", "The capture, a pcap file");
-  addOutput(*action, options, "The snapshot to write");
-  action->add_option("--description", options->description, "What the snapshot shows; may be empty")
-      ->required()
-      ->expected(0, 1)  // "--description=" is an empty one
-      ->option_text("TEXT");
-  action->footer(kSaveFooter);
-  return {action, [options] { return runSave(*options); }};
+CommandRow saveAction(const SharedOptions& options) {
+  return {.name = "save",
+          .help = "Save the end of a capture as a snapshot",
+          .options = {captureArgument(options->input),
+                      outputOption(options, "The snapshot to write"),
+                      {.name = "--description",
+                       .value = "TEXT",
+                       .help = "What the snapshot shows; may be empty",
+                       .target = &options->description,
+                       .isRequired = true,
+                       .impliedValue = ""}},
+          .sections = {{.text = kSaveText}, {.title = "Example", .text = kSaveExample}},
+          .run = [options] { return runSave(*options); }};
 }
 
-Command addShow(CLI::App& snapshot, const Options& options) {
-  CLI::App* action = snapshot.add_subcommand("show", "Show what a snapshot holds");
-  addInput(*action, options, "FILE", "The snapshot");
-  action->footer(kShowFooter);
-  return {action, [options] { return runShow(*options); }};
+CommandRow showAction(const SharedOptions& options) {
+  return {.name = "show",
+          .help = "Show what a snapshot holds",
+          .options = {snapshotArgument(options)},
+          .sections = {{.title = "Example", .text = kShowExample}},
+          .run = [options] { return runShow(*options); }};
 }
 
-Command addExport(CLI::App& snapshot, const Options& options) {
-  CLI::App* action =
-      snapshot.add_subcommand("export-dlf", "Write a snapshot's packets as a DLF log");
-  addInput(*action, options, "FILE", "The snapshot");
-  addOutput(*action, options, "The DLF log to write");
-  action->add_flag("--reframe", options->reframe, "Leave out the type bytes between the packets");
-  action->footer(kExportFooter);
-  return {action, [options] { return runExport(*options); }};
+CommandRow exportAction(const SharedOptions& options) {
+  return {.name = "export-dlf",
+          .help = "Write a snapshot's packets as a DLF log",
+          .options = {snapshotArgument(options),
+                      outputOption(options, "The DLF log to write"),
+                      {.name = "--reframe",
+                       .help = "Leave out the type bytes between the packets",
+                       .target = &options->reframe}},
+          .sections = {{.text = kExportText}, {.title = "Examples", .text = kExportExamples}},
+          .run = [options] { return runExport(*options); }};
 }
 
 }  // namespace
 
-Command addSnapshotCommand(CLI::App& program) {
+CommandRow snapshotCommand() {
   const auto options = std::make_shared<SnapshotOptions>();
-  CLI::App* command = program.add_subcommand("snapshot", "Save, show and export snapshots");
-  command->require_subcommand(1);
-  const std::vector<Command> actions = {addSave(*command, options), addShow(*command, options),
-                                        addExport(*command, options)};
-  command->footer(kSnapshotFooter);
-  return {command, [actions] {
-            return std::ranges::find_if(
-                       actions, [](const Command& action) { return action.declaration->parsed(); })
-                ->run();
-          }};
+  return {.name = "snapshot",
+          .help = "Save, show and export snapshots",
+          .commands = {saveAction(options), showAction(options), exportAction(options)},
+          .sections = {{.text = kSnapshotText},
+                       {.title = "Examples", .text = kSnapshotExamples},
+                       {.text = "`kestro-cli snapshot ACTION --help` explains an action."}}};
 }
 
 }  // namespace kestro

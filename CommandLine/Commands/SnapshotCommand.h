@@ -2,10 +2,10 @@
 // kestro-cli snapshot: snapshot files from captures, as text, and their packets.
 #pragma once
 
-#include "CommandLine/Commands/Command.h"
+#include "Options/CommandRow.h"
 
 namespace kestro {
 
-[[nodiscard]] Command addSnapshotCommand(CLI::App& program);
+[[nodiscard]] CommandRow snapshotCommand();
 
 }  // namespace kestro

@@ -1,13 +1,13 @@
 // SPDX-License-Identifier: MIT
 #include "CommandLine/Commands/WatchCommand.h"
 
-#include <CLI/CLI.hpp>
 #include <algorithm>
 #include <memory>
 #include <optional>
 #include <string>
 #include <utility>
 
+#include "CommandLine/Commands/Command.h"
 #include "CommandLine/Commands/LiveRun.h"
 #include "CommandLine/Commands/WatchSession.h"
 #include "CommandLine/ExitStatus.h"
@@ -16,15 +16,7 @@
 namespace kestro {
 namespace {
 
-constexpr const char* kWatchFooter = R"(Formats:
-  tree    on a terminal the display in its window, redrawn in place, with the values that
-          changed marked (remarks of the decoders on standard error are not shown there:
-          redirect it to keep them); elsewhere one plain display below the other
-  ndjson  one line a refresh: "time" (UTC) and "display"
-The display refreshes every 2 s while data arrives. Ctrl-C ends it.
-
-Examples:
-  kestro-cli watch --demo
+constexpr const char* kWatchExamples = R"(  kestro-cli watch --demo
   kestro-cli watch --demo=drive-test:drive.csv
   kestro-cli watch --format=ndjson --count=10)";
 
@@ -66,20 +58,28 @@ class WatchTask : public LiveTask {
 
 }  // namespace
 
-Command addWatchCommand(CLI::App& program) {
+CommandRow watchCommand() {
   const auto options = std::make_shared<WatchOptions>();
-  CLI::App* command = program.add_subcommand("watch", "Show the live display");
-  addLiveOptions(*command, options->live);
-  addFormatOption(*command, options->format, formatNames(watchFormats()));
-  command->add_option("--count", options->count, "End after so many refreshes")
-      ->check(CLI::PositiveNumber)
-      ->option_text("N");
-  command->footer(kWatchFooter);
-  return {command, [options] {
-            return runLive(options->live, [&](LinuxPlatform& platform, Finish finish) {
-              return std::make_unique<WatchTask>(*options, platform, std::move(finish));
-            });
-          }};
+  CommandRow command{
+      .name = "watch",
+      .help = "Show the live display",
+      .options = liveOptions(options->live),
+      .sections = {{.title = "Formats",
+                    .rows = formatRows(watchFormats()),
+                    .text = "The display refreshes every 2 s while data arrives. Ctrl-C ends it."},
+                   {.title = "Examples", .text = kWatchExamples}},
+      .run = [options] {
+        return runLive(options->live, [&](LinuxPlatform& platform, Finish finish) {
+          return std::make_unique<WatchTask>(*options, platform, std::move(finish));
+        });
+      }};
+  command.options.push_back(formatOption(options->format, formatRows(watchFormats())));
+  command.options.push_back({.name = "--count",
+                             .value = "N",
+                             .help = "End after so many refreshes",
+                             .target = &options->count,
+                             .range = NumberRange{1}});
+  return command;
 }
 
 }  // namespace kestro

@@ -2,10 +2,10 @@
 // kestro-cli watch: the live display.
 #pragma once
 
-#include "CommandLine/Commands/Command.h"
+#include "Options/CommandRow.h"
 
 namespace kestro {
 
-[[nodiscard]] Command addWatchCommand(CLI::App& program);
+[[nodiscard]] CommandRow watchCommand();
 
 }  // namespace kestro

@@ -180,9 +180,10 @@ std::string jsonText(std::span<const TechnologyCodes> technologies) {
 
 const std::vector<CodesFormat>& codesFormats() {
   static const std::vector<CodesFormat> kFormats = {
-      {"table", tableText},
-      {"markdown", codesMarkdown},
-      {"json", jsonText},
+      {"table", "code by code: the packet, its least length, the sections and their keys",
+       tableText},
+      {"markdown", "a document, with where every key is read and how it is shown", codesMarkdown},
+      {"json", "all of that for programs: an array of technologies", jsonText},
   };
   return kFormats;
 }

@@ -11,9 +11,10 @@
 
 namespace kestro {
 
-/// A format's name on the command line, and what makes its text.
+/// A format's name on the command line, what the help says of it, and what makes its text.
 struct CodesFormat {
   std::string_view name;
+  std::string_view help;  ///< one line or several
   std::string (*text)(std::span<const TechnologyCodes> technologies);
 };
 

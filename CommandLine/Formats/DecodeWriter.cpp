@@ -96,10 +96,13 @@ std::unique_ptr<DecodeWriter> makeWriter(Output& output) {
 
 const std::vector<DecodeFormat>& decodeFormats() {
   static const std::vector<DecodeFormat> kFormats = {
-      {"tree", makeWriter<TreeWriter>},
-      {"json", makeWriter<JsonObjectWriter>},
-      {"ndjson", makeWriter<NdjsonWriter>},
-      {"csv", makeWriter<CsvWriter>},
+      {"tree", "the display after the last message, for people", makeWriter<TreeWriter>},
+      {"json", R"(one object: "technology", "messages" (how many) and the last "display")",
+       makeWriter<JsonObjectWriter>},
+      {"ndjson", R"(one line a refresh: "time", "message" (the last one's number) and "display")",
+       makeWriter<NdjsonWriter>},
+      {"csv", "one line for each value and refresh: time,message,path,value",
+       makeWriter<CsvWriter>},
   };
   return kFormats;
 }

@@ -34,9 +34,10 @@ class DecodeWriter {
   virtual void finish(const DecodeResult&) {}
 };
 
-/// A format's name on the command line, and its writer.
+/// A format's name on the command line, what the help says of it, and its writer.
 struct DecodeFormat {
   std::string_view name;
+  std::string_view help;  ///< one line or several
   std::unique_ptr<DecodeWriter> (*makeWriter)(Output& output);
 };
 

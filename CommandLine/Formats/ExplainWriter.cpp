@@ -16,8 +16,9 @@ std::unique_ptr<ExplainWriter> makeExplainWriter(Output& output) {
 
 const std::vector<ExplainFormat>& explainFormats() {
   static const std::vector<ExplainFormat> kFormats = {
-      {"table", makeExplainWriter<ExplainTable>},
-      {"json", makeExplainWriter<ExplainJson>},
+      {"table", "for people, a table a packet", makeExplainWriter<ExplainTable>},
+      {"json", R"(one object: "technology" and "messages", one packet a line)",
+       makeExplainWriter<ExplainJson>},
   };
   return kFormats;
 }

@@ -42,9 +42,10 @@ class ExplainWriter {
   virtual void finish() = 0;
 };
 
-/// A format's name on the command line, and its writer.
+/// A format's name on the command line, what the help says of it, and its writer.
 struct ExplainFormat {
   std::string_view name;
+  std::string_view help;  ///< one line or several
   std::unique_ptr<ExplainWriter> (*makeWriter)(Output& output);
 };
 

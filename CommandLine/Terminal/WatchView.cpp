@@ -91,10 +91,16 @@ std::unique_ptr<WatchView> makeNdjsonView(Output output) {
   return std::make_unique<NdjsonView>(std::move(output));
 }
 
+constexpr std::string_view kTreeHelp =
+    "on a terminal the display in its window, redrawn in place, with the values that\n"
+    "changed marked (remarks of the decoders on standard error are not shown there:\n"
+    "redirect it to keep them); elsewhere one plain display below the other";
+
 const std::vector<WatchFormat>& watchFormats() {
   static const std::vector<WatchFormat> kFormats = {
-      {"tree", makeTreeView},
-      {"ndjson", [](const std::string&) { return makeNdjsonView(Output::standardOutput()); }},
+      {"tree", kTreeHelp, makeTreeView},
+      {"ndjson", R"(one line a refresh: "time" (UTC) and "display")",
+       [](const std::string&) { return makeNdjsonView(Output::standardOutput()); }},
   };
   return kFormats;
 }

@@ -39,9 +39,10 @@ class WatchView {
   [[nodiscard]] virtual bool readerIsGone() const { return false; }
 };
 
-/// A format's name on the command line, and its view.
+/// A format's name on the command line, what the help says of it, and its view.
 struct WatchFormat {
   std::string_view name;
+  std::string_view help;  ///< one line or several
   std::unique_ptr<WatchView> (*makeView)(const std::string& title);
 };
 

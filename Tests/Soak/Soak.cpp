@@ -2,15 +2,17 @@
 // kestro-soak: many messages, and many deaths of the server, through the whole live path.
 #include <fmt/format.h>
 
-#include <CLI/CLI.hpp>
 #include <algorithm>
 #include <chrono>
 #include <cstdint>
 #include <cstdio>
 #include <cstdlib>
 #include <string>
+#include <variant>
 #include <vector>
 
+#include "Options/ArgumentParser.h"
+#include "Options/ProgramOptions.h"
 #include "Platform/TelephonyService.h"
 #include "Sources/SourceCatalogue.h"
 #include "Tests/Soak/LiveSystem.h"
@@ -144,22 +146,48 @@ void run(const Options& options) {
           "every message that was asked for arrives");
 }
 
+CommandRow program(Options& options) {
+  return {.name = "kestro-soak",
+          .help = "Plays a simulated drive through server, ports and model, faster than time.",
+          .options = {
+              {.name = "--technology",
+               .value = "NAME",
+               .help = "The simulation's technology",
+               .target = &options.technology,
+               .choices = choicesOf(technologyNames())},
+              {.name = "--messages",
+               .value = "N",
+               .help = "How many messages, after a short while to begin with",
+               .target = &options.messages,
+               .range = NumberRange{}},
+              {.name = "--faults",
+               .value = "N",
+               .help = "How often the server dies or stops on the way",
+               .target = &options.faults,
+               .range = NumberRange{}},
+              {.name = "--speed",
+               .value = "X",
+               .help = "Seconds of the drive in one second of the clock",
+               .target = &options.speed,
+               .range = NumberRange{0}},
+              {.name = "--premade",
+               .value = "N",
+               .help = "Make so many messages before the run, and play these round and round: the "
+                       "simulation's own time is not counted then",
+               .target = &options.premade,
+               .range = NumberRange{}},
+          }};
+}
+
 }  // namespace
 }  // namespace kestro::soak
 
 int main(int argc, char** argv) {
   using namespace kestro::soak;  // NOLINT(google-build-using-namespace)
   Options options;
-  CLI::App app("Plays a simulated drive through server, ports and model, faster than time.");
-  app.add_option("--technology", options.technology, "The simulation's technology");
-  app.add_option("--messages", options.messages,
-                 "How many messages, after a short while to begin with");
-  app.add_option("--faults", options.faults, "How often the server dies or stops on the way");
-  app.add_option("--speed", options.speed, "Seconds of the drive in one second of the clock");
-  app.add_option("--premade", options.premade,
-                 "Make so many messages before the run, and play these round and round: the "
-                 "simulation's own time is not counted then");
-  CLI11_PARSE(app, argc, argv);
+  const kestro::CommandRow rows = program(options);
+  const auto parsed = kestro::parseArguments(rows, argc, argv);
+  if (const auto* text = std::get_if<kestro::OptionsText>(&parsed)) return kestro::tell(*text);
   try {
     run(options);
   } catch (const BrokenPromise& broken) {

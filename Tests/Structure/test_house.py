@@ -14,6 +14,10 @@ class Tree(unittest.TestCase):
     def test_every_include_follows_the_house(self):
         self.assertEqual(house.wrong_arrows(ROOT), [])
 
+    def test_one_source_reads_command_lines(self):
+        self.assertEqual([name for name, room in house.ALL_ROOMS.items()
+                          if "command lines" in room.kinds], ["Options/ArgumentParser.cpp"])
+
     def test_every_source_begins_with_its_own_header(self):
         self.assertEqual(house.headers_not_first(ROOT), [])
 

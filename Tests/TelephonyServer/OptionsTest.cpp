@@ -9,11 +9,13 @@
 
 #include "Platform/Virtual/VirtualServices.h"
 #include "TelephonyServer/Options.h"
+#include "Tests/Options/RowFaults.h"
 
 namespace kestro {
 namespace {
 
 using ::testing::HasSubstr;
+using ::testing::IsEmpty;
 
 std::variant<ServerOptions, OptionsText> parse(std::initializer_list<const char*> arguments) {
   std::vector<const char*> line{"kestro-telephonyd"};
@@ -37,6 +39,12 @@ OptionsText refusal(std::initializer_list<const char*> arguments) {
   if (const auto* text = std::get_if<OptionsText>(&parsed)) return *text;
   ADD_FAILURE() << "accepted";
   return {};
+}
+
+TEST(OptionsTest, EveryRowExplainsItself) {
+  const VirtualBundle bundle;
+  ServerArguments arguments;
+  EXPECT_THAT(rowFaults(serverProgram(bundle, arguments)), IsEmpty());
 }
 
 TEST(OptionsTest, WithoutOptionsTheSimulationRunsAtItsOwnPace) {

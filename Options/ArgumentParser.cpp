@@ -1,0 +1,154 @@
+// SPDX-License-Identifier: MIT
+#include "Options/ArgumentParser.h"
+
+#include <fmt/format.h>
+
+#include <CLI/CLI.hpp>
+#include <algorithm>
+#include <cstdio>
+#include <optional>
+#include <sstream>
+#include <stdexcept>
+#include <type_traits>
+#include <vector>
+
+#include "Options/HelpText.h"
+
+namespace kestro {
+namespace {
+
+/// The type of the value that a target takes.
+template <class Target>
+struct Taken {
+  using Type = Target;
+};
+template <class Value>
+struct Taken<std::optional<Value>> {
+  using Type = Value;
+};
+template <>
+struct Taken<LogPriority> {
+  using Type = int;
+};
+
+std::string rangeText(bool isWhole, const NumberRange& range) {
+  const char* number = isWhole ? "a whole number" : "a number";
+  if (range.most == NumberRange().most)
+    return fmt::format("{} of at least {}", number, range.least);
+  return fmt::format("{} from {} to {}", number, range.least, range.most);
+}
+
+/// The number in a text; nothing when it is none of that type. (CLI11 reads "-1" as the largest
+/// unsigned number.)
+template <class Number>
+std::optional<Number> numberIn(const std::string& text) {
+  if (std::is_unsigned_v<Number> && text.find('-') != std::string::npos) return std::nullopt;
+  Number number{};
+  if (!CLI::detail::lexical_cast(text, number)) return std::nullopt;
+  return number;
+}
+
+/// Looks whether a text is a number in range; "nan" is in none.
+template <class Number>
+CLI::Validator rangeCheck(const NumberRange& range) {
+  return {[range](const std::string& text) {
+            const auto number = numberIn<Number>(text);
+            const auto value = static_cast<double>(number.value_or(0));
+            if (number && value >= range.least && value <= range.most) return std::string();
+            return fmt::format("{} is not {}", text, rangeText(std::is_integral_v<Number>, range));
+          },
+          ""};
+}
+
+CLI::Option* declareTarget(CLI::App& app, const OptionRow& row, bool* target) {
+  return app.add_flag(row.name, *target, row.help);
+}
+
+CLI::Option* declareTarget(CLI::App& app, const OptionRow& row, const Answer& answer) {
+  return app
+      .add_flag_callback(
+          row.name, [answer] { throw CLI::CallForVersion(answer(), 0); }, row.help)
+      ->configurable(false);
+}
+
+template <class Target>
+CLI::Option* declareTarget(CLI::App& app, const OptionRow& row, Target* target) {
+  using Value = typename Taken<Target>::Type;
+  const auto take = [target, implied = row.impliedValue](const Value& value) {
+    if constexpr (std::is_same_v<Value, std::string>) {
+      *target = value.empty() && implied ? *implied : value;
+    } else {
+      *target = static_cast<Target>(value);
+    }
+  };
+  CLI::Option* option = app.add_option_function<Value>(row.name, take, row.help);
+  if constexpr (std::is_arithmetic_v<Value>) {
+    if (row.range) option->check(rangeCheck<Value>(*row.range));
+  }
+  return option->option_text(valueText(row));
+}
+
+CLI::Option* declareOption(CLI::App& app, const OptionRow& row) {
+  CLI::Option* option =
+      std::visit([&](const auto& target) { return declareTarget(app, row, target); }, row.target);
+  option->required(row.isRequired);
+  if (row.impliedValue) option->expected(0, 1);
+  if (!row.choices.empty()) {
+    std::vector<std::string> names(row.choices.size());
+    std::ranges::transform(row.choices, names.begin(), &HelpRow::name);
+    option->check(CLI::IsMember(names));
+  }
+  if (row.problem) option->check(CLI::Validator(row.problem, ""));
+  if (row.isHidden) option->group("");
+  return option;
+}
+
+void declareOptions(CLI::App& app, const std::vector<OptionRow>& rows) {
+  std::vector<CLI::Option*> options;
+  for (const OptionRow& row : rows) options.push_back(declareOption(app, row));
+  for (std::size_t i = 0; i < rows.size(); ++i) {  // once all that they can name are there
+    if (!rows[i].excludes.empty()) options[i]->excludes(app.get_option(rows[i].excludes));
+    if (!rows[i].needs.empty()) options[i]->needs(app.get_option(rows[i].needs));
+  }
+}
+
+void declareCommand(CLI::App& app, const CommandRow& command) {
+  declareOptions(app, command.options);
+  for (const CommandRow& inner : command.commands) {
+    declareCommand(*app.add_subcommand(inner.name, inner.help), inner);
+  }
+  if (!command.commands.empty()) app.require_subcommand(1);
+  app.footer(footerText(command));
+}
+
+const CommandRow& chosenOf(const CLI::App& app, const CommandRow& command) {
+  for (const CommandRow& inner : command.commands) {
+    const CLI::App* declared = app.get_subcommand(inner.name);
+    if (declared->parsed()) return chosenOf(*declared, inner);
+  }
+  return command;
+}
+
+}  // namespace
+
+std::variant<const CommandRow*, OptionsText> parseArguments(const CommandRow& program,
+                                                            int argumentCount,
+                                                            const char* const* arguments) {
+  CLI::App app(program.help, program.name);
+  declareCommand(app, program);
+  try {
+    app.parse(argumentCount, arguments);
+  } catch (const CLI::ParseError& error) {  // help and the version are such, too, of status 0
+    std::ostringstream text;
+    const int status = app.exit(error, text, text);
+    return OptionsText{text.str(), status == 0 ? 0 : kWrongUsage};
+  }
+  return &chosenOf(app, program);
+}
+
+int tell(const OptionsText& text) {
+  std::fputs(text.text.c_str(), text.exitStatus == 0 ? stdout : stderr);
+  return text.exitStatus;
+}
+
+}  // namespace kestro
