@@ -26,6 +26,12 @@ enum class SendError : int {
 /// close the connection at the receiver.
 inline constexpr std::size_t kMaximumMessageSize = std::size_t{16} * 1024 * 1024;
 
+/// A process, by the number that the system has for it.
+using ProcessNumber = std::int32_t;
+
+/// The system has no number for this process, such as one of a process namespace that is not seen.
+inline constexpr ProcessNumber kUnknownProcess = 0;
+
 /// Answers one message, on the main thread. It is given the message's id and bytes (valid during
 /// the call) and returns the reply, which is sent only when the sender asked for one.
 using ReceiveHandler =
@@ -48,6 +54,10 @@ class LocalPort {
   virtual void invalidate() = 0;
 
   [[nodiscard]] virtual bool isValid() const = 0;
+
+  /// The process that sent what the handler is answering: who connected. Of use in the handler
+  /// only; elsewhere kUnknownProcess.
+  [[nodiscard]] virtual ProcessNumber sender() const = 0;
 };
 
 /// The sending end of a connection to somebody's local port.
@@ -84,6 +94,9 @@ class RemotePort {
   /// False once the connection was closed from either end. The test looks at the connection itself,
   /// so a peer that closed it before the call is noticed by the call.
   [[nodiscard]] virtual bool isValid() const = 0;
+
+  /// The process at the other end: who listened to the port when this connection was made.
+  [[nodiscard]] virtual ProcessNumber owner() const = 0;
 };
 
 /// Makes ports. A port name is 1 to 64 letters, digits, '.', '-' or '_', and not "." or "..".
@@ -99,7 +112,8 @@ class MessagePorts {
   [[nodiscard]] virtual std::shared_ptr<LocalPort> createLocalPort(std::string_view name,
                                                                    ReceiveHandler handler) = 0;
 
-  /// Connects to somebody's local port; null when nobody owns that name.
+  /// Connects to somebody's local port; null when nobody owns that name, or (with a log line) when
+  /// it cannot be connected to: it is another user's, or a symbolic link.
   [[nodiscard]] virtual std::shared_ptr<RemotePort> createRemotePort(std::string_view name) = 0;
 };
 

@@ -9,7 +9,6 @@
 #include "Platform/PortName.h"
 #include "Platform/PropertyListCoding.h"
 #include "Platform/SystemLog.h"
-#include "Platform/TelephonyProtocol.h"
 
 namespace kestro {
 namespace {
@@ -27,8 +26,8 @@ Result<std::unique_ptr<Server>> Server::open(Platform& platform, std::string_vie
                                              std::string_view technology,
                                              std::function<void()> portLost) {
   if (!isPortName(name)) return failure(fmt::format("\"{}\" is no port name", name));
-  std::unique_ptr<Server> server(new Server(platform, technology));
-  if (server->openPort(name)) {
+  std::unique_ptr<Server> server(new Server(platform, name, technology));
+  if (server->openPort()) {
     server->_port->setInvalidationHandler(std::move(portLost));
     return server;
   }
@@ -38,12 +37,12 @@ Result<std::unique_ptr<Server>> Server::open(Platform& platform, std::string_vie
   return failure(fmt::format("cannot open the port \"{}\"; the system log says why", name));
 }
 
-Server::Server(Platform& platform, std::string_view technology)
-    : _platform(platform), _technology(technology) {}
+Server::Server(Platform& platform, std::string_view name, std::string_view technology)
+    : _platform(platform), _name(name), _technology(technology) {}
 
-bool Server::openPort(std::string_view name) {
+bool Server::openPort() {
   _port = _platform.messagePorts().createLocalPort(
-      name,
+      _name,
       [this](std::int32_t messageId, ByteView message) { return answer(messageId, message); });
   if (!_port) return false;
   _timer = _platform.mainQueue().scheduleRepeating(kLookInterval, [this] { forgetWhoIsGone(); });
@@ -95,33 +94,57 @@ void Server::registerClient(ByteView message) {
   if (!name) return refuse("it names no port");
   if (_registrations.contains(*name)) return;
   if (_registrations.size() >= kMaximumRegistrations) return refuse("there are too many");
-  auto client = _platform.messagePorts().createRemotePort(*name);
-  if (!client) return refuse(fmt::format("nobody owns the port {}", *name));
-  _registrations.emplace(*name, std::move(client));
+  auto client = connectTo(*name);
+  if (!client) return refuse(client.error().message);
+  _registrations.emplace(*name, std::move(*client));
 }
 
 Bytes Server::createLogChannel(ByteView message) {
-  Dictionary reply = channelReply(LogChannelError::None);
+  Dictionary reply = channelReply(LogChannelError::BadRequest);
   forgetWhoIsGone();
-  if (const auto name = portNameIn(message, kTelephonyLocalPort); !name) {
-    reply = channelReply(LogChannelError::BadRequest);
-  } else if (_channels.size() >= kMaximumChannels) {
-    _platform.systemLog().log(LogPriority::Warning, "No log channel for {}: there are {} already",
-                              *name, kMaximumChannels);
-    reply = channelReply(LogChannelError::NoChannel);
-  } else if (auto client = _platform.messagePorts().createRemotePort(*name); !client) {
-    reply = channelReply(LogChannelError::NoLocalPort);
-  } else {
-    auto channel =
-        std::make_unique<LogChannel>(_platform, std::move(client), [this] { return _technology; });
-    if (channel->open()) {
-      reply.set(kTelephonyPort, channel->portName());
-      _channels.push_back(std::move(channel));
-    } else {
-      reply = channelReply(LogChannelError::NoChannel);
-    }
+  if (const auto localPort = portNameIn(message, kTelephonyLocalPort)) {
+    const auto channel = openChannel(*localPort);
+    reply = channelReply(channel ? LogChannelError::None : channel.error());
+    if (channel) reply.set(kTelephonyPort, (*channel)->portName());
   }
   return _platform.propertyListCoding().xml(reply).value_or(Bytes{});
+}
+
+tl::expected<const LogChannel*, LogChannelError> Server::openChannel(const std::string& localPort) {
+  const auto refuse = [&](LogChannelError error, std::string_view why) {
+    _platform.systemLog().log(LogPriority::Warning, "No log channel for {}: {}", localPort, why);
+    return tl::unexpected(error);
+  };
+  if (_registrations.contains(localPort)) {
+    return refuse(LogChannelError::NoLocalPort, "notifications go to this port");
+  }
+  if (_channels.size() >= kMaximumChannels) {
+    return refuse(LogChannelError::NoChannel,
+                  fmt::format("there are {} already", kMaximumChannels));
+  }
+  auto client = connectTo(localPort);
+  if (!client) return refuse(LogChannelError::NoLocalPort, client.error().message);
+  auto channel =
+      std::make_unique<LogChannel>(_platform, std::move(*client), [this] { return _technology; });
+  if (!channel->open()) return tl::unexpected(LogChannelError::NoChannel);
+  return _channels.emplace_back(std::move(channel)).get();
+}
+
+Result<std::shared_ptr<RemotePort>> Server::connectTo(const std::string& port) const {
+  if (isOwnPort(port)) return failure(fmt::format("the port {} is the server's own", port));
+  auto client = _platform.messagePorts().createRemotePort(port);
+  if (!client) return failure(fmt::format("nobody owns the port {}", port));
+  // Whoever names another's port would fill it with messages that its owner did not ask for.
+  if (client->owner() == kUnknownProcess || client->owner() != _port->sender()) {
+    return failure(fmt::format("the port {} is not of the process that asks", port));
+  }
+  return client;
+}
+
+bool Server::isOwnPort(std::string_view name) const {
+  return name == _name || std::ranges::any_of(_channels, [name](const auto& channel) {
+           return channel->portName() == name;
+         });
 }
 
 std::optional<std::string> Server::portNameIn(ByteView message, std::string_view key) const {

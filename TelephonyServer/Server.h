@@ -17,6 +17,7 @@
 #include "Platform/MessagePort.h"
 #include "Platform/Platform.h"
 #include "Platform/Result.h"
+#include "Platform/TelephonyProtocol.h"
 #include "TelephonyServer/LogChannel.h"
 #include "TelephonyServer/Playback.h"
 
@@ -53,16 +54,24 @@ class Server : public PlaybackListener {
   [[nodiscard]] std::size_t registrationCount() const noexcept { return _registrations.size(); }
 
  private:
-  Server(Platform& platform, std::string_view technology);
-  [[nodiscard]] bool openPort(std::string_view name);
+  Server(Platform& platform, std::string_view name, std::string_view technology);
+  [[nodiscard]] bool openPort();
   [[nodiscard]] std::optional<Bytes> answer(std::int32_t messageId, ByteView message);
   void registerClient(ByteView message);
   [[nodiscard]] Bytes createLogChannel(ByteView message);
+  /// A channel to the client's port of that name, open and kept; the error is the reply's.
+  [[nodiscard]] tl::expected<const LogChannel*, LogChannelError> openChannel(
+      const std::string& localPort);
+  /// Connects to a port that the client has named; the error says why that is not done.
+  [[nodiscard]] Result<std::shared_ptr<RemotePort>> connectTo(const std::string& port) const;
+  /// Whether the name is the server's own, or one of its channels'.
+  [[nodiscard]] bool isOwnPort(std::string_view name) const;
   /// The port name under `key` in a dictionary; absent when there is none.
   [[nodiscard]] std::optional<std::string> portNameIn(ByteView message, std::string_view key) const;
   void forgetWhoIsGone();
 
   Platform& _platform;
+  std::string _name;
   std::string_view _technology;
   std::shared_ptr<LocalPort> _port;
   std::unique_ptr<Timer> _timer;

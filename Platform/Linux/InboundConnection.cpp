@@ -14,19 +14,24 @@ constexpr std::size_t kReplyBacklog = std::size_t{1024} * 1024;
 
 // What a handler throws ends the process where it was thrown: it must not unwind through the event
 // loop.
-std::optional<Bytes> callHandler(const ReceiveHandler& handler, const PortFrame& frame) noexcept {
-  return handler(frame.header.messageId, frame.body);
+std::optional<Bytes> callHandler(PortReceiver& receiver, ProcessNumber sender,
+                                 const PortFrame& frame) noexcept {
+  // A handler that runs the event loop may be called for another sender meanwhile.
+  const ProcessNumber outer = std::exchange(receiver.sender, sender);
+  auto reply = receiver.handler(frame.header.messageId, frame.body);
+  receiver.sender = outer;
+  return reply;
 }
 
 }  // namespace
 
-InboundConnection::InboundConnection(FileDescriptor socket, std::string portName,
-                                     std::shared_ptr<PortContext> context,
-                                     std::shared_ptr<const ReceiveHandler> handler,
-                                     ClosedHandler closed)
+InboundConnection::InboundConnection(FileDescriptor socket, ProcessNumber peer,
+                                     std::string portName, std::shared_ptr<PortContext> context,
+                                     std::shared_ptr<PortReceiver> receiver, ClosedHandler closed)
     : PortConnection(std::move(socket), PortDirection::ToReceiver, std::move(portName),
                      std::move(context)),
-      _handler(std::move(handler)),
+      _peer(peer),
+      _receiver(std::move(receiver)),
       _closed(std::move(closed)) {}
 
 void InboundConnection::disown() {
@@ -77,8 +82,7 @@ void InboundConnection::arrangeNextTurn() {
 }
 
 void InboundConnection::answer(const PortFrame& frame) {
-  const auto handler = _handler;
-  std::optional<Bytes> reply = callHandler(*handler, frame);
+  std::optional<Bytes> reply = callHandler(*_receiver, _peer, frame);
   if (frame.header.kind != PortFrameKind::Request) return;
   if (reply && reply->size() > kMaximumMessageSize) {
     note(fmt::format("a reply of {} bytes is dropped, at most {} are allowed", reply->size(),

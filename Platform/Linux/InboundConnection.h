@@ -5,11 +5,20 @@
 #include <functional>
 #include <memory>
 #include <string>
+#include <utility>
 
 #include "Platform/Linux/PortConnection.h"
 #include "Platform/MessagePort.h"
 
 namespace kestro {
+
+/// What a local port shares with its connections, which outlive it while its handler runs.
+struct PortReceiver {
+  explicit PortReceiver(ReceiveHandler receiveHandler) : handler(std::move(receiveHandler)) {}
+
+  const ReceiveHandler handler;
+  ProcessNumber sender = kUnknownProcess;  ///< of what the handler is answering
+};
 
 /// Serves the messages and requests of one peer, in order, a bounded amount in each turn of the
 /// event loop, so that a busy peer holds up neither timers nor other peers. Made by make_shared
@@ -18,11 +27,10 @@ class InboundConnection final : public PortConnection {
  public:
   using ClosedHandler = std::function<void(const InboundConnection&)>;
 
-  /// `handler` is shared with the port, whose end it outlives while it runs. `closed` runs once,
-  /// unless `disown` was called.
-  InboundConnection(FileDescriptor socket, std::string portName,
-                    std::shared_ptr<PortContext> context,
-                    std::shared_ptr<const ReceiveHandler> handler, ClosedHandler closed);
+  /// `peer` is the process at the other end. `closed` runs once, unless `disown` was called.
+  InboundConnection(FileDescriptor socket, ProcessNumber peer, std::string portName,
+                    std::shared_ptr<PortContext> context, std::shared_ptr<PortReceiver> receiver,
+                    ClosedHandler closed);
 
   /// Closes without calling the closed handler: its owner is gone.
   void disown();
@@ -36,7 +44,8 @@ class InboundConnection final : public PortConnection {
   void answer(const PortFrame& frame);
   [[nodiscard]] bool mayServe() noexcept;
 
-  std::shared_ptr<const ReceiveHandler> _handler;
+  ProcessNumber _peer;
+  std::shared_ptr<PortReceiver> _receiver;
   ClosedHandler _closed;
   bool _serving = false;
   bool _ended = false;  ///< the peer sends no more

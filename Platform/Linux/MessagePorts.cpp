@@ -62,10 +62,12 @@ std::shared_ptr<RemotePort> UnixMessagePorts::createRemotePort(std::string_view 
   auto socket = (*directory)->connect(std::string(name));
   if (!socket) return refuse(kWhat, name, socket.error().message);
   if (!*socket) return nullptr;
-  if (!isPeerOfUser((*socket)->get(), _context->peerUser)) {
+  const auto peer = peerOf((*socket)->get());
+  if (!peer || peer->user != _context->peerUser) {
     return refuse(kWhat, name, "its owner is another user");
   }
-  return std::make_shared<UnixRemotePort>(std::move(**socket), std::string(name), _context);
+  return std::make_shared<UnixRemotePort>(std::move(**socket), peer->process, std::string(name),
+                                          _context);
 }
 
 }  // namespace

@@ -185,6 +185,12 @@ void PortDirectory::removeDeadOwners() const {
 }
 
 Result<std::optional<FileDescriptor>> PortDirectory::connect(const std::string& name) const {
+  // A link put there after this look leads no further than its owner, whom the peer's credentials
+  // name.
+  struct stat file {};
+  if (statIn(_descriptor, name, file) && S_ISLNK(file.st_mode)) {
+    return failure("it is a symbolic link");
+  }
   FileDescriptor socket = newSocket();
   if (!socket.isOpen()) return failure(reason(errno));
   if (connectTo(socket.get(), address(name))) return socket;

@@ -67,7 +67,7 @@ class PortDirectory {
   void removeDeadOwners() const;
 
   /// A non-blocking socket connected to the owner of the port name `name`; without value when
-  /// nobody owns it.
+  /// nobody owns it. A symbolic link is no port.
   [[nodiscard]] Result<std::optional<FileDescriptor>> connect(const std::string& name) const;
 
  private:

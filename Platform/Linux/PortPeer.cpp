@@ -5,11 +5,11 @@
 
 namespace kestro {
 
-bool isPeerOfUser(int socket, uid_t user) {
+std::optional<PortPeer> peerOf(int socket) {
   ucred credentials{};
   socklen_t length = sizeof(credentials);
-  return ::getsockopt(socket, SOL_SOCKET, SO_PEERCRED, &credentials, &length) == 0 &&
-         credentials.uid == user;
+  if (::getsockopt(socket, SOL_SOCKET, SO_PEERCRED, &credentials, &length) != 0) return {};
+  return PortPeer{credentials.uid, credentials.pid};
 }
 
 }  // namespace kestro

@@ -4,10 +4,19 @@
 
 #include <sys/types.h>
 
+#include <optional>
+
+#include "Platform/MessagePort.h"
+
 namespace kestro {
 
-/// Whether the process at the other end of a connected AF_UNIX socket ran as `user` when the
-/// connection was made (for who listens: when it began to listen).
-[[nodiscard]] bool isPeerOfUser(int socket, uid_t user);
+/// A process as it was when the connection was made (for who listens: when it began to listen).
+struct PortPeer {
+  uid_t user;
+  ProcessNumber process;
+};
+
+/// The peer of a connected AF_UNIX socket; absent when the system does not say.
+[[nodiscard]] std::optional<PortPeer> peerOf(int socket);
 
 }  // namespace kestro

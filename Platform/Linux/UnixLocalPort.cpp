@@ -30,7 +30,7 @@ UnixLocalPort::UnixLocalPort(PortListener listener, std::string name, ReceiveHan
                              std::shared_ptr<PortContext> context)
     : _listener(std::move(listener)),
       _name(std::move(name)),
-      _handler(std::make_shared<const ReceiveHandler>(std::move(handler))),
+      _receiver(std::make_shared<PortReceiver>(std::move(handler))),
       _context(std::move(context)),
       _acceptNotifier(
           std::make_unique<QSocketNotifier>(_listener->socket(), QSocketNotifier::Read)),
@@ -82,13 +82,14 @@ void UnixLocalPort::pauseAccepting(int error) {
 }
 
 void UnixLocalPort::serve(FileDescriptor socket) {
-  if (!isPeerOfUser(socket.get(), _context->peerUser)) {
+  const auto peer = peerOf(socket.get());
+  if (!peer || peer->user != _context->peerUser) {
     _context->log.log(LogPriority::Error,
                       "Message port \"{}\": refusing a connection of another user", _name);
     return;
   }
   auto connection = std::make_shared<InboundConnection>(
-      std::move(socket), _name, _context, _handler,
+      std::move(socket), peer->process, _name, _context, _receiver,
       [this](const InboundConnection& closed) { _connections.erase(&closed); });
   _connections.emplace(connection.get(), connection);
 }

@@ -25,6 +25,7 @@ class UnixLocalPort final : public LocalPort {
   void setInvalidationHandler(std::function<void()> handler) override;
   void invalidate() override;
   [[nodiscard]] bool isValid() const override { return _listener.has_value(); }
+  [[nodiscard]] ProcessNumber sender() const override { return _receiver->sender; }
 
  private:
   void acceptConnections();
@@ -35,7 +36,7 @@ class UnixLocalPort final : public LocalPort {
 
   std::optional<PortListener> _listener;  ///< absent once the port is invalid
   std::string _name;
-  std::shared_ptr<const ReceiveHandler> _handler;
+  std::shared_ptr<PortReceiver> _receiver;
   std::shared_ptr<PortContext> _context;
   std::function<void()> _invalidationHandler;
   std::unique_ptr<QSocketNotifier> _acceptNotifier;

@@ -12,10 +12,11 @@ bool isOver(PortDeadline deadline) { return std::chrono::steady_clock::now() >= 
 
 }  // namespace
 
-UnixRemotePort::UnixRemotePort(FileDescriptor socket, std::string portName,
+UnixRemotePort::UnixRemotePort(FileDescriptor socket, ProcessNumber owner, std::string portName,
                                std::shared_ptr<PortContext> context)
     : PortConnection(std::move(socket), PortDirection::ToSender, std::move(portName),
-                     std::move(context)) {}
+                     std::move(context)),
+      _owner(owner) {}
 
 UnixRemotePort::~UnixRemotePort() { close(); }
 

@@ -14,8 +14,9 @@ namespace kestro {
 /// are dropped as they come. Made by make_shared only.
 class UnixRemotePort final : public RemotePort, public PortConnection {
  public:
-  /// `socket` is connected and non-blocking.
-  UnixRemotePort(FileDescriptor socket, std::string portName, std::shared_ptr<PortContext> context);
+  /// `socket` is connected and non-blocking, to the process `owner`.
+  UnixRemotePort(FileDescriptor socket, ProcessNumber owner, std::string portName,
+                 std::shared_ptr<PortContext> context);
   ~UnixRemotePort() override;
 
   SendError post(std::int32_t messageId, ByteView message) override;
@@ -26,6 +27,7 @@ class UnixRemotePort final : public RemotePort, public PortConnection {
                               std::chrono::nanoseconds receiveTimeout) override;
   void invalidate() override { close(); }
   [[nodiscard]] bool isValid() const override;
+  [[nodiscard]] ProcessNumber owner() const override { return _owner; }
 
  private:
   void onReadable() override;
@@ -37,6 +39,7 @@ class UnixRemotePort final : public RemotePort, public PortConnection {
   [[nodiscard]] std::optional<PortFrame> findReply(std::uint32_t sequence);
   [[nodiscard]] bool readOnce();
 
+  ProcessNumber _owner;
   std::uint32_t _lastSequence = 0;
 };
 

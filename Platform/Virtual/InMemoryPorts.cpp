@@ -16,7 +16,8 @@ constexpr std::chrono::nanoseconds kAtOnce{0};
 
 class InMemoryPorts::Local : public LocalPort, public std::enable_shared_from_this<Local> {
  public:
-  Local(MainQueue& queue, ReceiveHandler handler) : _queue(queue), _handler(std::move(handler)) {}
+  Local(MainQueue& queue, ReceiveHandler handler, ProcessNumber owner)
+      : _queue(queue), _handler(std::move(handler)), _owner(owner) {}
 
   void setInvalidationHandler(std::function<void()> handler) override {
     _invalidationHandler = std::move(handler);
@@ -32,17 +33,23 @@ class InMemoryPorts::Local : public LocalPort, public std::enable_shared_from_th
   [[nodiscard]] bool isValid() const override { return _valid; }
   [[nodiscard]] bool isStalled() const noexcept { return _stalled; }
 
+  [[nodiscard]] ProcessNumber sender() const override { return _sender; }
+  [[nodiscard]] ProcessNumber owner() const noexcept { return _owner; }
+
   /// Takes a message for delivery; false when too much waits already.
-  bool enqueue(std::int32_t messageId, ByteView message) {
+  bool enqueue(std::int32_t messageId, ByteView message, ProcessNumber sender) {
     if (_waitingBytes + message.size() > kMaximumWaitingBytes) return false;
     _waitingBytes += message.size();
-    _waiting.push_back({messageId, Bytes(message.begin(), message.end())});
+    _waiting.push_back({messageId, Bytes(message.begin(), message.end()), sender});
     if (!_stalled) scheduleDelivery();
     return true;
   }
 
-  std::optional<Bytes> answer(std::int32_t messageId, ByteView message) {
-    return _handler(messageId, message);
+  std::optional<Bytes> answer(std::int32_t messageId, ByteView message, ProcessNumber sender) {
+    const ProcessNumber outer = std::exchange(_sender, sender);
+    auto reply = _handler(messageId, message);
+    _sender = outer;
+    return reply;
   }
 
   void setStalled(bool stalled) {
@@ -55,6 +62,7 @@ class InMemoryPorts::Local : public LocalPort, public std::enable_shared_from_th
   struct Message {
     std::int32_t id;
     Bytes bytes;
+    ProcessNumber sender;
   };
 
   void scheduleDelivery() {
@@ -68,11 +76,13 @@ class InMemoryPorts::Local : public LocalPort, public std::enable_shared_from_th
     const Message message = std::move(_waiting.front());
     _waiting.pop_front();
     _waitingBytes -= message.bytes.size();
-    static_cast<void>(_handler(message.id, message.bytes));
+    static_cast<void>(answer(message.id, message.bytes, message.sender));
   }
 
   MainQueue& _queue;
   ReceiveHandler _handler;
+  ProcessNumber _owner;
+  ProcessNumber _sender = kUnknownProcess;
   std::function<void()> _invalidationHandler;
   std::deque<Message> _waiting;
   std::size_t _waitingBytes = 0;
@@ -82,8 +92,8 @@ class InMemoryPorts::Local : public LocalPort, public std::enable_shared_from_th
 
 class InMemoryPorts::Remote : public RemotePort {
  public:
-  Remote(InMemoryPorts& ports, std::weak_ptr<Local> receiver)
-      : _ports(ports), _receiver(std::move(receiver)) {}
+  Remote(InMemoryPorts& ports, const std::shared_ptr<Local>& receiver, ProcessNumber process)
+      : _ports(ports), _receiver(receiver), _owner(receiver->owner()), _process(process) {}
 
   SendError post(std::int32_t messageId, ByteView message) override {
     const SendError error = deliver(messageId, message, _ports._failures.post);
@@ -111,6 +121,7 @@ class InMemoryPorts::Remote : public RemotePort {
   void invalidate() override { _receiver.reset(); }
 
   [[nodiscard]] bool isValid() const override { return valid() != nullptr; }
+  [[nodiscard]] ProcessNumber owner() const override { return _owner; }
 
  private:
   static constexpr SendError kQueueIsFull = SendError::SendTimeout;
@@ -123,7 +134,7 @@ class InMemoryPorts::Remote : public RemotePort {
     if (auto failure = std::exchange(_ports._failures.request, std::nullopt)) return *failure;
     const auto delay = std::exchange(_ports._failures.replyDelay, {}).value_or(kAtOnce);
     if (receiver->isStalled()) return {SendError::ReceiveTimeout, {}};
-    auto answer = receiver->answer(messageId, message);
+    auto answer = receiver->answer(messageId, message, _process);
     if (delay > receiveTimeout) return {SendError::ReceiveTimeout, {}};
     _ports._queue.wait(delay);
     return {SendError::None, std::move(answer)};
@@ -139,27 +150,61 @@ class InMemoryPorts::Remote : public RemotePort {
     if (!receiver) return SendError::InvalidPort;
     if (const auto error = std::exchange(failure, std::nullopt)) return *error;
     if (message.size() > kMaximumMessageSize) return SendError::Transport;
-    return receiver->enqueue(messageId, message) ? SendError::None : kQueueIsFull;
+    return receiver->enqueue(messageId, message, _process) ? SendError::None : kQueueIsFull;
   }
 
   InMemoryPorts& _ports;
   std::weak_ptr<Local> _receiver;
+  ProcessNumber _owner;
+  ProcessNumber _process;
 };
+
+class InMemoryPorts::OfProcess : public MessagePorts {
+ public:
+  OfProcess(InMemoryPorts& ports, ProcessNumber process) : _ports(ports), _process(process) {}
+
+  [[nodiscard]] std::shared_ptr<LocalPort> createLocalPort(std::string_view name,
+                                                           ReceiveHandler handler) override {
+    return _ports.createLocalPort(name, std::move(handler), _process);
+  }
+  [[nodiscard]] std::shared_ptr<RemotePort> createRemotePort(std::string_view name) override {
+    return _ports.createRemotePort(name, _process);
+  }
+
+ private:
+  InMemoryPorts& _ports;
+  ProcessNumber _process;
+};
+
+std::unique_ptr<MessagePorts> InMemoryPorts::portsOf(ProcessNumber process) {
+  return std::make_unique<OfProcess>(*this, process);
+}
 
 std::shared_ptr<LocalPort> InMemoryPorts::createLocalPort(std::string_view name,
                                                           ReceiveHandler handler) {
+  return createLocalPort(name, std::move(handler), kOwnProcess);
+}
+
+std::shared_ptr<RemotePort> InMemoryPorts::createRemotePort(std::string_view name) {
+  return createRemotePort(name, kOwnProcess);
+}
+
+std::shared_ptr<LocalPort> InMemoryPorts::createLocalPort(std::string_view name,
+                                                          ReceiveHandler handler,
+                                                          ProcessNumber process) {
   if (std::exchange(_failures.localPort, false) || !isPortName(name) || exists(name))
     return nullptr;
   std::erase_if(_ports, [](const auto& entry) { return entry.second.expired(); });
-  auto port = std::make_shared<Local>(_queue, std::move(handler));
+  auto port = std::make_shared<Local>(_queue, std::move(handler), process);
   _ports.insert_or_assign(std::string(name), port);
   return port;
 }
 
-std::shared_ptr<RemotePort> InMemoryPorts::createRemotePort(std::string_view name) {
+std::shared_ptr<RemotePort> InMemoryPorts::createRemotePort(std::string_view name,
+                                                            ProcessNumber process) {
   const auto receiver = find(name);
   if (std::exchange(_failures.remotePort, false) || !receiver) return nullptr;
-  return std::make_shared<Remote>(*this, receiver);
+  return std::make_shared<Remote>(*this, receiver, process);
 }
 
 std::vector<std::string> InMemoryPorts::names() const {

@@ -17,7 +17,8 @@ namespace kestro {
 
 /// Ports that deliver through a main queue, in the order of sending. A request calls the receiver's
 /// handler at once, as the wait for a reply serves nothing else. What runs out of time takes that
-/// time, in which nothing else runs.
+/// time, in which nothing else runs. All ports are of one process, kOwnProcess, save those made by
+/// `portsOf`.
 class InMemoryPorts : public MessagePorts {
  public:
   /// What goes wrong next; each failure is used up by the first operation that it applies to.
@@ -32,11 +33,16 @@ class InMemoryPorts : public MessagePorts {
     std::function<void()> duringRequest;  ///< runs while the next request waits
   };
 
+  static constexpr ProcessNumber kOwnProcess = 1;
+
   explicit InMemoryPorts(VirtualMainQueue& queue) : _queue(queue) {}
 
   [[nodiscard]] std::shared_ptr<LocalPort> createLocalPort(std::string_view name,
                                                            ReceiveHandler handler) override;
   [[nodiscard]] std::shared_ptr<RemotePort> createRemotePort(std::string_view name) override;
+
+  /// The same ports as another process sees them, for as long as this object lives.
+  [[nodiscard]] std::unique_ptr<MessagePorts> portsOf(ProcessNumber process);
 
   Failures& failures() noexcept { return _failures; }
 
@@ -53,6 +59,13 @@ class InMemoryPorts : public MessagePorts {
  private:
   class Local;
   class Remote;
+  class OfProcess;
+
+  [[nodiscard]] std::shared_ptr<LocalPort> createLocalPort(std::string_view name,
+                                                           ReceiveHandler handler,
+                                                           ProcessNumber process);
+  [[nodiscard]] std::shared_ptr<RemotePort> createRemotePort(std::string_view name,
+                                                             ProcessNumber process);
 
   [[nodiscard]] std::shared_ptr<Local> find(std::string_view name) const;
 

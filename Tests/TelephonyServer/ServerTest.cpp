@@ -23,6 +23,8 @@ using ::testing::HasSubstr;
 using ::testing::IsEmpty;
 using ::testing::StartsWith;
 
+constexpr const char* kFirstChannel = "LogChannel.00000000-0000-0000-0000-000000000001";
+
 /// A server under its usual name, and clients that speak to it with bytes of their own.
 class ServerTest : public ::testing::Test {
  protected:
@@ -52,13 +54,18 @@ class ServerTest : public ::testing::Test {
           return std::nullopt;
         });
   }
-  Dictionary request(const Bytes& body) {
-    const auto reply = connect("TelephonyServer")->request(2, body, seconds(1), seconds(1));
+  Dictionary request(MessagePorts& ports, const Bytes& body) {
+    const auto server = ports.createRemotePort("TelephonyServer");
+    const auto reply = server->request(2, body, seconds(1), seconds(1));
     EXPECT_EQ(reply.error, SendError::None);
     return parsed(reply.data);
   }
+  Dictionary request(const Bytes& body) { return request(_platform.messagePorts(), body); }
+  Dictionary requestChannel(MessagePorts& ports, const std::string& localPort) {
+    return request(ports, xml({{"LocalPort", localPort}}));
+  }
   Dictionary requestChannel(const std::string& localPort) {
-    return request(xml({{"LocalPort", localPort}}));
+    return requestChannel(_platform.messagePorts(), localPort);
   }
   /// Opens a client with a channel; returns the connection on which commands go.
   std::shared_ptr<RemotePort> openChannel(const std::string& client) {
@@ -141,6 +148,42 @@ TEST_F(ServerTest, ALocalPortThatNobodyOwnsIsAnsweredWithTwo) {
   const auto reply = requestChannel("Nobody");
   EXPECT_EQ(reply["Error"], Value::integer(2));
   EXPECT_TRUE(reply["Port"].isNull());
+}
+
+TEST_F(ServerTest, ItsOwnPortsAreNoLocalPorts) {
+  const auto channel = openChannel("A");
+  openClientPort("N");
+  registerPort("N");
+  logLines();
+  for (const char* own : {"TelephonyServer", kFirstChannel, "N"}) {
+    EXPECT_EQ(Value(requestChannel(own)), Value(Dictionary{{"Error", Value::integer(2)}})) << own;
+  }
+  EXPECT_EQ(_server->channelCount(), 1U);
+  EXPECT_THAT(logLines(),
+              ElementsAre("No log channel for TelephonyServer: the port TelephonyServer is the "
+                          "server's own",
+                          "No log channel for LogChannel.00000000-0000-0000-0000-000000000001: the "
+                          "port LogChannel.00000000-0000-0000-0000-000000000001 is the server's "
+                          "own",
+                          "No log channel for N: notifications go to this port"));
+}
+
+TEST_F(ServerTest, AnotherProcessesPortIsNoLocalPort) {
+  openClientPort("Mine");
+  const auto other = _platform.messagePorts().portsOf(7);
+  const auto port = other->createLocalPort("Others", {});
+  EXPECT_EQ(requestChannel("Others")["Error"], Value::integer(2));
+  EXPECT_EQ(requestChannel(*other, "Mine")["Error"], Value::integer(2));
+  EXPECT_EQ(_server->channelCount(), 0U);
+  EXPECT_EQ(requestChannel(*other, "Others")["Error"], Value::integer(0));
+  EXPECT_EQ(requestChannel("Mine")["Error"], Value::integer(0));
+}
+
+TEST_F(ServerTest, APortOfAnUnknownProcessIsNoLocalPort) {
+  const auto unknown = _platform.messagePorts().portsOf(kUnknownProcess);
+  const auto port = unknown->createLocalPort("Unknown", {});
+  EXPECT_EQ(requestChannel(*unknown, "Unknown")["Error"], Value::integer(2));
+  EXPECT_EQ(_server->channelCount(), 0U);
 }
 
 TEST_F(ServerTest, AChannelWithoutAPortIsAnsweredWithThree) {
@@ -353,6 +396,20 @@ TEST_F(ServerTest, UnusableRegistrationsAreDroppedWithALine) {
   EXPECT_THAT(logLines(), ElementsAre("A registration is dropped: it names no port",
                                       "A registration is dropped: it names no port",
                                       "A registration is dropped: nobody owns the port Nobody"));
+}
+
+TEST_F(ServerTest, ItsOwnPortsAndOthersAreNotRegistered) {
+  const auto channel = openChannel("A");
+  const auto other = _platform.messagePorts().portsOf(7);
+  const auto port = other->createLocalPort("Others", {});
+  for (const char* name : {"TelephonyServer", kFirstChannel, "Others"}) registerPort(name);
+  EXPECT_EQ(_server->registrationCount(), 0U);
+  EXPECT_THAT(logLines(),
+              ElementsAre("A registration is dropped: the port TelephonyServer is the server's own",
+                          "A registration is dropped: the port LogChannel.00000000-0000-0000-0000-"
+                          "000000000001 is the server's own",
+                          "A registration is dropped: the port Others is not of the process that "
+                          "asks"));
 }
 
 TEST_F(ServerTest, ThereAreNoMoreThan512Registrations) {

@@ -55,6 +55,7 @@ class NotingPorts : public MessagePorts {
     }
     void invalidate() override {}
     [[nodiscard]] bool isValid() const override { return true; }
+    [[nodiscard]] ProcessNumber owner() const override { return kUnknownProcess; }
 
    private:
     NotingPorts& _ports;

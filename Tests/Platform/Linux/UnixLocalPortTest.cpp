@@ -2,8 +2,10 @@
 // Local ports, against senders that write bytes.
 #include <fcntl.h>
 #include <sys/resource.h>
+#include <sys/wait.h>
 
 #include <algorithm>
+#include <csignal>
 
 #include "Tests/Platform/Linux/PortFixture.h"
 
@@ -431,6 +433,55 @@ TEST_F(UnixLocalPortTest, AHandlerMayRunTheEventLoop) {
   ASSERT_TRUE(turnUntilMessages(10));
   EXPECT_EQ(deepest, 1);
   for (int id = 0; id < 10; ++id) EXPECT_EQ(messages[static_cast<std::size_t>(id)].id, id);
+}
+
+// Who sends.
+
+/// Connects to the socket at `path` in a process of its own, sends `bytes` and stays.
+class SendingChild {
+ public:
+  SendingChild(const std::filesystem::path& path, const Bytes& bytes) : _process(::fork()) {
+    if (_process != 0) return;
+    RawPeer peer = RawPeer::connectedTo(path);
+    peer.send(bytes);
+    for (;;) ::pause();
+  }
+  ~SendingChild() {
+    ::kill(_process, SIGKILL);
+    ::waitpid(_process, nullptr, 0);
+  }
+  SendingChild(const SendingChild&) = delete;
+  SendingChild& operator=(const SendingChild&) = delete;
+
+  [[nodiscard]] ProcessNumber process() const noexcept { return _process; }
+
+ private:
+  pid_t _process;
+};
+
+TEST_F(UnixLocalPortTest, KnowsTheSenderOfWhatItsHandlerAnswers) {
+  std::shared_ptr<LocalPort> port;
+  std::vector<ProcessNumber> senders;
+  port = ports->createLocalPort("A", [&](std::int32_t, ByteView) -> std::optional<Bytes> {
+    senders.push_back(port->sender());
+    const bool isFirst = senders.size() == 1;
+    EXPECT_TRUE(!isFirst || turnUntil([&] { return senders.size() >= 3; }));  // the other's turn
+    senders.push_back(port->sender());
+    return std::nullopt;
+  });
+  RawPeer mine = connectRaw("A");
+  const SendingChild child(pathOf("A"), frame(kMessage, 0, 0, "x"));
+  ASSERT_TRUE(turnUntil([&] {
+    mine.send(frame(kMessage, 0, 0, "x"));
+    return senders.size() >= 4;
+  }));
+  const std::vector<ProcessNumber> both = {::getpid(), child.process()};
+  EXPECT_THAT(both, ::testing::Contains(senders[0]));
+  EXPECT_THAT(both, ::testing::Contains(senders[1]));
+  EXPECT_NE(senders[0], senders[1]);
+  EXPECT_EQ(senders[1], senders[2]);
+  EXPECT_EQ(senders[0], senders[3]);
+  EXPECT_EQ(port->sender(), kUnknownProcess);
 }
 
 // Fairness and limits.

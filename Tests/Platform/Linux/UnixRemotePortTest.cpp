@@ -450,6 +450,7 @@ class IdleChild {
   IdleChild(const IdleChild&) = delete;
   IdleChild& operator=(const IdleChild&) = delete;
 
+  [[nodiscard]] pid_t process() const noexcept { return _process; }
   void stop() {
     ::kill(_process, SIGSTOP);
     int status = 0;
@@ -479,6 +480,24 @@ TEST_F(UnixRemotePortTest, AStoppedPeerBlocksNothingBeyondTheTimeouts) {
   EXPECT_TRUE(ports->createRemotePort("Child"));
   remote.reset();
   EXPECT_LT(std::chrono::steady_clock::now() - begin, 1s);
+}
+
+TEST_F(UnixRemotePortTest, KnowsTheProcessThatOwnsThePort) {
+  const IdleChild child(pathOf("Child"));
+  const auto port = openPort("Mine");
+  EXPECT_EQ(ports->createRemotePort("Child")->owner(), child.process());
+  EXPECT_EQ(ports->createRemotePort("Mine")->owner(), ::getpid());
+}
+
+TEST_F(UnixRemotePortTest, ALinkToAPortIsNoPort) {
+  const auto port = openPort("Mine");
+  std::filesystem::create_symlink(pathOf("Mine"), pathOf("Link"));
+  std::filesystem::create_symlink("Nowhere", pathOf("Broken"));
+  EXPECT_FALSE(ports->createRemotePort("Link"));
+  EXPECT_FALSE(ports->createRemotePort("Broken"));
+  EXPECT_THAT(logTexts(),
+              ElementsAre("Message port \"Link\": cannot connect: it is a symbolic link",
+                          "Message port \"Broken\": cannot connect: it is a symbolic link"));
 }
 
 TEST_F(UnixRemotePortTest, AKilledPeerIsInvalidAtOnce) {

@@ -72,6 +72,25 @@ TEST_F(InMemoryPortsTest, TimeoutsThatAreAskedForTakeTheirTime) {
   EXPECT_EQ(queue.elapsed(), 9s);
 }
 
+TEST_F(InMemoryPortsTest, PortsTellOfWhichProcessTheyAre) {
+  const auto other = ports.portsOf(7);
+  const auto mine =
+      ports.createLocalPort("Mine", [](std::int32_t, ByteView) { return std::optional<Bytes>(); });
+  std::vector<ProcessNumber> senders;
+  std::shared_ptr<LocalPort> others;
+  others = other->createLocalPort("Others", [&](std::int32_t, ByteView) -> std::optional<Bytes> {
+    senders.push_back(others->sender());
+    return std::nullopt;
+  });
+  EXPECT_EQ(other->createRemotePort("Mine")->owner(), InMemoryPorts::kOwnProcess);
+  EXPECT_EQ(ports.createRemotePort("Others")->owner(), 7);
+  static_cast<void>(ports.createRemotePort("Others")->request(0, {}, 1s, 1s));
+  static_cast<void>(other->createRemotePort("Others")->post(0, {}));
+  queue.runReady();
+  EXPECT_THAT(senders, ElementsAre(InMemoryPorts::kOwnProcess, 7));
+  EXPECT_EQ(others->sender(), kUnknownProcess);
+}
+
 TEST_F(InMemoryPortsTest, NothingRunsWhileARequestWaits) {
   std::vector<std::string> events;
   queue.postAfter(1s, [&] { events.emplace_back("block"); });
