@@ -18,7 +18,8 @@ TEMPLATES = {
     "UTRAN2": "UTRAN",
     "Ondrel_CDMA": "C2KTemplate",
 }
-WORDS = {"IFX": "IFX", "Ondrel_GSM": "GsmUmts", "Ondrel_CDMA": "C2K", "LTE": "LTE", "UTRAN2": "UTRAN"}
+WORDS = {"IFX": "IFX", "Ondrel_GSM": "GsmUmts", "Ondrel_CDMA": "C2K", "LTE": "LTE",
+         "UTRAN2": "UTRAN"}
 TECHNOLOGIES = ["IFX", "Ondrel_GSM", "Ondrel_CDMA", "LTE", "UTRAN2"]  # as the program lists them
 KINDS = 40  # of messages, per technology
 # Payloads on both sides of every minimum length, for each of the plain reader's codes.
