@@ -83,9 +83,9 @@ class DriveTestLog {
 
   /// The next usable row, or nothing at the end. A row that cannot be used (its number of fields
   /// differs from the first line's, its time or network mode is unreadable) is left out; a value
-  /// that is none counts as not measured. Both are counted. A value that was not measured ("-", or
-  /// nothing) keeps the last one of the row's family, a network mode the last row's. An error means
-  /// that the system could read no further.
+  /// that is no usable number counts as not measured. Both are counted. A value that was not
+  /// measured ("-", or nothing) keeps the last one of the row's family, a network mode the last
+  /// row's. An error means that the system could read no further.
   [[nodiscard]] Result<std::optional<DriveTestRow>> next();
 
   [[nodiscard]] const DriveTestProblems& problems() const noexcept { return _problems; }

@@ -52,7 +52,7 @@ class C2KParser {
   [[nodiscard]] bool isLongEnough(PacketView packet) const noexcept {
     return packet.size() >= _reading.minimumLength;
   }
-  /// Like the other, leaving a line in the log for a packet that is not.
+  /// Like the overload without a log; a packet that is too short leaves a line in `log`.
   [[nodiscard]] bool isLongEnough(PacketView packet, SystemLog& log) const;
 
  private:

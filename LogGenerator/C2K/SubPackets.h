@@ -30,8 +30,8 @@ struct SubPacketSearch {
   std::uint16_t badSize = 0;
 };
 
-/// Looks for the first sub-packet with an identifier, from the first one on and past none that
-/// reaches too far. Takes at most as many steps as a packet can have sub-packets, 255, whatever
+/// Looks for the first sub-packet with this identifier, and stops at one that reaches too far past
+/// the packet's end. Takes at most as many steps as a packet can have sub-packets, 255, whatever
 /// their sizes.
 [[nodiscard]] SubPacketSearch searchSubPacket(PacketView packet, std::uint8_t id);
 

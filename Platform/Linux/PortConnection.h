@@ -34,8 +34,8 @@ using PortDeadline = std::chrono::steady_clock::time_point;
 /// `timeout` from now; negative timeouts are over at once, enormous ones are cut to a day.
 [[nodiscard]] PortDeadline portDeadline(std::chrono::nanoseconds timeout);
 
-/// An open socket with what waits to be sent and what has arrived. Nothing here blocks, save
-/// `waitFor` up to its deadline. The derived classes read; made by make_shared only.
+/// An open socket, the frames that wait to be sent on it, and the bytes that have arrived. Only
+/// `waitFor` blocks, up to its deadline. Derived classes take the frames. Made by make_shared only.
 class PortConnection : public std::enable_shared_from_this<PortConnection> {
  public:
   /// The most that may wait in a send queue, headers included.
