@@ -7,6 +7,8 @@ import re
 LINK = re.compile(r"\[[^\]]*\]\(([^)\s]+)\)")
 FENCE = re.compile(r"^\s*(```|~~~)")
 ELSEWHERE = re.compile(r"[a-z][a-z0-9+.-]*:|#")
+CODE_SPAN = re.compile(r"`([^`\s]+)`")
+PLACEHOLDER = re.compile(r"[*…=<$]|WORD|PRESET")
 TEST_NAME = re.compile(r"`([A-Z]\w*\.\w+)`")
 TEST_MACRO = re.compile(r"\bTEST(?:_F|_P)?\(\s*(\w+),\s*(\w+)\s*\)")
 FOLDER_LINE = re.compile(r"^([A-Z][A-Za-z]*)/\s")
@@ -44,6 +46,27 @@ def broken_links(root):
             if not (document.parent / target.partition("#")[0]).exists():
                 broken.append(f"{document.relative_to(root).as_posix()}: {target}")
     return broken
+
+
+def is_there(root, path):
+    """Whether a path, perhaps without its suffix, names a file or a folder of the tree."""
+    place = root / path
+    return place.exists() or any(place.parent.glob(f"{place.name}.*"))
+
+
+def unknown_paths(root):
+    """Every path in code spans of a Markdown document that begins with a folder of the tree and
+    names nothing in it, as "document: path". Spans with a placeholder are passed over."""
+    root = pathlib.Path(root)
+    folders = existing_folders(root)
+    unknown = []
+    for document in (path for path in files(root) if path.suffix == ".md"):
+        prose = (line for line, fenced in prose_and_code(document.read_text("utf-8")) if not fenced)
+        for path in (path for line in prose for path in CODE_SPAN.findall(line)):
+            is_ours = "/" in path and path.split("/")[0] in folders
+            if is_ours and not PLACEHOLDER.search(path) and not is_there(root, path):
+                unknown.append(f"{document.relative_to(root).as_posix()}: {path}")
+    return unknown
 
 
 def unknown_tests(root, document):

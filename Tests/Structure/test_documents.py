@@ -1,5 +1,5 @@
 # SPDX-License-Identifier: MIT
-"""Links in documents resolve, the README's map is true, property lists carry no DOCTYPE line."""
+"""Links and paths in documents resolve, the README's map is true, property lists have no DOCTYPE."""
 
 import pathlib
 import tempfile
@@ -13,6 +13,9 @@ ROOT = pathlib.Path(__file__).resolve().parents[2]
 class Tree(unittest.TestCase):
     def test_every_relative_link_resolves(self):
         self.assertEqual(documents.broken_links(ROOT), [])
+
+    def test_every_path_in_a_document_is_there(self):
+        self.assertEqual(documents.unknown_paths(ROOT), [])
 
     def test_the_map_of_folders_is_the_folders(self):
         readme = (ROOT / "README.md").read_text(encoding="utf-8")
@@ -54,6 +57,18 @@ class Check(unittest.TestCase):
     def test_links_elsewhere_and_in_code_are_not_followed(self):
         self.write("README.md", "[a](https://example.org) [b](#c)\n```\n[d](e)\n```\n")
         self.assertEqual(documents.broken_links(self.root), [])
+
+    def test_a_path_that_is_not_there_is_found(self):
+        self.write("Model/Tree.h", "")
+        self.write("README.md", "`Model/Tree.h` `Model/Tree` `Model/` `Model/Stem.h` `Model/Tre`\n")
+        self.assertEqual(documents.unknown_paths(self.root),
+                         ["README.md: Model/Stem.h", "README.md: Model/Tre"])
+
+    def test_paths_of_others_in_code_and_with_placeholders_are_not_looked_for(self):
+        self.write("Model/Tree.h", "")
+        self.write("README.md", "`build/x` `/Model/x` `Model/*Fuzz.cpp` `Model/WORD/`\n"
+                                "```\n`Model/x`\n```\n")
+        self.assertEqual(documents.unknown_paths(self.root), [])
 
     def test_a_test_that_is_none_is_found(self):
         self.write("Tests/A.cpp", "TEST_F(Ports, AreClosed) {}\nTEST(Names,\n     AreKept) {}\n")
