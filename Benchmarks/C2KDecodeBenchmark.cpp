@@ -77,9 +77,7 @@ Message finished(PacketWriter& writer, ShownValues values, Format format) {
   return {writer.finish(Moment{}).value_or(Bytes()), std::move(values), format};
 }
 
-PacketWriter writerOf(const PacketReading& reading) {
-  return {reading.code, reading.minimumLength};
-}
+PacketWriter writerOf(const PacketReading& reading) { return PacketWriter(reading.packet); }
 
 double decibels(double ratio) { return 10 * std::log10(ratio); }
 
@@ -121,7 +119,8 @@ char* formatPilots(const ShownValues& v, char* end) {
 
 Message pilots(Draw& draw, const PacketReading& reading, unsigned count) {
   const RecordTable& records = reading.lists[0].table;
-  PacketWriter writer(reading.code, reading.minimumLength + std::size_t{count} * records.stride);
+  const PacketKind& packet = reading.packet;
+  PacketWriter writer(packet.code, packet.minimumLength + std::size_t{count} * records.stride);
   writer.setCount(records, count);
   ShownValues values;
   for (unsigned i = 0; i < count; ++i) {
@@ -198,7 +197,7 @@ Message oneXStatus(Draw& draw, unsigned /*number*/) {
     values.real.push_back(static_cast<double>(raw) * 334 / 1000 - 63.248);
   }
   values.real.push_back(static_cast<double>(transmitter) / 10);
-  PacketWriter writer(kOneXStatusReading.code, kFingers + 8);
+  PacketWriter writer(kOneXStatusPacket.code, kFingers + 8);
   writer.put(kSubPacketCount, {}, 4);
   writeSubPacket(writer, kState, kOneXStateId, 6);
   writeSubPacket(writer, kRadio, kOneXRadioId, 14);
@@ -223,7 +222,7 @@ char* formatErrorRate(const ShownValues& v, char* end) {
 
 Message trafficFrame(Draw& draw, unsigned /*number*/) {
   const unsigned errors = draw.upTo(1);
-  PacketWriter writer(kTrafficFrameReading.code, kFirstSubPacket + 25);
+  PacketWriter writer(kOneXTrafficFramePacket.code, kFirstSubPacket + 25);
   writer.put(kSubPacketCount, {}, 1);
   writeSubPacket(writer, kFirstSubPacket, kTrafficDemodulationId, 25);
   writer.put(kIsBadFrame, {.here = kFirstSubPacket}, errors);

@@ -182,7 +182,7 @@ BenchmarkPacket mobileAllocation() {
 BenchmarkPacket plainPacket(std::string name, const Section& section, LogCode code,
                             std::span<const std::int64_t> raw, Texts texts) {
   const PacketReading& reading = *readingOf(section, code);
-  PacketWriter writer(code, reading.minimumLength);
+  PacketWriter writer(reading.packet);
   for (std::size_t i = 0; i < raw.size(); ++i) {
     writer.fields(reading.fields).raw(reading.fields[i].key, raw[i]);
   }

@@ -73,7 +73,7 @@ Message servingCell(Draw& draw, unsigned /*number*/) {
                    draw.upTo(1),
                    draw.upTo(15)};
   const PacketReading& packet = reading(kServingCellMeasurementSection);
-  PacketWriter writer(kLTEServingCellCode, packet.minimumLength);
+  PacketWriter writer(kLTEServingCellPacket);
   write(writer.fields(packet.fields), packet.fields, raw);
   return finished(writer, std::move(raw), formatServingCell);
 }
@@ -101,7 +101,7 @@ Message intraFrequency(Draw& draw, unsigned /*number*/) {
   const PacketReading& header = reading(kConnectedModeMeasurementSection);
   const RecordTable& measured = reading(kMeasuredNeighborCellsSection).lists[0].table;
   const RecordTable& detected = reading(kDetectedCellsSection).lists[0].table;
-  PacketWriter writer(kLTEIntraFrequencyCode, header.minimumLength);
+  PacketWriter writer(kLTEIntraFrequencyPacket);
   writer.setCount(measured, kMeasured);
   writer.setCount(detected, kDetected);
   RawValues raw = {1300, draw.upTo(503), draw.upTo(10239), draw.between(60, 320),
@@ -153,7 +153,7 @@ Message neighbors(Draw& draw, unsigned count,
                   std::vector<unsigned> (*cellValues)(Draw&, unsigned)) {
   const PacketReading& header = reading(kNeighborMeasurementSection);
   const RecordTable& records = reading(kNeighborCellsListSection).lists[0].table;
-  PacketWriter writer(kLTENeighborCode, header.minimumLength);
+  PacketWriter writer(kLTENeighborPacket);
   writer.setCount(records, count);
   RawValues raw = {1, 1300, 8};
   write(writer.fields(header.fields), header.fields, raw);
@@ -183,7 +183,7 @@ Message systemInformation(Draw& draw, unsigned /*number*/) {
       draw.upTo(503),     1300, 19300, blocks, blocks, draw.upTo(0xFFFFFFF), draw.upTo(65535),
       draw.between(1, 44)};
   const PacketReading& packet = reading(kLTEServingCellInfoSection);
-  PacketWriter writer(kLTESystemInformationCode, packet.minimumLength);
+  PacketWriter writer(kLTESystemInformationPacket);
   std::vector<Field> shown(packet.fields.begin(), packet.fields.end());
   std::erase_if(shown, [](const Field& field) { return field.placeCount == 0; });
   write(writer.fields(packet.fields), shown, raw);
@@ -197,8 +197,8 @@ char* formatNumbers(const RawValues& v, char* end) {
 
 Message antennas(Draw& draw, unsigned /*number*/) {
   RawValues raw = {draw.between(1, 4)};
-  const PacketReading& packet = *readingOf(kLTEServingCellInfoSection, kLTEAntennasCode);
-  PacketWriter writer(kLTEAntennasCode, packet.minimumLength);
+  const PacketReading& packet = *readingOf(kLTEServingCellInfoSection, kLTEAntennasPacket.code);
+  PacketWriter writer(kLTEAntennasPacket);
   write(writer.fields(packet.fields), packet.fields, raw);
   return finished(writer, std::move(raw), formatNumbers);
 }
@@ -212,7 +212,7 @@ Message reselection(Draw& draw, unsigned /*number*/) {
   RawValues raw = {1, 1300, draw.upTo(503), draw.upTo(7), draw.upTo(65535), draw.upTo(503)};
   const PacketReading& header = reading(kReselectionCandidatesSection);
   const RecordTable& candidates = reading(kReselectionCandidatesListSection).lists[0].table;
-  PacketWriter writer(kLTEReselectionCode, header.minimumLength);
+  PacketWriter writer(kLTEReselectionPacket);
   writer.setCount(candidates, 1);
   write(writer.fields(header.fields), header.fields, std::span(raw).first(3));
   writer.record(candidates, 0)

@@ -49,7 +49,7 @@ char* formatState(const ShownValues& v, char* end) {
 Message rrcState(Draw& draw, unsigned /*number*/) {
   const std::int64_t mode = draw.upTo(kModes.size() - 1);
   const PacketReading& packet = reading(kRRCStateSection);
-  PacketWriter writer(packet.code, packet.minimumLength);
+  PacketWriter writer(packet.packet);
   writer.fields(packet.fields).raw("Mode Valid", 1).raw("State", mode);
   return finished(writer, {.whole = {mode}}, formatState);
 }
@@ -66,7 +66,7 @@ Message systemInformation(Draw& draw, unsigned /*number*/) {
   ShownValues values{
       .whole = {draw.upTo(255), draw.upTo(0xFFFFFFF), 10054, 9504, draw.upTo(255), draw.upTo(1)}};
   const PacketReading& packet = reading(kUTRANServingCellInfoSection);
-  PacketWriter writer(packet.code, packet.minimumLength);
+  PacketWriter writer(packet.packet);
   write(writer.fields(packet.fields), packet.fields, values.whole);
   return finished(writer, std::move(values), formatSystemInformation);
 }
@@ -87,7 +87,7 @@ char* formatNeighbors(const ShownValues& v, char* end) {
 
 Message neighbors(Draw& draw, unsigned /*number*/) {
   const RecordTable& records = table(kUTRANNeighborsSection);
-  PacketWriter writer(kUTRANNeighborsCode, reading(kUTRANNeighborsSection).minimumLength);
+  PacketWriter writer(kUTRANNeighborsPacket);
   writer.setCount(records, kNeighbors);
   ShownValues values;
   for (unsigned i = 0; i < kNeighbors; ++i) {
@@ -116,7 +116,7 @@ char* formatDroppedNumbers(const ShownValues& v, char* end) {
 
 Message gsmNeighbors(Draw& draw, unsigned /*number*/) {
   const RecordTable& records = table(kUTRANGSMNeighborsSection);
-  PacketWriter writer(kUTRANGSMNeighborsCode, reading(kUTRANGSMNeighborsSection).minimumLength);
+  PacketWriter writer(kUTRANGSMNeighborsPacket);
   writer.setCount(records, kGSMNeighbors);
   ShownValues values;
   for (unsigned i = 0; i < kGSMNeighbors; ++i) {
@@ -141,7 +141,7 @@ constexpr unsigned kCompositeChannels = 2;
 Message transportChannels(Draw& draw, unsigned /*number*/) {
   const RecordTable& channels = table(kTRCHBLERSection);
   const RecordTable& composites = table(kCCTRCHSIRSection);
-  PacketWriter writer(kUTRANTransportChannelsCode, reading(kTRCHBLERSection).minimumLength);
+  PacketWriter writer(kUTRANTransportChannelsPacket);
   writer.setCount(channels, kChannels);
   writer.setCount(composites, kCompositeChannels);
   ShownValues values;

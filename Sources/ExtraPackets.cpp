@@ -13,11 +13,11 @@ constexpr double kMegabyte = 1e6;
 
 }  // namespace
 
-std::optional<Bytes> extraPacket(LogCode code, const Value& list, const PropertyListCoding& coding,
-                                 Moment time) {
+std::optional<Bytes> extraPacket(const PacketKind& packet, const Value& list,
+                                 const PropertyListCoding& coding, Moment time) {
   const auto payload = coding.binary(list);
   if (!payload) return std::nullopt;
-  PacketWriter writer(code, kPacketHeaderSize);
+  PacketWriter writer(packet);
   writer.append(*payload);
   return writer.finish(time);
 }

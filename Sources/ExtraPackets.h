@@ -7,7 +7,7 @@
 #include <optional>
 #include <string_view>
 
-#include "LogGenerator/Packets/Section.h"
+#include "LogGenerator/Packets/PacketKind.h"
 #include "Platform/Bytes.h"
 #include "Platform/Clock.h"
 #include "Platform/PropertyList.h"
@@ -16,7 +16,7 @@
 namespace kestro {
 
 /// An extra packet with a property list as its payload.
-[[nodiscard]] std::optional<Bytes> extraPacket(LogCode code, const Value& list,
+[[nodiscard]] std::optional<Bytes> extraPacket(const PacketKind& packet, const Value& list,
                                                const PropertyListCoding& coding, Moment time);
 
 /// The files of the simulated phone's SIM, as hexadecimal texts.

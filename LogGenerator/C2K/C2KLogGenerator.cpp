@@ -71,7 +71,7 @@ class CodeEntries {
         const std::string_view section = place.section;
         add(name, place.key, section).group = section.substr(0, section.find('/'));
       }
-      if (shownAt.empty()) add(name, name, _reading.packetName);
+      if (shownAt.empty()) add(name, name, _reading.packet.name);
     }
   }
 
@@ -81,9 +81,9 @@ class CodeEntries {
   CatalogueEntry& add(std::string_view lookupName, std::string_view key, std::string_view section) {
     auto entry = std::ranges::find(_entries, section, &CatalogueEntry::section);
     if (entry == _entries.end()) {
-      entry = _entries.insert(entry, {.code = _reading.code,
-                                      .packetName = _reading.packetName,
-                                      .minimumLength = _reading.minimumLength,
+      entry = _entries.insert(entry, {.code = _reading.packet.code,
+                                      .packetName = _reading.packet.name,
+                                      .minimumLength = _reading.packet.minimumLength,
                                       .section = section});
     }
     std::ranges::copy(keysOf(_reading, lookupName, key), std::back_inserter(entry->keys));
@@ -107,7 +107,7 @@ C2KLogGenerator::C2KLogGenerator(Platform& platform)
 
 Dictionary C2KLogGenerator::getStartCommand() const {
   Array codes;
-  for (const auto& parser : _parsers) codes.append(Value::integer(parser->reading().code));
+  for (const auto& parser : _parsers) codes.append(Value::integer(parser->reading().packet.code));
   return {{kTelephonySetState, kTelephonyStreaming}, {kTelephonySetOndrelLogCodes, codes}};
 }
 
@@ -122,7 +122,7 @@ std::span<const std::string_view> C2KLogGenerator::stateKeys() const {
 
 C2KParser* C2KLogGenerator::parserOf(LogCode code) const noexcept {
   const auto parser = std::ranges::find(
-      _parsers, code, [](const auto& candidate) { return candidate->reading().code; });
+      _parsers, code, [](const auto& candidate) { return candidate->reading().packet.code; });
   return parser == _parsers.end() ? nullptr : parser->get();
 }
 

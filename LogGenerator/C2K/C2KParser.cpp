@@ -15,7 +15,7 @@ std::vector<std::string_view> C2KParser::lookupNames() const {
 bool C2KParser::isLongEnough(PacketView packet, SystemLog& log) const {
   if (isLongEnough(packet)) return true;
   log.log(LogPriority::Error, "Log code 0x{:04x} is {} bytes long but must be at least {} bytes.",
-          _reading.code, packet.size(), _reading.minimumLength);
+          _reading.packet.code, packet.size(), _reading.packet.minimumLength);
   return false;
 }
 

@@ -50,7 +50,7 @@ class C2KParser {
   explicit C2KParser(const PacketReading& reading) noexcept : _reading(reading) {}
 
   [[nodiscard]] bool isLongEnough(PacketView packet) const noexcept {
-    return packet.size() >= _reading.minimumLength;
+    return packet.size() >= _reading.packet.minimumLength;
   }
   /// Like the overload without a log; a packet that is too short leaves a line in `log`.
   [[nodiscard]] bool isLongEnough(PacketView packet, SystemLog& log) const;

@@ -43,10 +43,9 @@ constexpr ListReading kFingers[] = {{.table = {.name = "finger",
 
 }  // namespace
 
-constinit const PacketReading kEVDOActiveSetReading = {
-    .code = 0x12B6, .packetName = "EV-DO active set", .minimumLength = 25, .lists = kActivePilots};
-constinit const PacketReading kEVDOFingersReading = {
-    .code = 0x108A, .packetName = "EV-DO finger C/I", .minimumLength = 23, .lists = kFingers};
+constexpr PacketReading kEVDOActiveSetReading = {.packet = kEVDOActiveSetPacket,
+                                                 .lists = kActivePilots};
+constexpr PacketReading kEVDOFingersReading = {.packet = kEVDOFingersPacket, .lists = kFingers};
 
 // --- EVDOPilots ----------------------------------------------------------------------------------
 
@@ -78,7 +77,7 @@ void EVDOPilots::parse(PacketView packet, C2KOutput& output) {
 
 void EVDOPilots::explain(PacketView packet, const ExplainVisitor& visit) const {
   if (!isLongEnough(packet) || !hasRightLength(packet)) return;
-  Explainer(reading().packetName, packet, visit).reading(reading());
+  Explainer(reading().packet.name, packet, visit).reading(reading());
 }
 
 // --- The two lists -------------------------------------------------------------------------------
@@ -100,7 +99,7 @@ void EVDOFingers::reportLength(PacketView packet, SystemLog& log) const {
   // The size shown is the header's alone, whatever the count.
   log.log(LogPriority::Error,
           "Log code 0x108a has bad length of {} bytes, but has {} substructs (size={}).",
-          packet.size(), recordsIn(packet), reading().minimumLength);
+          packet.size(), recordsIn(packet), reading().packet.minimumLength);
 }
 
 }  // namespace kestro

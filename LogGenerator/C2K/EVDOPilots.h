@@ -8,6 +8,11 @@
 
 namespace kestro {
 
+inline constexpr PacketKind kEVDOActiveSetPacket = {
+    .code = 0x12B6, .name = "EV-DO active set", .minimumLength = 25};
+inline constexpr PacketKind kEVDOFingersPacket = {
+    .code = 0x108A, .name = "EV-DO finger C/I", .minimumLength = 23};
+
 extern const PacketReading kEVDOActiveSetReading;
 extern const PacketReading kEVDOFingersReading;
 

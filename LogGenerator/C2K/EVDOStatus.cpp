@@ -35,20 +35,20 @@ static_assert(isLayout(kEVDOStatusFields));
 
 }  // namespace
 
-constinit const PacketReading kEVDOStatusReading = {
-    .code = 0x1183, .packetName = "EV-DO status", .minimumLength = 50, .fields = kEVDOStatusFields};
+constexpr PacketReading kEVDOStatusReading = {.packet = kEVDOStatusPacket,
+                                              .fields = kEVDOStatusFields};
 
 void EVDOStatus::parse(PacketView packet, C2KOutput& output) {
   if (!hasRightLength(packet)) {
     output.log.log(LogPriority::Error, "Log code 0x1183 is {} bytes long but should be {} bytes.",
-                   packet.size(), reading().minimumLength);
+                   packet.size(), reading().packet.minimumLength);
     return;
   }
   _fields.store(packet, {}, output.lookup);
 }
 
 void EVDOStatus::explain(PacketView packet, const ExplainVisitor& visit) const {
-  if (hasRightLength(packet)) Explainer(reading().packetName, packet, visit).reading(reading());
+  if (hasRightLength(packet)) Explainer(reading().packet.name, packet, visit).reading(reading());
 }
 
 }  // namespace kestro

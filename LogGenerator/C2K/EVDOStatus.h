@@ -6,6 +6,9 @@
 
 namespace kestro {
 
+inline constexpr PacketKind kEVDOStatusPacket = {
+    .code = 0x1183, .name = "EV-DO status", .minimumLength = 50};
+
 extern const PacketReading kEVDOStatusReading;
 
 /// Shows where the phone's EV-DO receiver is tuned to and what state it is in.
@@ -19,7 +22,7 @@ class EVDOStatus : public C2KParser {
  private:
   /// A packet that is longer is none of these either.
   [[nodiscard]] bool hasRightLength(PacketView packet) const noexcept {
-    return packet.size() == reading().minimumLength;
+    return packet.size() == reading().packet.minimumLength;
   }
 
   StoredFields _fields;

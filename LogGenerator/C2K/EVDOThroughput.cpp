@@ -8,15 +8,14 @@
 namespace kestro {
 namespace {
 
-constexpr bool lieWithin(std::span<const SentCounter> counters, std::size_t size) {
-  return std::ranges::all_of(counters, [size](const SentCounter& counter) {
-    return counter.offset + sizeof(std::uint32_t) <= size;
+constexpr bool lieWithin(std::span<const SentCounter> counters, const PacketKind& packet) {
+  return std::ranges::all_of(counters, [&packet](const SentCounter& counter) {
+    return counter.offset + sizeof(std::uint32_t) <= packet.minimumLength;
   });
 }
 
 // --- 0x1192: forward link: 56 counters in a row --------------------------------------------------
 
-constexpr std::size_t kForwardSize = 241;
 constexpr std::uint16_t kForwardBits[] = {
     128,  256,  512, 1024, 0,    128,  256,  512,  1024, 0,    128,  256,  512,  1024,
     0,    128,  256, 512,  1024, 0,    128,  256,  512,  1024, 0,    512,  1024, 2048,
@@ -32,11 +31,11 @@ constexpr auto forwardCounters() {
   return counters;
 }
 constexpr auto kForwardCounters = forwardCounters();
-static_assert(kForwardCounters.size() == 56 && lieWithin(kForwardCounters, kForwardSize));
+static_assert(kForwardCounters.size() == 56 &&
+              lieWithin(kForwardCounters, kEVDOForwardThroughputPacket));
 
 // --- 0x127E: reverse link: three blocks of counters for twelve rates -----------------------------
 
-constexpr std::size_t kReverseSize = 1750;
 constexpr std::uint16_t kReverseBits[] = {128,  256,  512,  768,  1024, 1536,
                                           2048, 3072, 4096, 6144, 8192, 12288};
 constexpr std::uint16_t kReverseOffsets[] = {18, 22, 26, 30, 306, 310, 314, 318};
@@ -60,27 +59,23 @@ constexpr auto reverseCounters() {
   return counters;
 }
 constexpr auto kReverseCounters = reverseCounters();
-static_assert(lieWithin(kReverseCounters, kReverseSize));
+static_assert(lieWithin(kReverseCounters, kEVDOReverseThroughputPacket));
 
 /// A rate depends on two packets.
 constexpr std::string_view kSinceLastPacket = "(since the packet before)";
 
 }  // namespace
 
-constinit const ThroughputLayout kForwardThroughput = {
-    .reading = {.code = 0x1192,
-                .packetName = "EV-DO forward throughput",
-                .minimumLength = kForwardSize},
+constexpr ThroughputLayout kForwardThroughput = {
+    .reading = {.packet = kEVDOForwardThroughputPacket},
     .sequenceNumber = u32(13),
     .counters = kForwardCounters,
     .rateName = "kFLDataRate",
     .sequenceStateKey = kStateFLDataSeqNum,
     .sentStateKey = kStateFLDataSent};
 
-constinit const ThroughputLayout kReverseThroughput = {
-    .reading = {.code = 0x127E,
-                .packetName = "EV-DO reverse throughput",
-                .minimumLength = kReverseSize},
+constexpr ThroughputLayout kReverseThroughput = {
+    .reading = {.packet = kEVDOReverseThroughputPacket},
     .sequenceNumber = u32(14),
     .counters = kReverseCounters,
     .rateName = "kRLDataRate",
@@ -154,8 +149,8 @@ void EVDOThroughput::storeRate(const Sample& previous, const Sample& current,
 
 void EVDOThroughput::explain(PacketView packet, const ExplainVisitor& visit) const {
   if (!isLongEnough(packet)) return;
-  const Explainer explainer(reading().packetName, packet, visit);
-  ExplainedValue rate{.section = reading().packetName, .key = _layout.rateName};
+  const Explainer explainer(reading().packet.name, packet, visit);
+  ExplainedValue rate{.section = reading().packet.name, .key = _layout.rateName};
   rate.sources.push_back(explainer.source(_layout.sequenceNumber, {}));
   for (const SentCounter& counter : _layout.counters) {
     rate.sources.push_back(explainer.source(counter.place(), {}));

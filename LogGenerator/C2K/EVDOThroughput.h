@@ -13,6 +13,11 @@
 
 namespace kestro {
 
+inline constexpr PacketKind kEVDOForwardThroughputPacket = {
+    .code = 0x1192, .name = "EV-DO forward throughput", .minimumLength = 241};
+inline constexpr PacketKind kEVDOReverseThroughputPacket = {
+    .code = 0x127E, .name = "EV-DO reverse throughput", .minimumLength = 1750};
+
 /// One of a packet's counters, and how many bits each of its counts stands for.
 struct SentCounter {
   std::uint16_t offset;

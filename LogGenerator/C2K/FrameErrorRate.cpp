@@ -48,8 +48,7 @@ Value FrameErrorRate::oldText() const { return percentText("%.02f%% (old)", _rat
 
 // --- 0x119D --------------------------------------------------------------------------------------
 
-constinit const PacketReading kTrafficFrameReading = {
-    .code = 0x119D, .packetName = "1x traffic frame", .minimumLength = 17};
+constexpr PacketReading kTrafficFrameReading = {.packet = kOneXTrafficFramePacket};
 
 std::vector<std::string_view> TrafficFrame::lookupNames() const { return {kFrameErrorRateName}; }
 
@@ -69,7 +68,7 @@ void TrafficFrame::parse(PacketView packet, C2KOutput& output) {
 void TrafficFrame::explain(PacketView packet, const ExplainVisitor& visit) const {
   const auto demodulation = searchSubPacket(packet, kTrafficDemodulationId).start;
   if (!isLongEnough(packet) || !demodulation) return;
-  const std::string_view section = reading().packetName;
+  const std::string_view section = reading().packet.name;
   visit(
       {.section = section,
        .key = kFrameErrorRateName,

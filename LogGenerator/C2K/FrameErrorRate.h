@@ -34,6 +34,9 @@ class FrameErrorRate {
   float _rate;
 };
 
+inline constexpr PacketKind kOneXTrafficFramePacket = {
+    .code = 0x119D, .name = "1x traffic frame", .minimumLength = 17};
+
 extern const PacketReading kTrafficFrameReading;
 
 /// The identifier of its sub-packet, and where that says whether a frame was bad.

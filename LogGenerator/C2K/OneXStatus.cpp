@@ -49,8 +49,7 @@ constexpr std::string_view kFromEarlierPackets = "(from the packets before)";
 
 }  // namespace
 
-constinit const PacketReading kOneXStatusReading = {
-    .code = 0x119C, .packetName = "1x status", .minimumLength = 17};
+constexpr PacketReading kOneXStatusReading = {.packet = kOneXStatusPacket};
 
 constinit const std::span<const Field> kOneXStatusFields = kOneXFields;
 
@@ -101,7 +100,7 @@ void OneXStatus::explain(PacketView packet, const ExplainVisitor& visit) const {
                          searchSubPacket(packet, kOneXActiveSetId).start,
                          searchSubPacket(packet, kOneXFingersId).start};
   if (!found.areComplete()) return;
-  const std::string_view section = reading().packetName;
+  const std::string_view section = reading().packet.name;
   const Explainer explainer(section, packet, visit);
   explainer.fields(kOneXFields, found.position());
   OneXActiveSet(packet, *found.activeSet).explain(section, kActiveSetName, visit);

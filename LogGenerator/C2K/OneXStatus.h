@@ -12,6 +12,9 @@
 
 namespace kestro {
 
+inline constexpr PacketKind kOneXStatusPacket = {
+    .code = 0x119C, .name = "1x status", .minimumLength = 17};
+
 extern const PacketReading kOneXStatusReading;
 
 /// The identifiers of its sub-packets.

@@ -51,10 +51,8 @@ std::int64_t versionOf(PacketView packet) { return readNumber(kVersion, packet, 
 
 }  // namespace
 
-constinit const PacketReading kOneXSystemParametersReading = {.code = 0x134F,
-                                                              .packetName = "1x system parameters",
-                                                              .minimumLength = 171,
-                                                              .fields = kSystemParametersFields};
+constexpr PacketReading kOneXSystemParametersReading = {.packet = kOneXSystemParametersPacket,
+                                                        .fields = kSystemParametersFields};
 
 void OneXSystemParameters::parse(PacketView packet, C2KOutput& output) {
   if (!isLongEnough(packet, output.log)) return;
@@ -69,7 +67,7 @@ void OneXSystemParameters::parse(PacketView packet, C2KOutput& output) {
 
 void OneXSystemParameters::explain(PacketView packet, const ExplainVisitor& visit) const {
   if (!isLongEnough(packet) || versionOf(packet) < kFirstKnownVersion) return;
-  Explainer(reading().packetName, packet, visit).reading(reading());
+  Explainer(reading().packet.name, packet, visit).reading(reading());
 }
 
 }  // namespace kestro

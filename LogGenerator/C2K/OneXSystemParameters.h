@@ -6,6 +6,9 @@
 
 namespace kestro {
 
+inline constexpr PacketKind kOneXSystemParametersPacket = {
+    .code = 0x134F, .name = "1x system parameters", .minimumLength = 171};
+
 extern const PacketReading kOneXSystemParametersReading;
 
 /// Shows which system and base station serve the phone, and whether it roams. Packets of an early

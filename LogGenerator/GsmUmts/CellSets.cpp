@@ -71,26 +71,10 @@ constexpr RecordTable withoutRows(RecordTable table) {
 constexpr ListReading kActiveSetList[] = {{.table = kActiveCells}};
 constexpr ListReading kEmptySetList[] = {{.table = withoutRows(kActiveCells)}};
 
-constexpr PacketReading setInformation(std::span<const ListReading> lists) {
-  return {.code = 0x417A,
-          .packetName = "UMTS set information",
-          .minimumLength = 16,
-          .fields = kSetInformation,
-          .lists = lists};
-}
-constexpr PacketReading kActiveSetReading[] = {setInformation(kActiveSetList)};
-constexpr PacketReading kEmptySetReading[] = {setInformation(kEmptySetList)};
-
-constexpr auto kSetCodes = codesOf(kActiveSetReading);
-
-constexpr Section setSection(std::string_view name, std::string_view logLine,
-                             std::span<const PacketReading> readings) {
-  return {.name = name,
-          .logLine = logLine,
-          .kind = SectionKind::List,
-          .readings = readings,
-          .codes = kSetCodes};
-}
+constexpr PacketReading kActiveSetReadings[] = {
+    {.packet = kUMTSSetInformationPacket, .fields = kSetInformation, .lists = kActiveSetList}};
+constexpr PacketReading kEmptySetReadings[] = {
+    {.packet = kUMTSSetInformationPacket, .fields = kSetInformation, .lists = kEmptySetList}};
 
 // --- 0x4005: idle-mode cell ranking, at least 15 bytes -------------------------------------------
 
@@ -115,9 +99,7 @@ constexpr ListReading kRankedUMTSCells[] = {{.table = {
                                              }}};
 
 constexpr PacketReading kUMTSSetReadings[] = {
-    {.code = IdleModeRanking::kCode,
-     .packetName = IdleModeRanking::kName,
-     .minimumLength = IdleModeRanking::kMinimumLength,
+    {.packet = kIdleModeRankingPacket,
      .fields = IdleModeRanking::kCounts,
      .lists = kRankedUMTSCells},
 };
@@ -144,8 +126,7 @@ constexpr ListedValue kUMTSNeighbourValues[] = {
 };
 
 constexpr PropertyListReading kNeighbours = {
-    .code = kCellMonitorCode,
-    .packetName = kCellMonitorListName,
+    .packet = kCellMonitorPacket,
     .part = ListedPart::EachCell,
     .cells = {.technologies = {kTqCellMonitorRadioAccessTechnologyUMTS},
               .type = kTqCellMonitorCellTypeNeighbor},
@@ -153,23 +134,41 @@ constexpr PropertyListReading kNeighbours = {
     .missingListLine = kMissingCellArrayLine,
 };
 
-constexpr auto kUMTSSetCodes = codesOf(kUMTSSetReadings, kCellMonitorCode);
-
 }  // namespace
 
-constexpr Section kActiveSetSection = setSection("Active Set", "ActiveSet", kActiveSetReading);
-constexpr Section kDetectedSetSection = setSection("Detected Set", "DetectedSet", kEmptySetReading);
-constexpr Section kMonitoredSetSection =
-    setSection("Monitored Set", "MonitoredSet", kEmptySetReading);
-constexpr Section kVirtualActiveSetSection =
-    setSection("Virtual Active Set", "VirtualActiveSet", kEmptySetReading);
+constexpr Section kActiveSetSection = {
+    .name = "Active Set",
+    .logLine = "ActiveSet",
+    .kind = SectionKind::List,
+    .readings = kActiveSetReadings,
+};
+
+constexpr Section kDetectedSetSection = {
+    .name = "Detected Set",
+    .logLine = "DetectedSet",
+    .kind = SectionKind::List,
+    .readings = kEmptySetReadings,
+};
+
+constexpr Section kMonitoredSetSection = {
+    .name = "Monitored Set",
+    .logLine = "MonitoredSet",
+    .kind = SectionKind::List,
+    .readings = kEmptySetReadings,
+};
+
+constexpr Section kVirtualActiveSetSection = {
+    .name = "Virtual Active Set",
+    .logLine = "VirtualActiveSet",
+    .kind = SectionKind::List,
+    .readings = kEmptySetReadings,
+};
 
 constexpr Section kUMTSSetSection = {
     .name = "UMTS Set",
     .logLine = "UMTSSet",
     .kind = SectionKind::List,
     .readings = kUMTSSetReadings,
-    .codes = kUMTSSetCodes,
     .propertyList = &kNeighbours,
 };
 

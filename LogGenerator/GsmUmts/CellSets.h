@@ -8,12 +8,14 @@
 
 namespace kestro {
 
-/// 0x4005, the idle-mode cell ranking, as far as its UMTS and GSM cells have it in common. The
-/// cells of both kinds are read from the same offset: a packet carries one kind.
+inline constexpr PacketKind kUMTSSetInformationPacket = {
+    .code = 0x417A, .name = "UMTS set information", .minimumLength = 16};
+inline constexpr PacketKind kIdleModeRankingPacket = {
+    .code = 0x4005, .name = "Idle-mode cell ranking", .minimumLength = 15};
+
+/// The idle-mode cell ranking, as far as its UMTS and GSM cells have it in common. The cells of
+/// both kinds are read from the same offset: a packet carries one kind.
 struct IdleModeRanking {
-  static constexpr LogCode kCode = 0x4005;
-  static constexpr std::string_view kName = "Idle-mode cell ranking";
-  static constexpr std::size_t kMinimumLength = 15;
   static constexpr Place kUMTSCellCount = u8(13);
   static constexpr Place kGSMCellCount = u8(14);
   static constexpr unsigned kFirstCell = 15;

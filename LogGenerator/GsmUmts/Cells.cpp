@@ -125,8 +125,7 @@ constexpr ListedValue kGSMServingCellValues[] = {
 };
 
 constexpr PropertyListReading kListedServingCell = {
-    .code = kCellMonitorCode,
-    .packetName = kCellMonitorListName,
+    .packet = kCellMonitorPacket,
     .part = ListedPart::FirstCell,
     .cells = {.technologies = {kTqCellMonitorRadioAccessTechnologyGSM},
               .type = kTqCellMonitorCellTypeServing},
@@ -147,8 +146,7 @@ constexpr ListedValue kGSMNeighbourValues[] = {
 };
 
 constexpr PropertyListReading kListedNeighbours = {
-    .code = kCellMonitorCode,
-    .packetName = kCellMonitorListName,
+    .packet = kCellMonitorPacket,
     .part = ListedPart::EachCell,
     .cells = {.technologies = {kTqCellMonitorRadioAccessTechnologyGSM},
               .type = kTqCellMonitorCellTypeNeighbor},
@@ -159,52 +157,25 @@ constexpr PropertyListReading kListedNeighbours = {
 // --- What the sections take ----------------------------------------------------------------------
 
 constexpr PacketReading kGSMServingCellReadings[] = {
-    {.code = 0x5134,
-     .packetName = "GSM serving-cell identity",
-     .minimumLength = 26,
-     .fields = kServingCellIdentity},
-    {.code = GSMMeasurements::kCode,
-     .packetName = GSMMeasurements::kName,
-     .minimumLength = GSMMeasurements::kMinimumLength,
-     .fields = kServingCellMeasurements},
-    {.code = 0x5076,
-     .packetName = "Dedicated-mode channel",
-     .minimumLength = 17,
-     .fields = kDedicatedChannel},
+    {.packet = kGSMServingCellPacket, .fields = kServingCellIdentity},
+    {.packet = kGSMMeasurementsPacket, .fields = kServingCellMeasurements},
+    {.packet = kGSMDedicatedChannelPacket, .fields = kDedicatedChannel},
 };
-constexpr auto kGSMServingCellCodes = codesOf(kGSMServingCellReadings, kCellMonitorCode);
 
 constexpr PacketReading kNeighboringCellsReadings[] = {
-    {.code = GSMMeasurements::kCode,
-     .packetName = GSMMeasurements::kName,
-     .minimumLength = GSMMeasurements::kMinimumLength,
-     .fields = kNeighbourCount,
-     .lists = kMeasuredNeighbours},
-    {.code = 0x51FF,
-     .packetName = "Neighbour BSIC list",
-     .minimumLength = 15,
-     .fields = kBSICCount,
-     .lists = kBSICList},
+    {.packet = kGSMMeasurementsPacket, .fields = kNeighbourCount, .lists = kMeasuredNeighbours},
+    {.packet = kGSMNeighbourBSICsPacket, .fields = kBSICCount, .lists = kBSICList},
 };
-constexpr auto kNeighboringCellsCodes = codesOf(kNeighboringCellsReadings, kCellMonitorCode);
 
 constexpr PacketReading kGSMSetReadings[] = {
-    {.code = IdleModeRanking::kCode,
-     .packetName = IdleModeRanking::kName,
-     .minimumLength = IdleModeRanking::kMinimumLength,
+    {.packet = kIdleModeRankingPacket,
      .fields = IdleModeRanking::kCounts,
      .lists = kRankedGSMCells},
 };
-constexpr auto kGSMSetCodes = codesOf(kGSMSetReadings);
 
 constexpr PacketReading kMobileAllocationReadings[] = {
-    {.code = 0x51F8,
-     .packetName = "Mobile allocation",
-     .minimumLength = 15,
-     .fields = kMobileAllocation,
-     .lists = kFrequencies},
+    {.packet = kGSMMobileAllocationPacket, .fields = kMobileAllocation, .lists = kFrequencies},
 };
-constexpr auto kMobileAllocationCodes = codesOf(kMobileAllocationReadings);
 
 }  // namespace
 
@@ -213,7 +184,6 @@ constexpr Section kGSMServingCellSection = {
     .logLine = "GSMServingCell",
     .kind = SectionKind::Dictionary,
     .readings = kGSMServingCellReadings,
-    .codes = kGSMServingCellCodes,
     .propertyList = &kListedServingCell,
 };
 
@@ -222,7 +192,6 @@ constexpr Section kNeighboringCellsSection = {
     .logLine = "NeighboringCells",
     .kind = SectionKind::List,
     .readings = kNeighboringCellsReadings,
-    .codes = kNeighboringCellsCodes,
     .propertyList = &kListedNeighbours,
 };
 
@@ -231,7 +200,6 @@ constexpr Section kGSMSetSection = {
     .logLine = "GSMSet",
     .kind = SectionKind::List,
     .readings = kGSMSetReadings,
-    .codes = kGSMSetCodes,
 };
 
 constexpr Section kMobileAllocationSection = {
@@ -239,7 +207,6 @@ constexpr Section kMobileAllocationSection = {
     .logLine = "MobileAllocation",
     .kind = SectionKind::Dictionary,
     .readings = kMobileAllocationReadings,
-    .codes = kMobileAllocationCodes,
 };
 
 // --- NeighboringCells ----------------------------------------------------------------------------

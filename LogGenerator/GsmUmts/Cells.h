@@ -11,12 +11,20 @@
 
 namespace kestro {
 
-/// 0x5137, GSM serving and neighbour measurements, in the packet's order. Three sections show the
-/// serving cell's values, each in its own way.
+inline constexpr PacketKind kGSMServingCellPacket = {
+    .code = 0x5134, .name = "GSM serving-cell identity", .minimumLength = 26};
+inline constexpr PacketKind kGSMMeasurementsPacket = {
+    .code = 0x5137, .name = "GSM serving and neighbour measurements", .minimumLength = 29};
+inline constexpr PacketKind kGSMNeighbourBSICsPacket = {
+    .code = 0x51FF, .name = "Neighbour BSIC list", .minimumLength = 15};
+inline constexpr PacketKind kGSMDedicatedChannelPacket = {
+    .code = 0x5076, .name = "Dedicated-mode channel", .minimumLength = 17};
+inline constexpr PacketKind kGSMMobileAllocationPacket = {
+    .code = 0x51F8, .name = "Mobile allocation", .minimumLength = 15};
+
+/// The GSM measurements, in the packet's order. Three sections show the serving cell's values, each
+/// in its own way.
 struct GSMMeasurements {
-  static constexpr LogCode kCode = 0x5137;
-  static constexpr std::string_view kName = "GSM serving and neighbour measurements";
-  static constexpr std::size_t kMinimumLength = 29;
   static constexpr Place kServingLevel = u8(15);
   static constexpr Place kServingQualityFull = u32(16);
   static constexpr Place kServingQualitySub = u32(20);

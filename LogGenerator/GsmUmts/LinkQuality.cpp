@@ -30,13 +30,8 @@ constexpr ListReading kChannels[] = {{
 }};
 
 constexpr PacketReading kBLERReadings[] = {
-    {.code = 0x4116,
-     .packetName = "Downlink transport-channel BLER",
-     .minimumLength = 16,
-     .fields = kBLER,
-     .lists = kChannels},
+    {.packet = kUMTSBlockErrorsPacket, .fields = kBLER, .lists = kChannels},
 };
-constexpr auto kBLERCodes = codesOf(kBLERReadings);
 
 // --- 0x4221: HSDPA decoding statistics, at least 18 bytes ----------------------------------------
 
@@ -91,13 +86,8 @@ constexpr ListReading kHARQProcesses[] = {
 };
 
 constexpr PacketReading kHSDPAReadings[] = {
-    {.code = 0x4221,
-     .packetName = "HSDPA decoding statistics",
-     .minimumLength = 18,
-     .fields = kHSDPA,
-     .lists = kHARQProcesses},
+    {.packet = kHSDPAStatisticsPacket, .fields = kHSDPA, .lists = kHARQProcesses},
 };
-constexpr auto kHSDPACodes = codesOf(kHSDPAReadings);
 
 }  // namespace
 
@@ -106,7 +96,6 @@ constexpr Section kBLERSection = {
     .logLine = "BLER",
     .kind = SectionKind::Dictionary,
     .readings = kBLERReadings,
-    .codes = kBLERCodes,
 };
 
 constexpr Section kHSDPAInformationSection = {
@@ -114,7 +103,6 @@ constexpr Section kHSDPAInformationSection = {
     .logLine = "HSDPAInformation",
     .kind = SectionKind::Dictionary,
     .readings = kHSDPAReadings,
-    .codes = kHSDPACodes,
 };
 
 }  // namespace kestro

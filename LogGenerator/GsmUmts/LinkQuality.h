@@ -7,6 +7,11 @@
 
 namespace kestro {
 
+inline constexpr PacketKind kUMTSBlockErrorsPacket = {
+    .code = 0x4116, .name = "Downlink transport-channel BLER", .minimumLength = 16};
+inline constexpr PacketKind kHSDPAStatisticsPacket = {
+    .code = 0x4221, .name = "HSDPA decoding statistics", .minimumLength = 18};
+
 extern const Section kBLERSection;
 extern const Section kHSDPAInformationSection;
 

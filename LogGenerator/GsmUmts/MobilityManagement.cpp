@@ -184,8 +184,7 @@ constexpr ListedValue kServingPLMNValues[] = {
 };
 
 constexpr PropertyListReading kServingPLMNOfMonitor = {
-    .code = kCellMonitorCode,
-    .packetName = kCellMonitorListName,
+    .packet = kCellMonitorPacket,
     .part = ListedPart::FirstCell,
     .cells = {.technologies = {kTqCellMonitorRadioAccessTechnologyUMTS,
                                kTqCellMonitorRadioAccessTechnologyGSM},
@@ -196,48 +195,31 @@ constexpr PropertyListReading kServingPLMNOfMonitor = {
 
 // --- What the sections take ----------------------------------------------------------------------
 
-constexpr PacketReading mmState(std::span<const Field> fields) {
-  return {.code = 0x7131, .packetName = "MM state", .minimumLength = 16, .fields = fields};
-}
-
-constexpr PacketReading registrationState(std::span<const Field> fields) {
-  return {
-      .code = 0x7132, .packetName = "Registration state", .minimumLength = 16, .fields = fields};
-}
-
+constexpr std::span<const Field> kMMStateField = std::span(kMMState).first<1>();
 constexpr std::span<const Field> kServiceStateField = std::span(kRegistrationState).first<1>();
 constexpr std::span<const Field> kSelectionModeField = std::span(kRegistrationState).last<1>();
 
 constexpr PacketReading kProcessCOReadings[] = {
-    mmState(std::span(kMMState).first<1>()),
-    registrationState(kServiceStateField),
+    {.packet = kMMStatePacket, .fields = kMMStateField},
+    {.packet = kRegistrationStatePacket, .fields = kServiceStateField},
 };
 constexpr PacketReading kProcessCSReadings[] = {
-    mmState(kMMState),
-    registrationState(kServiceStateField),
+    {.packet = kMMStatePacket, .fields = kMMState},
+    {.packet = kRegistrationStatePacket, .fields = kServiceStateField},
 };
-constexpr auto kProcessCodes = codesOf(kProcessCSReadings);
-
 constexpr PacketReading kProcessPSReadings[] = {
-    {.code = 0x7130, .packetName = "GMM state", .minimumLength = 16, .fields = kGMMState},
-    registrationState(kServiceStateField),
+    {.packet = kGMMStatePacket, .fields = kGMMState},
+    {.packet = kRegistrationStatePacket, .fields = kServiceStateField},
 };
-constexpr auto kProcessPSCodes = codesOf(kProcessPSReadings);
-
 constexpr PacketReading kServingPLMNReadings[] = {
-    {.code = 0x7135, .packetName = "Serving PLMN", .minimumLength = 32, .fields = kServingPLMN},
-    registrationState(kSelectionModeField),
+    {.packet = kServingPLMNPacket, .fields = kServingPLMN},
+    {.packet = kRegistrationStatePacket, .fields = kSelectionModeField},
 };
-constexpr auto kServingPLMNCodes = codesOf(kServingPLMNReadings, kCellMonitorCode);
-
 constexpr PacketReading kEquivalentPLMNListReadings[] = {
-    {.code = 0x7150,
-     .packetName = "Equivalent PLMN list",
-     .minimumLength = 17,
+    {.packet = kEquivalentPLMNListPacket,
      .fields = kEquivalentPLMNCount,
      .lists = kEquivalentPLMNs},
 };
-constexpr auto kEquivalentPLMNListCodes = codesOf(kEquivalentPLMNListReadings);
 
 }  // namespace
 
@@ -246,7 +228,6 @@ constexpr Section kProcessCOSection = {
     .logLine = "ProcessCO",
     .kind = SectionKind::Dictionary,
     .readings = kProcessCOReadings,
-    .codes = kProcessCodes,
 };
 
 constexpr Section kProcessCSSection = {
@@ -254,7 +235,6 @@ constexpr Section kProcessCSSection = {
     .logLine = "ProcessCS",
     .kind = SectionKind::Dictionary,
     .readings = kProcessCSReadings,
-    .codes = kProcessCodes,
 };
 
 constexpr Section kProcessPSSection = {
@@ -262,7 +242,6 @@ constexpr Section kProcessPSSection = {
     .logLine = "ProcessPS",
     .kind = SectionKind::Dictionary,
     .readings = kProcessPSReadings,
-    .codes = kProcessPSCodes,
 };
 
 constexpr Section kServingPLMNSection = {
@@ -270,7 +249,6 @@ constexpr Section kServingPLMNSection = {
     .logLine = "ServingPLMN",
     .kind = SectionKind::Dictionary,
     .readings = kServingPLMNReadings,
-    .codes = kServingPLMNCodes,
     .propertyList = &kServingPLMNOfMonitor,
 };
 
@@ -279,7 +257,6 @@ constexpr Section kEquivalentPLMNListSection = {
     .logLine = "EquivalentPLMNList",
     .kind = SectionKind::List,
     .readings = kEquivalentPLMNListReadings,
-    .codes = kEquivalentPLMNListCodes,
 };
 
 }  // namespace kestro

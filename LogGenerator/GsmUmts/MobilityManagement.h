@@ -8,6 +8,17 @@
 
 namespace kestro {
 
+inline constexpr PacketKind kGMMStatePacket = {
+    .code = 0x7130, .name = "GMM state", .minimumLength = 16};
+inline constexpr PacketKind kMMStatePacket = {
+    .code = 0x7131, .name = "MM state", .minimumLength = 16};
+inline constexpr PacketKind kRegistrationStatePacket = {
+    .code = 0x7132, .name = "Registration state", .minimumLength = 16};
+inline constexpr PacketKind kServingPLMNPacket = {
+    .code = 0x7135, .name = "Serving PLMN", .minimumLength = 32};
+inline constexpr PacketKind kEquivalentPLMNListPacket = {
+    .code = 0x7150, .name = "Equivalent PLMN list", .minimumLength = 17};
+
 extern const Section kProcessCOSection;
 extern const Section kProcessCSSection;
 extern const Section kProcessPSSection;

@@ -64,21 +64,11 @@ constexpr Field kServingMeasurements[] = {
 static_assert(isLayout(kServingMeasurements));
 
 constexpr PacketReading kRRReadings[] = {
-    {.code = 0x512C, .packetName = "RR state", .minimumLength = 17, .fields = kRRState},
-    {.code = GSMMeasurements::kCode,
-     .packetName = GSMMeasurements::kName,
-     .minimumLength = GSMMeasurements::kMinimumLength,
-     .fields = kServingMeasurements},
-    {.code = 0x5072,
-     .packetName = "Discontinuous transmission",
-     .minimumLength = 20,
-     .fields = kDiscontinuousTransmission},
-    {.code = 0x51F6,
-     .packetName = "Discontinuous reception",
-     .minimumLength = 24,
-     .fields = kDiscontinuousReception},
+    {.packet = kGSMRRStatePacket, .fields = kRRState},
+    {.packet = kGSMMeasurementsPacket, .fields = kServingMeasurements},
+    {.packet = kGSMDiscontinuousTransmissionPacket, .fields = kDiscontinuousTransmission},
+    {.packet = kGSMDiscontinuousReceptionPacket, .fields = kDiscontinuousReception},
 };
-constexpr auto kRRCodes = codesOf(kRRReadings);
 
 }  // namespace
 
@@ -87,7 +77,6 @@ constexpr Section kGSMRRInfoSection = {
     .logLine = "GSMRRInfo",
     .kind = SectionKind::Dictionary,
     .readings = kRRReadings,
-    .codes = kRRCodes,
 };
 
 }  // namespace kestro

@@ -7,6 +7,13 @@
 
 namespace kestro {
 
+inline constexpr PacketKind kGSMRRStatePacket = {
+    .code = 0x512C, .name = "RR state", .minimumLength = 17};
+inline constexpr PacketKind kGSMDiscontinuousTransmissionPacket = {
+    .code = 0x5072, .name = "Discontinuous transmission", .minimumLength = 20};
+inline constexpr PacketKind kGSMDiscontinuousReceptionPacket = {
+    .code = 0x51F6, .name = "Discontinuous reception", .minimumLength = 24};
+
 extern const Section kGSMRRInfoSection;
 
 /// What a packet does not carry stays.

@@ -1,50 +1,70 @@
 // SPDX-License-Identifier: MIT
 #include "LogGenerator/GsmUmts/UnfilledSections.h"
 
+#include "LogGenerator/GsmUmts/Cells.h"
+#include "LogGenerator/GsmUmts/MobilityManagement.h"
+#include "LogGenerator/GsmUmts/RadioResource.h"
+#include "LogGenerator/Ondrel/CellMonitor.h"
+
 namespace kestro {
 namespace {
 
-constexpr Section withoutPackets(std::string_view name, std::string_view logLine,
-                                 SectionKind kind) {
-  return {.name = name, .logLine = logLine, .kind = kind, .reportsUnknownCodes = false};
-}
-
-/// A packet that the section wants, though nobody has described it.
-constexpr PacketReading undescribed(LogCode code) {
-  return {.code = code, .packetName = {}, .minimumLength = 0};
-}
-
+// Wanted, and not read: some are read by other sections.
 constexpr PacketReading kGPRSInformationReadings[] = {
-    undescribed(0x51F5), undescribed(0x7135), undescribed(0x51F6), undescribed(0x51FB),
-    undescribed(0x51FD), undescribed(0x51F4), undescribed(0x5137),
+    {.packet = kUndescribedGSMPackets[0]},        {.packet = kServingPLMNPacket},
+    {.packet = kGSMDiscontinuousReceptionPacket}, {.packet = kUndescribedGSMPackets[1]},
+    {.packet = kUndescribedGSMPackets[2]},        {.packet = kUndescribedGSMPackets[3]},
+    {.packet = kGSMMeasurementsPacket},
 };
-constexpr auto kGPRSInformationCodes = codesOf(kGPRSInformationReadings);
 
 constexpr PacketReading kUMTSRRInfoReadings[] = {
-    undescribed(0x4125), undescribed(0x4031),           undescribed(0x4127),
-    undescribed(0x4157), undescribed(kCellMonitorCode),
+    {.packet = kUndescribedUMTSPackets[0]}, {.packet = kUndescribedUMTSPackets[1]},
+    {.packet = kUndescribedUMTSPackets[2]}, {.packet = kUndescribedUMTSPackets[3]},
+    {.packet = kCellMonitorPacket},
 };
-constexpr auto kUMTSRRInfoCodes = codesOf(kUMTSRRInfoReadings);
 
 }  // namespace
 
-constexpr Section kCodingSchemeSection =
-    withoutPackets("Coding Scheme", "CodingScheme", SectionKind::Dictionary);
-constexpr Section kUMTSRRMeasurementSection =
-    withoutPackets("UMTS RR Measurement", "UMTSRRMeasurement", SectionKind::Dictionary);
-constexpr Section kCellChangeCountersSection =
-    withoutPackets("Cell Change Counters", "CellChangeCounters", SectionKind::Dictionary);
-constexpr Section kNonRankedGSMSetSection =
-    withoutPackets("Non-Ranked GSM Set", "NonRankedGSMSet", SectionKind::List);
-constexpr Section kNonRankedUMTSSetSection =
-    withoutPackets("Non-Ranked UMTS Set", "NonRankedUMTSSet", SectionKind::List);
+constexpr Section kCodingSchemeSection = {
+    .name = "Coding Scheme",
+    .logLine = "CodingScheme",
+    .kind = SectionKind::Dictionary,
+    .reportsUnknownCodes = false,
+};
+
+constexpr Section kUMTSRRMeasurementSection = {
+    .name = "UMTS RR Measurement",
+    .logLine = "UMTSRRMeasurement",
+    .kind = SectionKind::Dictionary,
+    .reportsUnknownCodes = false,
+};
+
+constexpr Section kCellChangeCountersSection = {
+    .name = "Cell Change Counters",
+    .logLine = "CellChangeCounters",
+    .kind = SectionKind::Dictionary,
+    .reportsUnknownCodes = false,
+};
+
+constexpr Section kNonRankedGSMSetSection = {
+    .name = "Non-Ranked GSM Set",
+    .logLine = "NonRankedGSMSet",
+    .kind = SectionKind::List,
+    .reportsUnknownCodes = false,
+};
+
+constexpr Section kNonRankedUMTSSetSection = {
+    .name = "Non-Ranked UMTS Set",
+    .logLine = "NonRankedUMTSSet",
+    .kind = SectionKind::List,
+    .reportsUnknownCodes = false,
+};
 
 constexpr Section kGPRSInformationSection = {
     .name = "GPRS Information",
     .logLine = "GPRSInformation",
     .kind = SectionKind::Dictionary,
     .readings = kGPRSInformationReadings,
-    .codes = kGPRSInformationCodes,
 };
 
 constexpr Section kUMTSRRInfoSection = {
@@ -52,7 +72,6 @@ constexpr Section kUMTSRRInfoSection = {
     .logLine = "UMTSRRInfo",
     .kind = SectionKind::Dictionary,
     .readings = kUMTSRRInfoReadings,
-    .codes = kUMTSRRInfoCodes,
 };
 
 }  // namespace kestro

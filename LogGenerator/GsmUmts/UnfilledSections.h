@@ -6,6 +6,12 @@
 
 namespace kestro {
 
+// Packets that sections want, though nobody has described them.
+inline constexpr PacketKind kUndescribedGSMPackets[] = {
+    {.code = 0x51F5}, {.code = 0x51FB}, {.code = 0x51FD}, {.code = 0x51F4}};
+inline constexpr PacketKind kUndescribedUMTSPackets[] = {
+    {.code = 0x4125}, {.code = 0x4031}, {.code = 0x4127}, {.code = 0x4157}};
+
 extern const Section kCodingSchemeSection;
 extern const Section kUMTSRRMeasurementSection;
 extern const Section kCellChangeCountersSection;

@@ -20,8 +20,6 @@ constexpr TextRule quarterDb() { return scaled(0.25, -30, "%4.2f dB"); }
 
 // --- 0xB179: intra-frequency measurement: a header, the measured neighbours, the detected cells --
 
-constexpr std::size_t kIntraFrequencyLength = 29;
-
 constexpr Field kIntraFrequency[] = {
     {"E-ARFCN", u16(17), decimal()},
     {"Serving Physical Cell ID", u16(19), decimal()},
@@ -51,7 +49,7 @@ constexpr unsigned kDetectedCellSize = 2;
 constexpr ListReading kMeasuredNeighbors[] = {{.table = {
                                                    .name = "measured neighbour",
                                                    .count = kMeasuredCount,
-                                                   .base = kIntraFrequencyLength,
+                                                   .base = kLTEIntraFrequencyPacket.minimumLength,
                                                    .stride = kMeasuredNeighborSize,
                                                    .fields = kMeasuredNeighbor,
                                                }}};
@@ -60,26 +58,19 @@ constexpr ListReading kMeasuredNeighbors[] = {{.table = {
 constexpr ListReading kDetectedCells[] = {{.table = {
                                                .name = "detected cell",
                                                .count = kDetectedCount,
-                                               .base = kIntraFrequencyLength,
+                                               .base = kLTEIntraFrequencyPacket.minimumLength,
                                                .perCount = kMeasuredNeighborSize,
                                                .counted = kMeasuredCount,
                                                .stride = kDetectedCellSize,
                                                .fields = kDetectedCell,
                                            }}};
 
-constexpr PacketReading intraFrequency(std::span<const Field> fields,
-                                       std::span<const ListReading> lists) {
-  return {
-      .code = kLTEIntraFrequencyCode,
-      .packetName = "LTE intra-frequency measurement",
-      .minimumLength = kIntraFrequencyLength,
-      .fields = fields,
-      .lists = lists,
-  };
-}
-constexpr PacketReading kIntraFrequencyReading = intraFrequency(kIntraFrequency, {});
-constexpr PacketReading kMeasuredNeighborsReading = intraFrequency({}, kMeasuredNeighbors);
-constexpr PacketReading kDetectedCellsReading = intraFrequency({}, kDetectedCells);
+constexpr PacketReading kIntraFrequencyReadings[] = {
+    {.packet = kLTEIntraFrequencyPacket, .fields = kIntraFrequency}};
+constexpr PacketReading kMeasuredNeighborsReadings[] = {
+    {.packet = kLTEIntraFrequencyPacket, .lists = kMeasuredNeighbors}};
+constexpr PacketReading kDetectedCellsReadings[] = {
+    {.packet = kLTEIntraFrequencyPacket, .lists = kDetectedCells}};
 
 // --- 0xB17F: serving-cell measurement ------------------------------------------------------------
 
@@ -106,16 +97,10 @@ constexpr Field kServingCellMeasurement[] = {
 };
 static_assert(isLayout(kServingCellMeasurement));
 
-constexpr PacketReading kServingCellReading = {
-    .code = kLTEServingCellCode,
-    .packetName = "LTE serving-cell measurement",
-    .minimumLength = 33,
-    .fields = kServingCellMeasurement,
-};
+constexpr PacketReading kServingCellReadings[] = {
+    {.packet = kLTEServingCellPacket, .fields = kServingCellMeasurement}};
 
 // --- 0xB180: neighbour measurements: a header and 1 to 32 records --------------------------------
-
-constexpr std::size_t kNeighborLength = 21;
 
 constexpr Field kNeighborHeader[] = {
     {"Version", u8(13), decimal()},
@@ -145,23 +130,15 @@ constexpr ListReading kNeighborCells[] = {{.table = {
                                                .name = "neighbour",
                                                .count = u16(19).bits(6, 10),
                                                .countAddend = 1,
-                                               .base = kNeighborLength,
+                                               .base = kLTENeighborPacket.minimumLength,
                                                .stride = 20,
                                                .fields = kNeighborCell,
                                            }}};
 
-constexpr PacketReading neighbors(std::span<const Field> fields,
-                                  std::span<const ListReading> lists) {
-  return {
-      .code = kLTENeighborCode,
-      .packetName = "LTE neighbour measurements",
-      .minimumLength = kNeighborLength,
-      .fields = fields,
-      .lists = lists,
-  };
-}
-constexpr PacketReading kNeighborHeaderReading = neighbors(kNeighborHeader, {});
-constexpr PacketReading kNeighborCellsReading = neighbors({}, kNeighborCells);
+constexpr PacketReading kNeighborHeaderReadings[] = {
+    {.packet = kLTENeighborPacket, .fields = kNeighborHeader}};
+constexpr PacketReading kNeighborCellsReadings[] = {
+    {.packet = kLTENeighborPacket, .lists = kNeighborCells}};
 
 void logField(SystemLog& log, const Field& field, std::int64_t raw) {
   if (field.key == kPhysicalCellId) {
@@ -174,19 +151,41 @@ void logField(SystemLog& log, const Field& field, std::int64_t raw) {
 
 }  // namespace
 
-constinit const Section kConnectedModeMeasurementSection =
-    sectionOf("Connected mode LTE Intra-frequency Measurement", SectionKind::Dictionary,
-              kIntraFrequencyReading);
-constinit const Section kMeasuredNeighborCellsSection =
-    sectionOf("Measured Neighbor Cells", SectionKind::List, kMeasuredNeighborsReading);
-constinit const Section kDetectedCellsSection =
-    sectionOf("Detected Cells", SectionKind::List, kDetectedCellsReading);
-constinit const Section kServingCellMeasurementSection =
-    sectionOf("Serving Cell Measurements", SectionKind::Dictionary, kServingCellReading);
-constinit const Section kNeighborMeasurementSection =
-    sectionOf("Neighbor Measurements", SectionKind::Dictionary, kNeighborHeaderReading);
-constinit const Section kNeighborCellsListSection =
-    sectionOf("Neighbor Cells List", SectionKind::List, kNeighborCellsReading);
+constexpr Section kConnectedModeMeasurementSection = {
+    .name = "Connected mode LTE Intra-frequency Measurement",
+    .kind = SectionKind::Dictionary,
+    .readings = kIntraFrequencyReadings,
+};
+
+constexpr Section kMeasuredNeighborCellsSection = {
+    .name = "Measured Neighbor Cells",
+    .kind = SectionKind::List,
+    .readings = kMeasuredNeighborsReadings,
+};
+
+constexpr Section kDetectedCellsSection = {
+    .name = "Detected Cells",
+    .kind = SectionKind::List,
+    .readings = kDetectedCellsReadings,
+};
+
+constexpr Section kServingCellMeasurementSection = {
+    .name = "Serving Cell Measurements",
+    .kind = SectionKind::Dictionary,
+    .readings = kServingCellReadings,
+};
+
+constexpr Section kNeighborMeasurementSection = {
+    .name = "Neighbor Measurements",
+    .kind = SectionKind::Dictionary,
+    .readings = kNeighborHeaderReadings,
+};
+
+constexpr Section kNeighborCellsListSection = {
+    .name = "Neighbor Cells List",
+    .kind = SectionKind::List,
+    .readings = kNeighborCellsReadings,
+};
 
 void NeighborCellsList::willPublish(const ListReading& list, PacketView packet,
                                     std::vector<Value>& rows) {

@@ -9,9 +9,12 @@
 
 namespace kestro {
 
-inline constexpr LogCode kLTEIntraFrequencyCode = 0xB179;
-inline constexpr LogCode kLTEServingCellCode = 0xB17F;
-inline constexpr LogCode kLTENeighborCode = 0xB180;
+inline constexpr PacketKind kLTEIntraFrequencyPacket = {
+    .code = 0xB179, .name = "LTE intra-frequency measurement", .minimumLength = 29};
+inline constexpr PacketKind kLTEServingCellPacket = {
+    .code = 0xB17F, .name = "LTE serving-cell measurement", .minimumLength = 33};
+inline constexpr PacketKind kLTENeighborPacket = {
+    .code = 0xB180, .name = "LTE neighbour measurements", .minimumLength = 21};
 
 extern const Section kConnectedModeMeasurementSection;
 extern const Section kMeasuredNeighborCellsSection;

@@ -4,8 +4,6 @@
 namespace kestro {
 namespace {
 
-constexpr std::size_t kHeaderLength = 21;
-
 constexpr Field kHeader[] = {
     {"Version", u8(13), decimal()},
     {"Serving EARFCN", u16(15), decimal()},
@@ -45,29 +43,27 @@ constexpr ListReading kCandidates[] = {{.table = {
                                             .name = "candidate",
                                             .count = u8(19),
                                             .boundsCount = u16(19),
-                                            .base = kHeaderLength,
+                                            .base = kLTEReselectionPacket.minimumLength,
                                             .stride = 4,
                                             .fields = kCandidate,
                                         }}};
 
-constexpr PacketReading reselection(std::span<const Field> fields,
-                                    std::span<const ListReading> lists) {
-  return {
-      .code = kLTEReselectionCode,
-      .packetName = "LTE reselection candidates",
-      .minimumLength = kHeaderLength,
-      .fields = fields,
-      .lists = lists,
-  };
-}
-constexpr PacketReading kHeaderReading = reselection(kHeader, {});
-constexpr PacketReading kCandidatesReading = reselection({}, kCandidates);
+constexpr PacketReading kHeaderReadings[] = {{.packet = kLTEReselectionPacket, .fields = kHeader}};
+constexpr PacketReading kCandidatesReadings[] = {
+    {.packet = kLTEReselectionPacket, .lists = kCandidates}};
 
 }  // namespace
 
-constinit const Section kReselectionCandidatesSection =
-    sectionOf("Reselection Candidates", SectionKind::Dictionary, kHeaderReading);
-constinit const Section kReselectionCandidatesListSection =
-    sectionOf("Reselection Candidates List", SectionKind::List, kCandidatesReading);
+constexpr Section kReselectionCandidatesSection = {
+    .name = "Reselection Candidates",
+    .kind = SectionKind::Dictionary,
+    .readings = kHeaderReadings,
+};
+
+constexpr Section kReselectionCandidatesListSection = {
+    .name = "Reselection Candidates List",
+    .kind = SectionKind::List,
+    .readings = kCandidatesReadings,
+};
 
 }  // namespace kestro

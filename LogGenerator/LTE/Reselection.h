@@ -8,7 +8,8 @@ namespace kestro {
 
 /// A candidate's fields overlap the first bytes of the next one. So of several candidates only the
 /// last one is shown as it was meant.
-inline constexpr LogCode kLTEReselectionCode = 0xB186;
+inline constexpr PacketKind kLTEReselectionPacket = {
+    .code = 0xB186, .name = "LTE reselection candidates", .minimumLength = 21};
 
 extern const Section kReselectionCandidatesSection;
 extern const Section kReselectionCandidatesListSection;

@@ -40,8 +40,7 @@ constexpr ListedValue kLTEServingCellValues[] = {
 };
 
 constexpr PropertyListReading kCellMonitor = {
-    .code = kCellMonitorCode,
-    .packetName = kCellMonitorListName,
+    .packet = kCellMonitorPacket,
     .part = ListedPart::FirstCell,
     .cells = {{kTqCellMonitorRadioAccessTechnologyLTE}, kTqCellMonitorCellTypeServing},
     .values = kLTEServingCellValues,
@@ -49,30 +48,22 @@ constexpr PropertyListReading kCellMonitor = {
 };
 
 constexpr PacketReading kLTEReadings[] = {
-    {.code = kLTESystemInformationCode,
-     .packetName = "LTE serving-cell system information",
-     .minimumLength = 38,
-     .fields = kLTESystemInformation},
-    {.code = kLTEAntennasCode,
-     .packetName = "LTE transmit antennas",
-     .minimumLength = 22,
-     .fields = kAntennas},
+    {.packet = kLTESystemInformationPacket, .fields = kLTESystemInformation},
+    {.packet = kLTEAntennasPacket, .fields = kAntennas},
 };
-constexpr auto kLTEReadingCodes = codesOf(kLTEReadings, kCellMonitorCode);
 
 }  // namespace
 
-constinit const Section kLTEServingCellInfoSection = {
+constexpr Section kLTEServingCellInfoSection = {
     .name = "Serving Cell Info",
     .logLine = "LTE Serving Cell Info",
     .kind = SectionKind::Dictionary,
     .readings = kLTEReadings,
-    .codes = kLTEReadingCodes,
     .propertyList = &kCellMonitor,
 };
 
 void LTEServingCellInfo::didRead(const PacketReading& reading, PacketView /*packet*/) {
-  if (reading.code == kLTEAntennasCode) reportUnknownCode(reading.code);
+  if (&reading.packet == &kLTEAntennasPacket) reportUnknownCode(reading.packet.code);
 }
 
 }  // namespace kestro

@@ -7,8 +7,10 @@
 
 namespace kestro {
 
-inline constexpr LogCode kLTESystemInformationCode = 0xB0C2;
-inline constexpr LogCode kLTEAntennasCode = 0xB0C1;
+inline constexpr PacketKind kLTESystemInformationPacket = {
+    .code = 0xB0C2, .name = "LTE serving-cell system information", .minimumLength = 38};
+inline constexpr PacketKind kLTEAntennasPacket = {
+    .code = 0xB0C1, .name = "LTE transmit antennas", .minimumLength = 22};
 
 extern const Section kLTEServingCellInfoSection;
 

@@ -89,7 +89,7 @@ void writeCellValues(const Dictionary& cell, std::span<const ListedValue> values
 
 bool CellMonitorDecoder::updateWithOtherPacket(const Packet& packet, LogCode code) {
   const PropertyListReading& reading = *section().propertyList;
-  if (code != reading.code) return false;
+  if (code != reading.packet.code) return false;
   const Array list = readCellArray(packet, platform().propertyListCoding(), systemLog());
   if (section().kind == SectionKind::List) {
     Array rows = sectionList();
@@ -106,7 +106,7 @@ bool CellMonitorDecoder::updateWithOtherPacket(const Packet& packet, LogCode cod
 void CellMonitorDecoder::explainOtherPacket(const Packet& packet, LogCode code,
                                             const ExplainVisitor& visit) const {
   const PropertyListReading& reading = *section().propertyList;
-  if (code != reading.code) return;
+  if (code != reading.packet.code) return;
   const Result<Value>& root = packet.propertyList(platform().propertyListCoding());
   if (!root) return;
   std::size_t row = 0;

@@ -46,8 +46,7 @@ inline constexpr std::string_view kTqCellMonitorECN0 = "kTqCellMonitorECN0";
 /// `decimal("%d dBm").absentAt(kCellMonitorNotMeasured, "")`.
 inline constexpr std::int64_t kCellMonitorNotMeasured = 0x7FFF;
 
-/// What a cell-monitor packet is, for people.
-inline constexpr std::string_view kCellMonitorListName = "Cell-monitor list";
+inline constexpr PacketKind kCellMonitorPacket = {.code = 0xFF0001, .name = "Cell-monitor list"};
 
 /// What most sections log when a packet carries no array of cells.
 inline constexpr std::string_view kMissingCellArrayLine = "Failed to get Cell Array\n";

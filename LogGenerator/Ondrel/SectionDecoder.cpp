@@ -4,7 +4,7 @@
 namespace kestro {
 
 SectionDecoder::SectionDecoder(Platform& platform, const Section& section)
-    : Base(platform), _section(section) {
+    : Base(platform), _section(section), _codes(codesOf(section)) {
   _readings.reserve(section.readings.size());
   for (const PacketReading& reading : section.readings) _readings.emplace_back(reading);
 }
@@ -14,8 +14,8 @@ void SectionDecoder::updateWithDataLogCode(const Packet& packet, LogCode code) {
   const PacketView view(packet.bytes());
   bool isDescribed = false;
   for (BoundReading& bound : _readings) {
-    if (bound.reading->code != code) continue;
-    if (view.size() >= bound.reading->minimumLength) {
+    if (bound.reading->packet.code != code) continue;
+    if (view.size() >= bound.reading->packet.minimumLength) {
       apply(bound, view);
       return;
     }
@@ -38,7 +38,7 @@ void SectionDecoder::explainPacket(const Packet& packet, LogCode code,
 CatalogueEntry SectionDecoder::catalogueCode(LogCode code) const {
   const PacketReading* reading = readingOf(_section, code);
   if (reading != nullptr) return catalogueReading(_section, *reading);
-  if (_section.propertyList != nullptr && _section.propertyList->code == code) {
+  if (_section.propertyList != nullptr && _section.propertyList->packet.code == code) {
     return cataloguePropertyList(_section);
   }
   CatalogueEntry entry{.code = code, .section = _section.name, .kind = _section.kind};

@@ -19,7 +19,7 @@ class SectionDecoder : public Base, protected FieldSupplier {
   SectionDecoder(Platform& platform, const Section& section);
 
   [[nodiscard]] std::string_view getSectionName() const override { return _section.name; }
-  [[nodiscard]] std::span<const LogCode> getLogCodeArray() const override { return _section.codes; }
+  [[nodiscard]] std::span<const LogCode> getLogCodeArray() const override { return _codes; }
   [[nodiscard]] SectionKind sectionKind() const override { return _section.kind; }
   void updateWithDataLogCode(const Packet& packet, LogCode code) override;
   void explainPacket(const Packet& packet, LogCode code,
@@ -57,6 +57,7 @@ class SectionDecoder : public Base, protected FieldSupplier {
   void applyUnderKey(BoundTable& table, PacketView packet, Dictionary& section);
 
   const Section& _section;
+  std::vector<LogCode> _codes;
   std::vector<BoundReading> _readings;
 };
 

@@ -26,34 +26,30 @@ constexpr ListedValue kSimFileValues[] = {
     {"kSimFile_OPLMNAcT", "EF-OPLMNAcT"},
 };
 constexpr PropertyListReading kSimFiles = {
-    .code = kSimFilesCode,
-    .packetName = "SIM files",
+    .packet = kSimFilesPacket,
     .part = ListedPart::Root,
     .values = kSimFileValues,
 };
 
 constexpr PropertyListReading kPacketDataContexts = {
-    .code = kPacketDataContextsCode,
-    .packetName = "Packet-data contexts",
+    .packet = kPacketDataContextsPacket,
     .part = ListedPart::Elements,
 };
 
 }  // namespace
 
-constinit const Section kSimInfoSection = {
+constexpr Section kSimInfoSection = {
     .name = "SIM Info",
     .logLine = "SimInfo",
     .kind = SectionKind::Dictionary,
-    .codes = {&kSimFiles.code, 1},
     .reportsUnknownCodes = false,
     .propertyList = &kSimFiles,
 };
 
-constinit const Section kPDPContextListSection = {
+constexpr Section kPDPContextListSection = {
     .name = "PDP Context Info",
     .logLine = "PDPContextList",
     .kind = SectionKind::List,
-    .codes = {&kPacketDataContexts.code, 1},
     .propertyList = &kPacketDataContexts,
 };
 
@@ -70,7 +66,7 @@ LogCode_0xFF0000::PropertyListReader::PropertyListReader(const Packet& packet,
 }
 
 bool SimInfo::updateWithOtherPacket(const Packet& packet, LogCode code) {
-  if (code != kSimFilesCode) return false;
+  if (code != kSimFiles.packet.code) return false;
   const LogCode_0xFF0000::PropertyListReader files(packet, platform().propertyListCoding(),
                                                    systemLog());
   Dictionary target = sectionDictionary();
@@ -83,7 +79,7 @@ bool SimInfo::updateWithOtherPacket(const Packet& packet, LogCode code) {
 void SimInfo::explainOtherPacket(const Packet& packet, LogCode code,
                                  const ExplainVisitor& visit) const {
   const Result<Value>& root = packet.propertyList(platform().propertyListCoding());
-  if (code != kSimFilesCode || !root) return;
+  if (code != kSimFiles.packet.code || !root) return;
   const Dictionary files = root->dictionary();
   for (const ListedValue& file : kSimFileValues) {
     const Value* value = files.find(file.listKey);

@@ -30,6 +30,10 @@ class PropertyListReader {
 
 }  // namespace LogCode_0xFF0000
 
+inline constexpr PacketKind kSimFilesPacket = {.code = 0xFF0000, .name = "SIM files"};
+inline constexpr PacketKind kPacketDataContextsPacket = {.code = 0xFF0002,
+                                                         .name = "Packet-data contexts"};
+
 extern const Section kSimInfoSection;
 extern const Section kPDPContextListSection;
 

@@ -52,23 +52,25 @@ std::vector<CatalogueKey> catalogueFields(std::span<const Field> fields, std::st
 }
 
 CatalogueEntry catalogueReading(const Section& section, const PacketReading& reading) {
-  CatalogueEntry entry{.code = reading.code,
-                       .packetName = reading.packetName,
-                       .minimumLength = reading.minimumLength,
-                       .section = section.name,
-                       .kind = section.kind,
-                       .keys = keysOfReading(reading)};
+  CatalogueEntry entry{.code = reading.packet.code, .section = section.name, .kind = section.kind};
+  if (reading.isEmpty()) return entry;
+  entry.packetName = reading.packet.name;
+  entry.minimumLength = reading.packet.minimumLength;
+  entry.keys = keysOfReading(reading);
   for (const PacketReading& other : section.readings) {
-    const bool isShorter = other.minimumLength < reading.minimumLength;
-    if (other.code == reading.code && isShorter) entry.shorterKeys = keysOfReading(other);
+    const bool isShorter = other.packet.minimumLength < reading.packet.minimumLength;
+    if (other.packet.code == reading.packet.code && isShorter) {
+      entry.shorterKeys = keysOfReading(other);
+    }
   }
   return entry;
 }
 
 CatalogueEntry cataloguePropertyList(const Section& section) {
   const PropertyListReading& reading = *section.propertyList;
-  CatalogueEntry entry{.code = reading.code,
-                       .packetName = reading.packetName,
+  CatalogueEntry entry{.code = reading.packet.code,
+                       .packetName = reading.packet.name,
+                       .minimumLength = reading.packet.minimumLength,
                        .section = section.name,
                        .kind = section.kind,
                        .propertyList = &reading};

@@ -27,7 +27,7 @@ struct CatalogueKey {
 /// What one section takes from one log code.
 struct CatalogueEntry {
   LogCode code = 0;
-  std::string_view packetName{};  ///< empty when nobody knows what the packet contains
+  std::string_view packetName{};  ///< empty when the section takes nothing from the packet
   /// In bytes. A shorter packet writes `shorterKeys` and nothing else. 0 when any length will do.
   std::size_t minimumLength = 0;
   std::string_view section{};

@@ -26,7 +26,10 @@ namespace kestro {
 /// value that its bits cannot carry, spoils the packet: `finish` then yields nothing.
 class PacketWriter {
  public:
-  /// A packet of at least `length` bytes, header included; it grows with what is written.
+  /// A packet of its kind's least length; it grows with what is written.
+  explicit PacketWriter(const PacketKind& packet)
+      : PacketWriter(packet.code, packet.minimumLength) {}
+  /// A packet of at least `length` bytes, header included.
   PacketWriter(LogCode code, std::size_t length);
 
   /// Writes fields of one layout, of the packet or of a record.

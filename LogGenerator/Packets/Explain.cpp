@@ -54,7 +54,7 @@ void Explainer::reading(const PacketReading& reading) const {
 
 void explainReading(const Section& section, const PacketReading& reading, PacketView packet,
                     const ExplainVisitor& visit) {
-  if (packet.size() < reading.minimumLength) return;
+  if (packet.size() < reading.packet.minimumLength) return;
   Explainer(section.name, packet, visit).reading(reading);
 }
 

@@ -5,8 +5,8 @@
 
 #include <cstdint>
 
+#include "LogGenerator/Packets/PacketKind.h"
 #include "LogGenerator/Packets/PacketView.h"
-#include "LogGenerator/Packets/Section.h"
 
 namespace kestro {
 

@@ -8,6 +8,7 @@
 #include <string_view>
 
 #include "LogGenerator/Packets/Field.h"
+#include "LogGenerator/Packets/PacketKind.h"
 
 namespace kestro {
 
@@ -38,8 +39,7 @@ struct CellKind {
 
 /// What a section takes from the property list of one packet.
 struct PropertyListReading {
-  std::uint32_t code;
-  std::string_view packetName;  ///< what the packet is, for people
+  const PacketKind& packet;  ///< a constant
   ListedPart part;
   CellKind cells{};  ///< for FirstCell and EachCell
   std::span<const ListedValue> values{};

@@ -3,28 +3,18 @@
 // listing all walk.
 #pragma once
 
-#include <array>
 #include <cstddef>
 #include <cstdint>
 #include <span>
 #include <string_view>
+#include <vector>
 
 #include "LogGenerator/Packets/Field.h"
+#include "LogGenerator/Packets/PacketKind.h"
 #include "LogGenerator/Packets/PropertyListReading.h"
 #include "Platform/SystemLog.h"
 
 namespace kestro {
-
-/// A log code: 16 bits, or for an extra packet 16 bits plus 0xFF0000.
-using LogCode = std::uint32_t;
-
-inline constexpr LogCode kExtraCodes = 0xFF0000;
-inline constexpr LogCode kSimFilesCode = 0xFF0000;
-inline constexpr LogCode kCellMonitorCode = 0xFF0001;
-inline constexpr LogCode kPacketDataContextsCode = 0xFF0002;
-
-/// The bytes at the start of every packet, before its payload.
-inline constexpr std::size_t kPacketHeaderSize = 13;
 
 enum class SectionKind : std::uint8_t { Dictionary, List };
 
@@ -49,55 +39,38 @@ struct ListReading {
 
 /// What a section takes from one packet.
 struct PacketReading {
-  LogCode code;
-  std::string_view packetName;  ///< what the packet is, for people
-  std::size_t minimumLength;    ///< shorter packets change nothing
+  const PacketKind& packet;  ///< a constant
   std::span<const Field> fields{};
   std::span<const ListReading> lists{};
+
+  /// Whether the section wants the packet and takes nothing from it.
+  [[nodiscard]] constexpr bool isEmpty() const noexcept { return fields.empty() && lists.empty(); }
 };
 
 /// One decoder: its section and everything it reads.
 struct Section {
-  std::string_view name;     ///< the section's name in the display
-  std::string_view logLine;  ///< what it writes to the system log for every packet
-  SectionKind kind;
+  std::string_view name;            ///< the section's name in the display
+  std::string_view logLine = name;  ///< what it writes to the system log for every packet
+  SectionKind kind = SectionKind::Dictionary;
   /// Of several readings of one code, the first whose minimum length a packet has.
   std::span<const PacketReading> readings{};
-  std::span<const LogCode> codes{};  ///< what it subscribes to, in order
   LogPriority logPriority = LogPriority::Warning;
   bool reportsUnknownCodes = true;
   const PropertyListReading* propertyList = nullptr;  ///< null when it reads no property list
 };
-
-/// A section that is filled from one packet and logs its own name. `reading` must be a constant.
-[[nodiscard]] constexpr Section sectionOf(std::string_view name, SectionKind kind,
-                                          const PacketReading& reading) noexcept {
-  return {.name = name,
-          .logLine = name,
-          .kind = kind,
-          .readings = {&reading, 1},
-          .codes = {&reading.code, 1}};
-}
 
 /// What the section takes from packets of this code and length; null when nothing that a layout
 /// describes.
 [[nodiscard]] constexpr const PacketReading* readingOf(const Section& section, LogCode code,
                                                        std::size_t length = SIZE_MAX) noexcept {
   for (const PacketReading& reading : section.readings) {
-    if (reading.code == code && length >= reading.minimumLength) return &reading;
+    if (reading.packet.code == code && length >= reading.packet.minimumLength) return &reading;
   }
   return nullptr;
 }
 
-/// The codes of the readings in their order, and after them those that no layout describes.
-template <std::size_t Count, class... Others>
-[[nodiscard]] constexpr std::array<LogCode, Count + sizeof...(Others)> codesOf(
-    const PacketReading (&readings)[Count], Others... others) {
-  std::array<LogCode, Count + sizeof...(Others)> codes{};
-  std::size_t size = 0;
-  for (const PacketReading& reading : readings) codes[size++] = reading.code;
-  ((codes[size++] = others), ...);
-  return codes;
-}
+/// The codes that the section wants: those of its readings in their order, each once, and that of
+/// its property list.
+[[nodiscard]] std::vector<LogCode> codesOf(const Section& section);
 
 }  // namespace kestro

@@ -79,44 +79,49 @@ constexpr ListReading kCCTRCHs[] = {{.table = {.name = "coded composite transpor
                                                .stride = 8,
                                                .fields = kCCTRCH}}};
 
-constexpr PacketReading kNeighborsReading = {.code = kUTRANNeighborsCode,
-                                             .packetName = "UTRAN neighbours",
-                                             .minimumLength = 21,
-                                             .lists = kNeighbors};
-constexpr PacketReading kGSMNeighborsReading = {.code = kUTRANGSMNeighborsCode,
-                                                .packetName = "GSM neighbours of UTRAN",
-                                                .minimumLength = 17,
-                                                .lists = kGSMNeighbors};
-
-constexpr PacketReading transportChannels(std::span<const ListReading> lists) {
-  return {.code = kUTRANTransportChannelsCode,
-          .packetName = "UTRAN transport channels",
-          .minimumLength = 17,
-          .lists = lists};
-}
-constexpr PacketReading kTRCHReading = transportChannels(kTRCHs);
-constexpr PacketReading kCCTRCHReading = transportChannels(kCCTRCHs);
-
-/// A list of measurements: other codes than its own leave no line.
-constexpr Section measurements(std::string_view name, std::string_view logLine,
-                               const PacketReading& reading,
-                               LogPriority priority = LogPriority::Warning) {
-  Section section = sectionOf(name, SectionKind::List, reading);
-  section.logLine = logLine;
-  section.logPriority = priority;
-  section.reportsUnknownCodes = false;
-  return section;
-}
+constexpr PacketReading kNeighborsReadings[] = {
+    {.packet = kUTRANNeighborsPacket, .lists = kNeighbors}};
+constexpr PacketReading kGSMNeighborsReadings[] = {
+    {.packet = kUTRANGSMNeighborsPacket, .lists = kGSMNeighbors}};
+constexpr PacketReading kTRCHReadings[] = {
+    {.packet = kUTRANTransportChannelsPacket, .lists = kTRCHs}};
+constexpr PacketReading kCCTRCHReadings[] = {
+    {.packet = kUTRANTransportChannelsPacket, .lists = kCCTRCHs}};
 
 }  // namespace
 
-constinit const Section kUTRANNeighborsSection =
-    measurements("Neighbor Cell List", "NeighbhorMeasurements List", kNeighborsReading);
-constinit const Section kUTRANGSMNeighborsSection =
-    measurements("GSM Neighbor Cell List", "GSM Neighbor Cell List", kGSMNeighborsReading);
-constinit const Section kTRCHBLERSection =
-    measurements("TRCH BLER", "TRCH BLER Measurement", kTRCHReading, LogPriority::Notice);
-constinit const Section kCCTRCHSIRSection =
-    measurements("CCTRCH SIR", "CCTRCH SIR Measurement", kCCTRCHReading);
+// None of these reports a code that it does not know.
+
+constexpr Section kUTRANNeighborsSection = {
+    .name = "Neighbor Cell List",
+    .logLine = "NeighbhorMeasurements List",
+    .kind = SectionKind::List,
+    .readings = kNeighborsReadings,
+    .reportsUnknownCodes = false,
+};
+
+constexpr Section kUTRANGSMNeighborsSection = {
+    .name = "GSM Neighbor Cell List",
+    .kind = SectionKind::List,
+    .readings = kGSMNeighborsReadings,
+    .reportsUnknownCodes = false,
+};
+
+constexpr Section kTRCHBLERSection = {
+    .name = "TRCH BLER",
+    .logLine = "TRCH BLER Measurement",
+    .kind = SectionKind::List,
+    .readings = kTRCHReadings,
+    .logPriority = LogPriority::Notice,
+    .reportsUnknownCodes = false,
+};
+
+constexpr Section kCCTRCHSIRSection = {
+    .name = "CCTRCH SIR",
+    .logLine = "CCTRCH SIR Measurement",
+    .kind = SectionKind::List,
+    .readings = kCCTRCHReadings,
+    .reportsUnknownCodes = false,
+};
 
 }  // namespace kestro

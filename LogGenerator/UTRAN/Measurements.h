@@ -7,9 +7,12 @@
 
 namespace kestro {
 
-inline constexpr LogCode kUTRANNeighborsCode = 0xD00A;
-inline constexpr LogCode kUTRANGSMNeighborsCode = 0xD00E;
-inline constexpr LogCode kUTRANTransportChannelsCode = 0xD00C;
+inline constexpr PacketKind kUTRANNeighborsPacket = {
+    .code = 0xD00A, .name = "UTRAN neighbours", .minimumLength = 21};
+inline constexpr PacketKind kUTRANGSMNeighborsPacket = {
+    .code = 0xD00E, .name = "GSM neighbours of UTRAN", .minimumLength = 17};
+inline constexpr PacketKind kUTRANTransportChannelsPacket = {
+    .code = 0xD00C, .name = "UTRAN transport channels", .minimumLength = 17};
 
 extern const Section kUTRANNeighborsSection;
 extern const Section kUTRANGSMNeighborsSection;

@@ -21,7 +21,6 @@ constexpr TextRule kModeRule = named(kModeNames, kUnknownMode);
 
 // --- 0xD0E0: the mode, and whether it is valid ---------------------------------------------------
 
-constexpr std::size_t kLength = 15;
 constexpr Place kIsValid = u8(13);
 constexpr Place kMode = u8(14);
 constexpr std::int64_t kValid = 1;
@@ -37,38 +36,36 @@ constexpr Field kMissingRRCState[] = {
 };
 static_assert(isLayout(kMissingRRCState));
 
+constexpr PacketKind kRRCStateWithoutMode = {.code = kUTRANRRCStatePacket.code,
+                                             .name = "UTRAN RRC state without a mode"};
+
 constexpr PacketReading kRRCReadings[] = {
-    {.code = kUTRANRRCStateCode,
-     .packetName = "UTRAN RRC state",
-     .minimumLength = kLength,
-     .fields = kRRCState},
-    {.code = kUTRANRRCStateCode,
-     .packetName = "UTRAN RRC state without a mode",
-     .minimumLength = 0,
-     .fields = kMissingRRCState},
+    {.packet = kUTRANRRCStatePacket, .fields = kRRCState},
+    {.packet = kRRCStateWithoutMode, .fields = kMissingRRCState},
 };
 
 /// The mode of a packet that has none, or no valid one.
 constexpr int kNoMode = 255;
 
 int modeOf(PacketView packet) {
-  const bool isValid = packet.size() >= kLength && readNumber(kIsValid, packet, {}) == kValid;
+  const bool isValid = packet.size() >= kUTRANRRCStatePacket.minimumLength &&
+                       readNumber(kIsValid, packet, {}) == kValid;
   return isValid ? static_cast<int>(readNumber(kMode, packet, {})) : kNoMode;
 }
 
 }  // namespace
 
-constinit const Section kRRCStateSection = {.name = "RRC Info",
-                                            .logLine = "RRC Info",
-                                            .kind = SectionKind::Dictionary,
-                                            .readings = kRRCReadings,
-                                            .codes = {&kRRCReadings[0].code, 1},
-                                            .reportsUnknownCodes = false};
+constexpr Section kRRCStateSection = {
+    .name = "RRC Info",
+    .kind = SectionKind::Dictionary,
+    .readings = kRRCReadings,
+    .reportsUnknownCodes = false,
+};
 
 void RRC_State::didRead(const PacketReading& /*reading*/, PacketView packet) {
-  if (packet.size() < kLength) {
+  if (packet.size() < kUTRANRRCStatePacket.minimumLength) {
     systemLog().log(LogPriority::Warning, "LogCode_0xD0E0 is length is {} expected size {}",
-                    packet.size(), kLength);
+                    packet.size(), kUTRANRRCStatePacket.minimumLength);
   }
   const Dictionary section = sectionDictionary();
   const int mode = modeOf(packet);

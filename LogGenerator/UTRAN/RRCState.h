@@ -6,7 +6,8 @@
 
 namespace kestro {
 
-inline constexpr LogCode kUTRANRRCStateCode = 0xD0E0;
+inline constexpr PacketKind kUTRANRRCStatePacket = {
+    .code = 0xD0E0, .name = "UTRAN RRC state", .minimumLength = 15};
 
 extern const Section kRRCStateSection;
 

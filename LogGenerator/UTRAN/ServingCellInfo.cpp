@@ -35,8 +35,7 @@ constexpr ListedValue kUTRANServingCellValues[] = {
 };
 
 constexpr PropertyListReading kServingCells = {
-    .code = kCellMonitorCode,
-    .packetName = kCellMonitorListName,
+    .packet = kCellMonitorPacket,
     .part = ListedPart::EachCell,
     .cells = {.technologies = {kTqCellMonitorRadioAccessTechnologyUTRAN2},
               .type = kTqCellMonitorCellTypeServing},
@@ -44,21 +43,16 @@ constexpr PropertyListReading kServingCells = {
 };
 
 constexpr PacketReading kUTRANReadings[] = {
-    {.code = kUTRANSystemInformationCode,
-     .packetName = "UTRAN system information",
-     .minimumLength = 26,
-     .fields = kUTRANSystemInformation},
-};
-constexpr auto kUTRANReadingCodes = codesOf(kUTRANReadings, kCellMonitorCode);
+    {.packet = kUTRANSystemInformationPacket, .fields = kUTRANSystemInformation}};
 
 }  // namespace
 
-constinit const Section kUTRANServingCellInfoSection = {.name = "Serving Cell Info",
-                                                        .logLine = "Serving Cell Info",
-                                                        .kind = SectionKind::Dictionary,
-                                                        .readings = kUTRANReadings,
-                                                        .codes = kUTRANReadingCodes,
-                                                        .reportsUnknownCodes = false,
-                                                        .propertyList = &kServingCells};
+constexpr Section kUTRANServingCellInfoSection = {
+    .name = "Serving Cell Info",
+    .kind = SectionKind::Dictionary,
+    .readings = kUTRANReadings,
+    .reportsUnknownCodes = false,
+    .propertyList = &kServingCells,
+};
 
 }  // namespace kestro

@@ -6,7 +6,8 @@
 
 namespace kestro {
 
-inline constexpr LogCode kUTRANSystemInformationCode = 0xD0E2;
+inline constexpr PacketKind kUTRANSystemInformationPacket = {
+    .code = 0xD0E2, .name = "UTRAN system information", .minimumLength = 26};
 
 extern const Section kUTRANServingCellInfoSection;
 

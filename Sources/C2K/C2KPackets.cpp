@@ -29,7 +29,7 @@ constexpr double kStrongestReceived = -20.9;
 /// A packet that is made of sub-packets.
 class SubPacketWriter {
  public:
-  explicit SubPacketWriter(LogCode code) : _writer(code, kFirstSubPacket) {}
+  explicit SubPacketWriter(const PacketKind& packet) : _writer(packet) {}
 
   [[nodiscard]] PacketWriter& writer() noexcept { return _writer; }
   /// Where the next sub-packet will lie.
@@ -109,7 +109,7 @@ double reportedPower(double level) {
 // --- 1x ------------------------------------------------------------------------------------------
 
 std::optional<Bytes> oneXStatus(const OneXReport& report, Moment time) {
-  SubPacketWriter packet(kOneXStatusReading.code);
+  SubPacketWriter packet(kOneXStatusPacket);
   const RecordPosition state = packet.begin(kOneXStateId, kStateSize);
   const RecordPosition radio = packet.begin(kOneXRadioId, kRadioSize);
   packet.writer()
@@ -128,7 +128,7 @@ std::optional<Bytes> oneXStatus(const OneXReport& report, Moment time) {
 }
 
 std::optional<Bytes> oneXTrafficFrame(bool isBad, Moment time) {
-  SubPacketWriter packet(kTrafficFrameReading.code);
+  SubPacketWriter packet(kOneXTrafficFramePacket);
   const RecordPosition frame = packet.begin(kTrafficDemodulationId, kTrafficDemodulationSize);
   packet.writer().put(kIsBadFrame, frame, isBad ? 1 : 0);
   return packet.writer().finish(time);

@@ -3,6 +3,7 @@
 
 #include <optional>
 
+#include "LogGenerator/Ondrel/SharedDecoders.h"
 #include "Platform/TelephonyService.h"
 #include "Sources/DriveTestValues.h"
 #include "Sources/ExtraPackets.h"
@@ -38,9 +39,9 @@ void GsmUmtsDriveTestEncoder::addStates(const DriveTestRow& row, PacketList& pac
   const Moment time = row.time;
   if (!_hasSentFiles) {
     _hasSentFiles = true;
-    packets.add(extraPacket(kSimFilesCode, simulatedSimFiles(1), _coding, time));
+    packets.add(extraPacket(kSimFilesPacket, simulatedSimFiles(1), _coding, time));
     packets.add(extraPacket(
-        kPacketDataContextsCode,
+        kPacketDataContextsPacket,
         Array{simulatedContext(
             {.accessPoint = "internet", .bearer = "PS, interactive", .isActive = true})},
         _coding, time));

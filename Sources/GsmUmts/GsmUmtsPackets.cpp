@@ -15,24 +15,6 @@
 namespace kestro {
 namespace {
 
-constexpr LogCode kSetInformationCode = 0x417A;
-constexpr LogCode kRankingCode = IdleModeRanking::kCode;
-constexpr LogCode kBlockErrorsCode = 0x4116;
-constexpr LogCode kHsdpaCode = 0x4221;
-constexpr LogCode kServingCellCode = 0x5134;
-constexpr LogCode kMeasurementsCode = GSMMeasurements::kCode;
-constexpr LogCode kColourCodesCode = 0x51FF;
-constexpr LogCode kDedicatedChannelCode = 0x5076;
-constexpr LogCode kMobileAllocationCode = 0x51F8;
-constexpr LogCode kRadioResourceCode = 0x512C;
-constexpr LogCode kDiscontinuousReceptionCode = 0x51F6;
-constexpr LogCode kDiscontinuousTransmissionCode = 0x5072;
-constexpr LogCode kGmmStateCode = 0x7130;
-constexpr LogCode kMmStateCode = 0x7131;
-constexpr LogCode kRegistrationCode = 0x7132;
-constexpr LogCode kServingNetworkCode = 0x7135;
-constexpr LogCode kEquivalentNetworksCode = 0x7150;
-
 constexpr std::size_t kUndescribedPayload = 32;
 constexpr unsigned kBlerWindow = 200;
 
@@ -53,9 +35,9 @@ std::array<std::int64_t, 3> digitsOf(unsigned code) {
 std::int64_t whole(double number) { return std::llround(number); }
 
 std::optional<Bytes> namedStates(
-    const Section& section, LogCode code,
+    const Section& section, const PacketKind& kind,
     std::initializer_list<std::pair<std::string_view, std::string_view>> texts, Moment time) {
-  ReadingWriter packet(section, code);
+  ReadingWriter packet(section, kind);
   auto fields = packet.fields();
   for (const auto& [key, text] : texts) fields.text(key, text);
   return packet.finish(time);
@@ -70,7 +52,7 @@ unsigned gsmLevelByte(double level) noexcept {
 // --- UMTS ----------------------------------------------------------------------------------------
 
 std::optional<Bytes> umtsSets(std::span<const UMTSCellReport> active, double total, Moment time) {
-  ReadingWriter packet(kActiveSetSection, kSetInformationCode);
+  ReadingWriter packet(kActiveSetSection, kUMTSSetInformationPacket);
   // The display makes whole dBm of it: (level + 512) / 10 - 106, tenths of a dB.
   packet.fields().raw("Receive Level", 10 * (whole(total) + 106) - 512);
   const RecordTable& cells = packet.table(active.size());
@@ -85,7 +67,7 @@ std::optional<Bytes> umtsSets(std::span<const UMTSCellReport> active, double tot
 }
 
 std::optional<Bytes> umtsRanking(std::span<const UMTSCellReport> cells, Moment time) {
-  ReadingWriter packet(kUMTSSetSection, kRankingCode);
+  ReadingWriter packet(kUMTSSetSection, kIdleModeRankingPacket);
   const RecordTable& table = packet.table(cells.size());
   for (std::size_t i = 0; i < cells.size(); ++i) {
     packet.writer()
@@ -101,7 +83,7 @@ std::optional<Bytes> umtsRanking(std::span<const UMTSCellReport> cells, Moment t
 }
 
 std::optional<Bytes> gsmRanking(std::span<const GSMCellReport> cells, Moment time) {
-  ReadingWriter packet(kGSMSetSection, kRankingCode);
+  ReadingWriter packet(kGSMSetSection, kIdleModeRankingPacket);
   const RecordTable& table = packet.table(cells.size());
   for (std::size_t i = 0; i < cells.size(); ++i) {
     packet.writer()
@@ -116,7 +98,7 @@ std::optional<Bytes> gsmRanking(std::span<const GSMCellReport> cells, Moment tim
 
 std::optional<Bytes> umtsBlockErrors(std::span<const TransportChannelReport> channels,
                                      Moment time) {
-  ReadingWriter packet(kBLERSection, kBlockErrorsCode);
+  ReadingWriter packet(kBLERSection, kUMTSBlockErrorsPacket);
   packet.fields().raw("Window Size", kBlerWindow);
   const RecordTable& table = packet.table(channels.size());
   for (std::size_t i = 0; i < channels.size(); ++i) {
@@ -131,7 +113,7 @@ std::optional<Bytes> umtsBlockErrors(std::span<const TransportChannelReport> cha
 
 std::optional<Bytes> hsdpaStatistics(std::span<const HarqProcessReport> processes,
                                      unsigned subframes, Moment time) {
-  ReadingWriter packet(kHSDPAInformationSection, kHsdpaCode);
+  ReadingWriter packet(kHSDPAInformationSection, kHSDPAStatisticsPacket);
   packet.fields()
       .raw("Version", 1)
       .raw("Sub Frames", subframes)
@@ -151,16 +133,15 @@ std::optional<Bytes> hsdpaStatistics(std::span<const HarqProcessReport> processe
 // --- GSM -----------------------------------------------------------------------------------------
 
 std::optional<Bytes> gsmServingCell(const GSMCellReport& cell, unsigned cellId, Moment time) {
-  ReadingWriter packet(kGSMServingCellSection, kServingCellCode);
+  ReadingWriter packet(kGSMServingCellSection, kGSMServingCellPacket);
   packet.fields().raw("Cell ID", cellId).raw("ARFCN", cell.arfcn).raw("BSIC", cell.bsic);
   return packet.finish(time);
 }
 
 std::optional<Bytes> gsmMeasurements(const GSMCellReport& serving,
                                      std::span<const GSMCellReport> neighbours, Moment time) {
-  ReadingWriter packet(kNeighboringCellsSection, kMeasurementsCode);
-  packet.writer()
-      .fields(readingOf(kGSMServingCellSection, kMeasurementsCode)->fields)
+  ReadingWriter packet(kNeighboringCellsSection, kGSMMeasurementsPacket);
+  packet.fieldsOf(kGSMServingCellSection)
       .raw("RSSI", gsmLevelByte(serving.level))
       .raw("C1 Value", std::max(serving.c1, 0))
       .raw("C2 Value", std::max(serving.c1, 0));
@@ -176,7 +157,7 @@ std::optional<Bytes> gsmMeasurements(const GSMCellReport& serving,
 }
 
 std::optional<Bytes> gsmColourCodes(std::span<const GSMCellReport> neighbours, Moment time) {
-  ReadingWriter packet(kNeighboringCellsSection, kColourCodesCode);
+  ReadingWriter packet(kNeighboringCellsSection, kGSMNeighbourBSICsPacket);
   const RecordTable& table = packet.table(neighbours.size());
   for (std::size_t i = 0; i < neighbours.size(); ++i) {
     packet.writer()
@@ -188,14 +169,14 @@ std::optional<Bytes> gsmColourCodes(std::span<const GSMCellReport> neighbours, M
 }
 
 std::optional<Bytes> gsmDedicatedChannel(unsigned arfcn, Moment time) {
-  ReadingWriter packet(kGSMServingCellSection, kDedicatedChannelCode);
+  ReadingWriter packet(kGSMServingCellSection, kGSMDedicatedChannelPacket);
   packet.fields().raw("MA Dedicated ARFCN", arfcn);
   return packet.finish(time);
 }
 
 std::optional<Bytes> gsmMobileAllocation(unsigned hoppingSequence, std::span<const unsigned> arfcns,
                                          Moment time) {
-  ReadingWriter packet(kMobileAllocationSection, kMobileAllocationCode);
+  ReadingWriter packet(kMobileAllocationSection, kGSMMobileAllocationPacket);
   packet.fields().raw("HSN", hoppingSequence);
   const RecordTable& table = packet.table(arfcns.size());
   for (std::size_t i = 0; i < arfcns.size(); ++i) {
@@ -205,19 +186,19 @@ std::optional<Bytes> gsmMobileAllocation(unsigned hoppingSequence, std::span<con
 }
 
 std::optional<Bytes> gsmRadioResource(std::string_view state, unsigned mode, Moment time) {
-  ReadingWriter packet(kGSMRRInfoSection, kRadioResourceCode);
+  ReadingWriter packet(kGSMRRInfoSection, kGSMRRStatePacket);
   packet.fields().text("RR State", state).raw("RR Mode", mode);
   return packet.finish(time);
 }
 
 std::optional<Bytes> gsmDiscontinuousReception(unsigned seconds, Moment time) {
-  ReadingWriter packet(kGSMRRInfoSection, kDiscontinuousReceptionCode);
+  ReadingWriter packet(kGSMRRInfoSection, kGSMDiscontinuousReceptionPacket);
   packet.fields().raw("DRX Used", seconds);
   return packet.finish(time);
 }
 
 std::optional<Bytes> gsmDiscontinuousTransmission(bool isUsed, Moment time) {
-  ReadingWriter packet(kGSMRRInfoSection, kDiscontinuousTransmissionCode);
+  ReadingWriter packet(kGSMRRInfoSection, kGSMDiscontinuousTransmissionPacket);
   packet.fields().raw("DTX Used", isUsed ? 1 : 0);
   return packet.finish(time);
 }
@@ -227,32 +208,29 @@ std::optional<Bytes> gsmDiscontinuousTransmission(bool isUsed, Moment time) {
 std::optional<Bytes> mmState(std::string_view state, std::string_view subState,
                              std::string_view updateStatus, Moment time) {
   return namedStates(
-      kProcessCSSection, kMmStateCode,
+      kProcessCSSection, kMMStatePacket,
       {{"MM State", state}, {"MM Sub State", subState}, {"LU Reject Cause", updateStatus}}, time);
 }
 
 std::optional<Bytes> gmmState(std::string_view state, std::string_view subState,
                               std::string_view updateStatus, Moment time) {
   return namedStates(
-      kProcessPSSection, kGmmStateCode,
+      kProcessPSSection, kGMMStatePacket,
       {{"MM State", state}, {"MM Sub State", subState}, {"Attach Reject Cause", updateStatus}},
       time);
 }
 
 std::optional<Bytes> registrationState(std::string_view state, std::string_view selectionMode,
                                        Moment time) {
-  PacketWriter writer(kRegistrationCode,
-                      readingOf(kProcessCSSection, kRegistrationCode)->minimumLength);
-  writer.fields(readingOf(kProcessCSSection, kRegistrationCode)->fields)
-      .text("MM Service State", state);
-  writer.fields(readingOf(kServingPLMNSection, kRegistrationCode)->fields)
-      .text("PLMN Sel Mod", selectionMode);
-  return writer.finish(time);
+  ReadingWriter packet(kProcessCSSection, kRegistrationStatePacket);
+  packet.fields().text("MM Service State", state);
+  packet.fieldsOf(kServingPLMNSection).text("PLMN Sel Mod", selectionMode);
+  return packet.finish(time);
 }
 
 std::optional<Bytes> servingNetwork(const NetworkArea& area, std::string_view serviceType,
                                     Moment time) {
-  ReadingWriter packet(kServingPLMNSection, kServingNetworkCode);
+  ReadingWriter packet(kServingPLMNSection, kServingPLMNPacket);
   packet.fields()
       .raw("Mobile Country Code", digitsOf(area.countryCode))
       .raw("Mobile Network Code", digitsOf(area.networkCode))
@@ -263,7 +241,7 @@ std::optional<Bytes> servingNetwork(const NetworkArea& area, std::string_view se
 }
 
 std::optional<Bytes> equivalentNetwork(const NetworkArea& network, Moment time) {
-  ReadingWriter packet(kEquivalentPLMNListSection, kEquivalentNetworksCode);
+  ReadingWriter packet(kEquivalentPLMNListSection, kEquivalentPLMNListPacket);
   const RecordTable& table = packet.table(1);
   packet.writer()
       .record(table, 0)
@@ -272,8 +250,8 @@ std::optional<Bytes> equivalentNetwork(const NetworkArea& network, Moment time) 
   return packet.finish(time);
 }
 
-std::optional<Bytes> undescribedPacket(LogCode code, Moment time) {
-  return PacketWriter(code, kPacketHeaderSize + kUndescribedPayload).finish(time);
+std::optional<Bytes> undescribedPacket(const PacketKind& packet, Moment time) {
+  return PacketWriter(packet.code, kPacketHeaderSize + kUndescribedPayload).finish(time);
 }
 
 }  // namespace kestro

@@ -9,7 +9,7 @@
 #include <span>
 #include <string_view>
 
-#include "LogGenerator/Packets/Section.h"
+#include "LogGenerator/Packets/PacketKind.h"
 #include "Platform/Bytes.h"
 #include "Platform/Clock.h"
 
@@ -103,6 +103,6 @@ struct HarqProcessReport {
 [[nodiscard]] std::optional<Bytes> equivalentNetwork(const NetworkArea& network, Moment time);
 
 /// A packet whose contents nobody has described: its header and 32 zero bytes.
-[[nodiscard]] std::optional<Bytes> undescribedPacket(LogCode code, Moment time);
+[[nodiscard]] std::optional<Bytes> undescribedPacket(const PacketKind& packet, Moment time);
 
 }  // namespace kestro

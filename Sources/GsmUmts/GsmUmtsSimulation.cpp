@@ -4,7 +4,9 @@
 #include <algorithm>
 #include <cmath>
 
+#include "LogGenerator/GsmUmts/UnfilledSections.h"
 #include "LogGenerator/Ondrel/CellMonitor.h"
+#include "LogGenerator/Ondrel/SharedDecoders.h"
 #include "Platform/TelephonyService.h"
 #include "Sources/ExtraPackets.h"
 
@@ -17,10 +19,6 @@ constexpr unsigned kContextSteps = 4;
 
 constexpr std::size_t kMostUMTSNeighbours = 6;
 constexpr unsigned kUarfcn = 10613;
-
-// Codes whose contents nobody has described.
-constexpr LogCode kUndescribedCodes[] = {0x51F5, 0x51FB, 0x51FD, 0x51F4,
-                                         0x4125, 0x4031, 0x4127, 0x4157};
 
 // How the simulated network numbers its cells.
 unsigned scramblingCode(const SimulatedCell& cell) { return 24 * cell.site + 8 * cell.sector + 5; }
@@ -147,7 +145,7 @@ std::vector<Bytes> GsmUmtsSimulation::step(std::chrono::milliseconds elapsed, Mo
   packets.add(gsmRadioResource(radioResourceState(), _mobility.isInCall() ? 1 : 0, now));
   addMobility(packets, now);
   if (_steps % kContextSteps == 0) {
-    packets.add(extraPacket(kPacketDataContextsCode, contexts(_phone), _coding, now));
+    packets.add(extraPacket(kPacketDataContextsPacket, contexts(_phone), _coding, now));
   }
   if (repeatsRareLists(_steps)) addRare(packets, now);
   _lastAccess = _phone.access();
@@ -156,7 +154,7 @@ std::vector<Bytes> GsmUmtsSimulation::step(std::chrono::milliseconds elapsed, Mo
 }
 
 void GsmUmtsSimulation::addCellLists(PacketList& packets, Moment now) {
-  packets.add(extraPacket(kCellMonitorCode, cellMonitorList(_phone), _coding, now));
+  packets.add(extraPacket(kCellMonitorPacket, cellMonitorList(_phone), _coding, now));
 }
 
 void GsmUmtsSimulation::addUMTS(PacketList& packets, Moment now) {
@@ -238,8 +236,13 @@ void GsmUmtsSimulation::addMobility(PacketList& packets, Moment now) {
 void GsmUmtsSimulation::addRare(PacketList& packets, Moment now) {
   packets.add(equivalentNetwork({.networkCode = 991}, now));
   const unsigned area = areaOf(_phone).locationArea;
-  packets.add(extraPacket(kSimFilesCode, simulatedSimFiles(area), _coding, now));
-  for (const LogCode code : kUndescribedCodes) packets.add(undescribedPacket(code, now));
+  packets.add(extraPacket(kSimFilesPacket, simulatedSimFiles(area), _coding, now));
+  for (const PacketKind& packet : kUndescribedGSMPackets) {
+    packets.add(undescribedPacket(packet, now));
+  }
+  for (const PacketKind& packet : kUndescribedUMTSPackets) {
+    packets.add(undescribedPacket(packet, now));
+  }
 }
 
 }  // namespace kestro

@@ -4,6 +4,7 @@
 #include <optional>
 
 #include "LogGenerator/Ondrel/CellMonitor.h"
+#include "LogGenerator/Ondrel/SharedDecoders.h"
 #include "Platform/TelephonyService.h"
 #include "Sources/DriveTestValues.h"
 #include "Sources/ExtraPackets.h"
@@ -70,7 +71,7 @@ std::vector<Bytes> LTEDriveTestEncoder::messages(const DriveTestRow& row) {
     cell->trackingAreaCode = *area;
     packets.add(lteSystemInformation(*cell, time));
     packets.add(lteAntennas(*cell, time));
-    packets.add(extraPacket(kCellMonitorCode, cellMonitorList(*cell), _coding, time));
+    packets.add(extraPacket(kCellMonitorPacket, cellMonitorList(*cell), _coding, time));
   }
   addLists(packets, time);
   const auto serving = servingIn(row, cell);
@@ -86,9 +87,9 @@ std::vector<Bytes> LTEDriveTestEncoder::messages(const DriveTestRow& row) {
 void LTEDriveTestEncoder::addLists(PacketList& packets, Moment time) {
   if (_hasSentFiles) return;
   _hasSentFiles = true;
-  packets.add(extraPacket(kSimFilesCode, simulatedSimFiles(1), _coding, time));
+  packets.add(extraPacket(kSimFilesPacket, simulatedSimFiles(1), _coding, time));
   packets.add(extraPacket(
-      kPacketDataContextsCode,
+      kPacketDataContextsPacket,
       Array{
           simulatedContext({.accessPoint = "internet", .bearer = "EPS, QCI 9", .isActive = true})},
       _coding, time));

@@ -3,38 +3,16 @@
 
 #include <algorithm>
 #include <cmath>
-#include <map>
-#include <string>
 
 #include "LogGenerator/LTE/Measurements.h"
 #include "LogGenerator/LTE/Reselection.h"
 #include "LogGenerator/LTE/ServingCellInfo.h"
+#include "Sources/ReadingWriter.h"
 
 namespace kestro {
 namespace {
 
 constexpr unsigned kPacketVersion = 1;
-
-/// The name of a bandwidth, as the display has it.
-std::string_view bandwidthName(unsigned resourceBlocks) {
-  static const std::map<unsigned, std::string_view> kNames = {
-      {6, "1.4 MHz"}, {15, "3 MHz"}, {25, "5 MHz"}, {50, "10 MHz"}, {75, "15 MHz"}, {100, "20 MHz"},
-  };
-  const auto name = kNames.find(resourceBlocks);
-  return name == kNames.end() ? "Unknown" : name->second;
-}
-
-const RecordTable& tableOf(const Section& section, LogCode code) {
-  return readingOf(section, code)->lists.front().table;
-}
-
-PacketWriter writerFor(const Section& section, LogCode code) {
-  return {code, readingOf(section, code)->minimumLength};
-}
-
-PacketWriter::Fields fieldsOf(PacketWriter& writer, const Section& section, LogCode code) {
-  return writer.fields(readingOf(section, code)->fields);
-}
 
 /// Which neighbours are looked for: those on the frequency (1), those on others (2), or both.
 std::int64_t measurementRules(const LTEServing& serving) {
@@ -64,32 +42,29 @@ int LTEReselectionParameters::selectionLevel(double rsrp) const noexcept {
 }
 
 std::optional<Bytes> lteSystemInformation(const LTECell& cell, Moment time) {
-  const Section& section = kLTEServingCellInfoSection;
-  PacketWriter writer = writerFor(section, kLTESystemInformationCode);
-  fieldsOf(writer, section, kLTESystemInformationCode)
+  ReadingWriter packet(kLTEServingCellInfoSection, kLTESystemInformationPacket);
+  packet.fields()
       .raw("Physical Cell ID", cell.physicalCellId)
       .raw("Download Frequency", cell.earfcn)
       .raw("Upload Frequency", cell.uplinkEarfcn)
-      .text("Download Bandwidth", bandwidthName(cell.resourceBlocks))
-      .text("Upload Bandwidth", bandwidthName(cell.resourceBlocks))
+      .raw("Download Bandwidth", cell.resourceBlocks)
+      .raw("Upload Bandwidth", cell.resourceBlocks)
       .raw("Cell Identity", cell.cellIdentity)
       .raw("Tracking Area Code", cell.trackingAreaCode)
       .raw("Freq Band Indicator", cell.band);
-  return writer.finish(time);
+  return packet.finish(time);
 }
 
 std::optional<Bytes> lteAntennas(const LTECell& cell, Moment time) {
-  const Section& section = kLTEServingCellInfoSection;
-  PacketWriter writer = writerFor(section, kLTEAntennasCode);
-  fieldsOf(writer, section, kLTEAntennasCode).raw("Num Tx Antennas", cell.antennas);
-  return writer.finish(time);
+  ReadingWriter packet(kLTEServingCellInfoSection, kLTEAntennasPacket);
+  packet.fields().raw("Num Tx Antennas", cell.antennas);
+  return packet.finish(time);
 }
 
 std::optional<Bytes> lteServingCell(const LTEServing& serving, Moment time) {
-  const Section& section = kServingCellMeasurementSection;
   const LTEReselectionParameters& reselection = serving.reselection;
-  PacketWriter writer = writerFor(section, kLTEServingCellCode);
-  fieldsOf(writer, section, kLTEServingCellCode)
+  ReadingWriter packet(kServingCellMeasurementSection, kLTEServingCellPacket);
+  packet.fields()
       .raw("Version", kPacketVersion)
       .raw("E-ARFCN", serving.cell.earfcn)
       .raw("Physical Cell ID", serving.cell.physicalCellId)
@@ -108,68 +83,62 @@ std::optional<Bytes> lteServingCell(const LTEServing& serving, Moment time) {
       .number("S Non Intra Search", reselection.nonIntraSearch)
       .raw("Measurement Rules Updated", serving.rulesUpdated ? 1 : 0)
       .raw("Measurement Rules", measurementRules(serving));
-  return writer.finish(time);
+  return packet.finish(time);
 }
 
 std::optional<Bytes> lteIntraFrequency(const LTEServing& serving,
                                        std::span<const LTENeighbour> measured,
                                        std::span<const unsigned> detectedCellIds, unsigned subframe,
                                        Moment time) {
-  const Section& section = kConnectedModeMeasurementSection;
-  const RecordTable& neighbours = tableOf(kMeasuredNeighborCellsSection, kLTEIntraFrequencyCode);
-  const RecordTable& detected = tableOf(kDetectedCellsSection, kLTEIntraFrequencyCode);
-  PacketWriter writer = writerFor(section, kLTEIntraFrequencyCode);
-  fieldsOf(writer, section, kLTEIntraFrequencyCode)
+  ReadingWriter packet(kConnectedModeMeasurementSection, kLTEIntraFrequencyPacket);
+  packet.fields()
       .raw("E-ARFCN", serving.cell.earfcn)
       .raw("Serving Physical Cell ID", serving.cell.physicalCellId)
       .raw("Subframe Number", subframe)
       .number("Serving Filtered RSRP", serving.average.rsrp)
       .number("Serving Filtered RSRQ", serving.average.rsrq);
-  writer.setCount(neighbours, measured.size());
-  writer.setCount(detected, detectedCellIds.size());
+  const RecordTable& neighbours = packet.tableOf(kMeasuredNeighborCellsSection, measured.size());
+  const RecordTable& detected = packet.tableOf(kDetectedCellsSection, detectedCellIds.size());
   for (std::size_t i = 0; i < measured.size(); ++i) {
-    writer.record(neighbours, i)
+    packet.writer()
+        .record(neighbours, i)
         .raw("Physical Cell ID", measured[i].physicalCellId)
         .number("Filtered RSRP", measured[i].average.rsrp)
         .number("Filtered RSRQ", measured[i].average.rsrq);
   }
   for (std::size_t i = 0; i < detectedCellIds.size(); ++i) {
-    writer.record(detected, i).raw("Physical Cell ID", detectedCellIds[i]);
+    packet.writer().record(detected, i).raw("Physical Cell ID", detectedCellIds[i]);
   }
-  return writer.finish(time);
+  return packet.finish(time);
 }
 
 std::optional<Bytes> lteNeighbours(const LTEServing& serving,
                                    std::span<const LTENeighbour> neighbours, Moment time) {
-  const Section& section = kNeighborMeasurementSection;
-  const RecordTable& table = tableOf(kNeighborCellsListSection, kLTENeighborCode);
-  PacketWriter writer = writerFor(section, kLTENeighborCode);
-  fieldsOf(writer, section, kLTENeighborCode)
+  ReadingWriter packet(kNeighborMeasurementSection, kLTENeighborPacket);
+  packet.fields()
       .raw("Version", kPacketVersion)
       .raw("E-ARFCN", serving.cell.earfcn)
       .number("Qrxlevmin", serving.reselection.minimumRsrp);
-  writer.setCount(table, neighbours.size());
+  const RecordTable& table = packet.tableOf(kNeighborCellsListSection, neighbours.size());
   for (std::size_t i = 0; i < neighbours.size(); ++i) {
-    writeNeighbour(writer.record(table, i), neighbours[i], serving.reselection);
+    writeNeighbour(packet.writer().record(table, i), neighbours[i], serving.reselection);
   }
-  return writer.finish(time);
+  return packet.finish(time);
 }
 
 std::optional<Bytes> lteReselection(const LTEServing& serving, const LTECandidate& candidate,
                                     Moment time) {
-  const Section& section = kReselectionCandidatesSection;
-  const RecordTable& table = tableOf(kReselectionCandidatesListSection, kLTEReselectionCode);
-  PacketWriter writer = writerFor(section, kLTEReselectionCode);
-  fieldsOf(writer, section, kLTEReselectionCode)
+  ReadingWriter packet(kReselectionCandidatesSection, kLTEReselectionPacket);
+  packet.fields()
       .raw("Version", kPacketVersion)
       .raw("Serving EARFCN", serving.cell.earfcn)
       .raw("Serving Cell ID", serving.cell.physicalCellId);
-  writer.setCount(table, 1);
-  auto record = writer.record(table, 0);
+  const RecordTable& table = packet.tableOf(kReselectionCandidatesListSection, 1);
+  auto record = packet.writer().record(table, 0);
   record.raw("Candidate Priority", candidate.priority)
       .text("Candidate RAT Type", candidate.technology);
   for (const auto& [key, raw] : candidate.fields) record.raw(key, raw);
-  return writer.finish(time);
+  return packet.finish(time);
 }
 
 }  // namespace kestro

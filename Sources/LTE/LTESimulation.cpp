@@ -4,6 +4,7 @@
 #include <algorithm>
 
 #include "LogGenerator/Ondrel/CellMonitor.h"
+#include "LogGenerator/Ondrel/SharedDecoders.h"
 #include "Platform/TelephonyService.h"
 #include "Sources/ExtraPackets.h"
 #include "Sources/LTE/LTEPackets.h"
@@ -113,14 +114,14 @@ void LTESimulation::addReselection(PacketList& packets, Moment now) {
 void LTESimulation::addLists(PacketList& packets, Moment now) {
   if (repeatsRareLists(_steps)) {
     const unsigned area = _phone.serving().cell.trackingAreaCode;
-    packets.add(extraPacket(kSimFilesCode, simulatedSimFiles(area), _coding, now));
+    packets.add(extraPacket(kSimFilesPacket, simulatedSimFiles(area), _coding, now));
   }
   // What cells broadcast takes the channel out of the section that this list puts it into.
   if (_phone.hasNewCell() || _steps % kListSteps == 0) {
-    packets.add(extraPacket(kCellMonitorCode, cellMonitorList(_phone), _coding, now));
+    packets.add(extraPacket(kCellMonitorPacket, cellMonitorList(_phone), _coding, now));
   }
   if (_steps % kListSteps == 0) {
-    packets.add(extraPacket(kPacketDataContextsCode, contexts(_phone), _coding, now));
+    packets.add(extraPacket(kPacketDataContextsPacket, contexts(_phone), _coding, now));
   }
 }
 

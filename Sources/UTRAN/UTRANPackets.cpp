@@ -60,13 +60,13 @@ unsigned utranBlockErrorStep(double rate) noexcept {
 unsigned utranSirStep(double sir) noexcept { return stepFrom(-11, 0.5, sir); }
 
 std::optional<Bytes> utranRrcState(std::string_view mode, Moment time) {
-  ReadingWriter packet(kRRCStateSection, kUTRANRRCStateCode);
+  ReadingWriter packet(kRRCStateSection, kUTRANRRCStatePacket);
   packet.fields().raw("Mode Valid", 1).text("State", mode);
   return packet.finish(time);
 }
 
 std::optional<Bytes> utranSystemInformation(const UTRANCell& cell, Moment time) {
-  ReadingWriter packet(kUTRANServingCellInfoSection, kUTRANSystemInformationCode);
+  ReadingWriter packet(kUTRANServingCellInfoSection, kUTRANSystemInformationPacket);
   packet.fields()
       .raw("Cell Access Restrictions", 0)
       .raw("Cell ID", cell.cellIdentity)
@@ -78,7 +78,7 @@ std::optional<Bytes> utranSystemInformation(const UTRANCell& cell, Moment time) 
 }
 
 std::optional<Bytes> utranNeighbours(std::span<const UTRANCellReport> cells, Moment time) {
-  ReadingWriter packet(kUTRANNeighborsSection, kUTRANNeighborsCode);
+  ReadingWriter packet(kUTRANNeighborsSection, kUTRANNeighborsPacket);
   const RecordTable& table = packet.table(cells.size());
   for (std::size_t i = 0; i < cells.size(); ++i) {
     packet.writer()
@@ -93,7 +93,7 @@ std::optional<Bytes> utranNeighbours(std::span<const UTRANCellReport> cells, Mom
 }
 
 std::optional<Bytes> utranGSMNeighbours(std::span<const UTRANGSMCellReport> cells, Moment time) {
-  ReadingWriter packet(kUTRANGSMNeighborsSection, kUTRANGSMNeighborsCode);
+  ReadingWriter packet(kUTRANGSMNeighborsSection, kUTRANGSMNeighborsPacket);
   const RecordTable& table = packet.table(cells.size());
   for (std::size_t i = 0; i < cells.size(); ++i) {
     packet.writer()
@@ -111,12 +111,9 @@ std::optional<Bytes> utranGSMNeighbours(std::span<const UTRANGSMCellReport> cell
 
 std::optional<Bytes> utranChannels(std::span<const UTRANTransportChannel> transport,
                                    std::span<const UTRANCodedChannel> coded, Moment time) {
-  ReadingWriter packet(kTRCHBLERSection, kUTRANTransportChannelsCode);
+  ReadingWriter packet(kTRCHBLERSection, kUTRANTransportChannelsPacket);
   const RecordTable& transportTable = packet.table(transport.size());
-  // The other section reads the same packet.
-  const RecordTable& codedTable =
-      readingOf(kCCTRCHSIRSection, kUTRANTransportChannelsCode)->lists.front().table;
-  packet.writer().setCount(codedTable, coded.size());
+  const RecordTable& codedTable = packet.tableOf(kCCTRCHSIRSection, coded.size());
   for (std::size_t i = 0; i < transport.size(); ++i) {
     writeTransportChannel(packet.writer().record(transportTable, i), transport[i]);
   }

@@ -4,6 +4,7 @@
 #include <cmath>
 
 #include "LogGenerator/Ondrel/CellMonitor.h"
+#include "LogGenerator/Ondrel/SharedDecoders.h"
 #include "Platform/TelephonyService.h"
 #include "Sources/ExtraPackets.h"
 
@@ -65,17 +66,17 @@ std::vector<Bytes> UTRANSimulation::step(std::chrono::milliseconds elapsed, Mome
 void UTRANSimulation::addServingCell(PacketList& packets, Moment now) {
   if (!_phone.hasNewCell() && _steps % kUTRANListSteps != 0) return;
   packets.add(utranSystemInformation(_phone.serving(), now));
-  packets.add(extraPacket(kCellMonitorCode, cellMonitorList(_phone), _coding, now));
+  packets.add(extraPacket(kCellMonitorPacket, cellMonitorList(_phone), _coding, now));
 }
 
 void UTRANSimulation::addLists(PacketList& packets, Moment now) {
   if (_steps % kUTRANListSteps == 0) {
     packets.add(utranGSMNeighbours(_phone.gsmCells(), now));
-    packets.add(extraPacket(kPacketDataContextsCode, contexts(_phone), _coding, now));
+    packets.add(extraPacket(kPacketDataContextsPacket, contexts(_phone), _coding, now));
   }
   if (repeatsRareLists(_steps)) {
     const unsigned area = _phone.serving().locationArea;
-    packets.add(extraPacket(kSimFilesCode, simulatedSimFiles(area), _coding, now));
+    packets.add(extraPacket(kSimFilesPacket, simulatedSimFiles(area), _coding, now));
   }
 }
 

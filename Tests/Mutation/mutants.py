@@ -6,7 +6,7 @@ import dataclasses
 # The types whose constants are tables, or rows that stand alone.
 TABLES = frozenset({
     "Place", "Condition", "Field", "NamedValue", "ListedValue", "RecordTable", "ListReading",
-    "PacketReading", "Section", "EcnoRow", "SentCounter", "ThroughputLayout",
+    "PacketKind", "PacketReading", "Section", "EcnoRow", "SentCounter", "ThroughputLayout",
 })
 
 
@@ -163,10 +163,12 @@ class Mutants:
         if not view["table"]["keepsNone"].value:
             self.flip(view, "isPlain", path)
 
-    def packet_reading(self, view, path):
-        path = f"{path} \"{view['packetName'].text}\""
+    def packet_kind(self, view, path):
         self.step(view, "code", path, +1)
         self.step(view, "minimumLength", path, +1, -1)
+
+    def packet_reading(self, view, path):
+        pass  # a packet, and tables of their own
 
     def section(self, view, path):
         pass  # texts, and tables of their own
@@ -180,7 +182,6 @@ class Mutants:
         self.step(view, "bits", path, +1)
 
     def throughput_layout(self, view, path):
-        self.packet_reading(view["reading"], path)
         self.place(view["sequenceNumber"], f"{path} sequenceNumber")
 
 
@@ -192,6 +193,7 @@ _KINDS = {
     "ListedValue": Mutants.listed_value,
     "RecordTable": Mutants.record_table,
     "ListReading": Mutants.list_reading,
+    "PacketKind": Mutants.packet_kind,
     "PacketReading": Mutants.packet_reading,
     "Section": Mutants.section,
     "EcnoRow": Mutants.ecno_row,

@@ -117,6 +117,13 @@ class Conditions(unittest.TestCase):
         self.assertIn("not isSigned", self.changes(0, 128, width=1, bits=8))
 
 
+class Packets(unittest.TestCase):
+    def test_the_code_and_the_least_length_change(self):
+        self.assertEqual(changes(Struct("PacketKind", 8, code=0xB17F, minimumLength=33)), {
+            "code+1": {8: 0xB180}, "minimumLength+1": {9: 34}, "minimumLength-1": {9: 32},
+        })
+
+
 class Counters(unittest.TestCase):
     def test_both_members_change(self):
         self.assertEqual(changes(Struct("SentCounter", 8, offset=17, bits=128)), {

@@ -6,10 +6,15 @@
 #include <cstddef>
 #include <cstdint>
 
-#include "LogGenerator/Packets/Section.h"
+#include "LogGenerator/Packets/PacketKind.h"
 #include "Platform/Bytes.h"
 
 namespace kestro::testing {
+
+// The extra packets, by hand.
+inline constexpr LogCode kSimFilesCode = 0xFF0000;
+inline constexpr LogCode kCellMonitorCode = 0xFF0001;
+inline constexpr LogCode kPacketDataContextsCode = 0xFF0002;
 
 /// A packet that begins with its header and grows with what is written. Offsets count from the
 /// first byte, integers are little-endian, and what is not written is 0.

@@ -141,8 +141,8 @@ TEST(TableText, SaysWhereTheTwinsLie) {
 }
 
 TEST(PartText, NamesTheCells) {
-  PropertyListReading reading = {.code = 0xFF0001,
-                                 .packetName = "list",
+  const PacketKind packet = {.code = 0xFF0001, .name = "list"};
+  PropertyListReading reading = {.packet = packet,
                                  .part = ListedPart::FirstCell,
                                  .cells = {.technologies = {"A", "B"}, .type = "Serving"}};
   EXPECT_EQ(partText(reading, SectionKind::Dictionary), "from the first Serving of A or B");

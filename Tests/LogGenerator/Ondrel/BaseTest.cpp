@@ -44,12 +44,20 @@ TEST(LookUpECNOTest, StepsJustAboveEachThreshold) {
 
 // --- Decoders and their registry -----------------------------------------------------------------
 
-constexpr PacketReading kFirstReadings[] = {{0x4179, "first", 13}, {0x0005, "first", 13}};
-constexpr auto kFirstCodes = codesOf(kFirstReadings, kSimFilesCode);
-constexpr Section kFirstSection = {"Cells", "First", SectionKind::Dictionary, kFirstReadings,
-                                   kFirstCodes};
-constexpr PacketReading kSecondReading = {0x4179, "second", 13};
-constexpr Section kSecondSection = sectionOf("Cells", SectionKind::List, kSecondReading);
+constexpr PacketKind kFirstPacket = {0x4179, "first", 13};
+constexpr PacketKind kShorterPacket = {0x4179, "first, shorter", 0};
+constexpr PacketKind kOtherPacket = {0x0005, "other", 13};
+constexpr PacketKind kListPacket = {0xFF0000, "list", 13};
+
+// Two readings of one code make one subscription.
+constexpr PacketReading kFirstReadings[] = {
+    {.packet = kFirstPacket}, {.packet = kShorterPacket}, {.packet = kOtherPacket}};
+constexpr PropertyListReading kFirstList = {.packet = kListPacket, .part = ListedPart::Root};
+constexpr Section kFirstSection = {
+    .name = "Cells", .readings = kFirstReadings, .propertyList = &kFirstList};
+constexpr PacketReading kSecondReadings[] = {{.packet = kFirstPacket}};
+constexpr Section kSecondSection = {
+    .name = "Cells", .kind = SectionKind::List, .readings = kSecondReadings};
 
 using First = TableDecoder<kFirstSection>;
 using Second = TableDecoder<kSecondSection>;

@@ -23,15 +23,13 @@ constexpr CellKind kNeighbors = {
     kTqCellMonitorCellTypeNeighbor};
 
 constexpr PropertyListReading reading(ListedPart part) {
-  return {kCellMonitorCode, kCellMonitorListName, part, kNeighbors, kValues, kMissingCellArrayLine};
+  return {kCellMonitorPacket, part, kNeighbors, kValues, kMissingCellArrayLine};
 }
 constexpr PropertyListReading kFirst = reading(ListedPart::FirstCell);
 constexpr PropertyListReading kEach = reading(ListedPart::EachCell);
 
-constexpr LogCode kCodes[] = {kCellMonitorCode};
 constexpr Section section(SectionKind kind, const PropertyListReading& list) {
-  return {
-      .name = "Cells", .logLine = "Cells", .kind = kind, .codes = kCodes, .propertyList = &list};
+  return {.name = "Cells", .kind = kind, .propertyList = &list};
 }
 constexpr Section kListSection = section(SectionKind::List, kEach);
 constexpr Section kFirstCellSection = section(SectionKind::Dictionary, kFirst);

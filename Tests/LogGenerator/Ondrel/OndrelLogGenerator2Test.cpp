@@ -19,18 +19,26 @@ using ::testing::SizeIs;
 using Line = RecordingSystemLog::Line;
 
 constexpr Field kLevelFields[] = {{"Level", u8(13), decimal()}};
-constexpr PacketReading kLevelReadings[] = {{0x4179, "level", 14, kLevelFields}};
-constexpr LogCode kLevelCodes[] = {0x4179, 0xFF0001};
-constexpr Section kLevelSection = {"Level", "LevelDecoder", SectionKind::Dictionary, kLevelReadings,
-                                   kLevelCodes};
+constexpr PacketKind kLevelPacket = {0x4179, "level", 14};
+constexpr PacketKind kExtraPacket = {.code = 0xFF0001};
+constexpr PacketKind kUnreadPacket = {.code = 0x0005};
+
+constexpr PacketReading kLevelReadings[] = {{kLevelPacket, kLevelFields}};
+// A plain SectionDecoder asks for its property list and cannot read it.
+constexpr PropertyListReading kUnreadList = {.packet = kExtraPacket, .part = ListedPart::Root};
+constexpr Section kLevelSection = {.name = "Level",
+                                   .logLine = "LevelDecoder",
+                                   .readings = kLevelReadings,
+                                   .propertyList = &kUnreadList};
 
 constexpr Field kCellFields[] = {{"Cell", u8(0), decimal()}};
 constexpr ListReading kCellLists[] = {
     {.table = {.name = "cell", .count = u8(13), .base = 14, .stride = 1, .fields = kCellFields}}};
-constexpr PacketReading kCellReadings[] = {{0x4179, "level", 14, {}, kCellLists}};
-constexpr LogCode kCellCodes[] = {0x4179, 0x0005};
-constexpr Section kCellSection = {"Cells", "CellDecoder", SectionKind::List, kCellReadings,
-                                  kCellCodes};
+constexpr PacketReading kCellReadings[] = {{kLevelPacket, {}, kCellLists}, {kUnreadPacket}};
+constexpr Section kCellSection = {.name = "Cells",
+                                  .logLine = "CellDecoder",
+                                  .kind = SectionKind::List,
+                                  .readings = kCellReadings};
 
 class TestIndex : public ClassIndex {
  public:

@@ -31,9 +31,9 @@ constexpr Field kRecordFields[] = {
 };
 constexpr ListReading kLists[] = {
     {.table = {.name = "cell", .count = u8(13), .base = 18, .stride = 2, .fields = kRecordFields}}};
-constexpr PacketReading kReadings[] = {{0x1234, "test packet", 16, kExplainedFields, kLists}};
-constexpr LogCode kCodes[] = {0x1234};
-constexpr Section kSection = {"Test", "Test", SectionKind::Dictionary, kReadings, kCodes};
+constexpr PacketKind kTestPacket = {0x1234, "test packet", 16};
+constexpr PacketReading kReadings[] = {{kTestPacket, kExplainedFields, kLists}};
+constexpr Section kSection = {.name = "Test", .readings = kReadings};
 
 class ExplainTest : public ::testing::Test {
  protected:
@@ -112,7 +112,8 @@ TEST_F(ExplainTest, ACountThatIsStoredOtherwiseIsToldInRecords) {
                                                  .base = 14,
                                                  .stride = 2,
                                                  .fields = kRecordFields}}};
-  const PacketReading reading = {0x1234, "test packet", 14, {}, kOneMore};
+  const PacketKind shortPacket = {0x1234, "test packet", 14};
+  const PacketReading reading = {shortPacket, {}, kOneMore};
   const Bytes bytes = packet({1, 7, 0x07, 8, 0x09});
   explainReading(kSection, reading, PacketView(bytes),
                  [this](const ExplainedValue& value) { values.push_back(value); });
@@ -174,7 +175,7 @@ TEST(CatalogueTest, HasEveryFieldThatConditionsChooseBetween) {
 }
 
 constexpr ListReading kNotedLists[] = {{.table = kLists[0].table, .use = RowsUse::Noted}};
-constexpr PacketReading kNotedReading = {0x1234, "test packet", 16, {}, kNotedLists};
+constexpr PacketReading kNotedReading = {kTestPacket, {}, kNotedLists};
 
 TEST(CatalogueTest, ListsRowsThatAreOnlyNotedAsKept) {
   const CatalogueEntry entry = catalogueReading(kSection, kNotedReading);
@@ -184,7 +185,7 @@ TEST(CatalogueTest, ListsRowsThatAreOnlyNotedAsKept) {
 }
 
 constexpr ListReading kDroppedLists[] = {{.table = kLists[0].table, .use = RowsUse::Dropped}};
-constexpr PacketReading kDroppedReading = {0x1234, "test packet", 16, {}, kDroppedLists};
+constexpr PacketReading kDroppedReading = {kTestPacket, {}, kDroppedLists};
 
 TEST(CatalogueTest, ListsNoKeysOfRowsThatAreDropped) {
   EXPECT_THAT(catalogueReading(kSection, kDroppedReading).keys, IsEmpty());
@@ -192,7 +193,7 @@ TEST(CatalogueTest, ListsNoKeysOfRowsThatAreDropped) {
 
 constexpr ListReading kPlainLists[] = {
     {.table = kLists[0].table, .key = "Frequencies", .isPlain = true}};
-constexpr PacketReading kPlainReading = {0x1234, "test packet", 16, {}, kPlainLists};
+constexpr PacketReading kPlainReading = {kTestPacket, {}, kPlainLists};
 
 TEST(CatalogueTest, PlainTextsHaveAListAndNoKeys) {
   const CatalogueEntry entry = catalogueReading(kSection, kPlainReading);
@@ -201,9 +202,11 @@ TEST(CatalogueTest, PlainTextsHaveAListAndNoKeys) {
 }
 
 constexpr Field kShorterFields[] = {{"Area", u8(14), decimal()}};
+constexpr PacketKind kShortPacket = {0x1234, "short test packet", 0};
+constexpr PacketKind kOtherPacket = {0x1235, "other", 0};
 constexpr PacketReading kTwoReadings[] = {
-    kReadings[0], {0x1234, "short test packet", 0, kShorterFields}, {0x1235, "other", 0, kChoice}};
-constexpr Section kShortSection = {"Test", "Test", SectionKind::Dictionary, kTwoReadings, kCodes};
+    kReadings[0], {kShortPacket, kShorterFields}, {kOtherPacket, kChoice}};
+constexpr Section kShortSection = {.name = "Test", .readings = kTwoReadings};
 
 TEST(CatalogueTest, ListsWhatAShorterPacketWrites) {
   const CatalogueEntry entry = catalogueReading(kShortSection, kTwoReadings[0]);
@@ -212,6 +215,22 @@ TEST(CatalogueTest, ListsWhatAShorterPacketWrites) {
   ASSERT_EQ(entry.shorterKeys.size(), 1U);
   EXPECT_EQ(entry.shorterKeys[0].key, "Area");
   EXPECT_THAT(entry.shorterKeys[0].fields, ElementsAre(&kShorterFields[0]));
+}
+
+TEST(CatalogueTest, APacketOfWhichNothingIsTakenHasNoName) {
+  const PacketReading reading = {.packet = kTestPacket};
+  const CatalogueEntry entry = catalogueReading(kSection, reading);
+  EXPECT_EQ(entry.code, 0x1234U);
+  EXPECT_EQ(entry.packetName, "");
+  EXPECT_EQ(entry.minimumLength, 0U);
+}
+
+TEST(SectionTest, WantsEachCodeOnceAndThatOfItsPropertyListLast) {
+  const PacketKind packet = {.code = 0xFF0001};
+  const PropertyListReading list = {.packet = packet, .part = ListedPart::Root};
+  EXPECT_THAT(codesOf(kShortSection), ElementsAre(0x1234, 0x1235));
+  EXPECT_THAT(codesOf({.name = "Test", .readings = kTwoReadings, .propertyList = &list}),
+              ElementsAre(0x1234, 0x1235, 0xFF0001));
 }
 
 }  // namespace
