@@ -65,8 +65,8 @@ class PacketWriter {
   /// Sets how many records a table has. Do it for all tables of a packet before writing records:
   /// their places depend on the counts.
   void setCount(const RecordTable& table, std::size_t count);
-  /// The fields of record `index`, which must be below the count. Of a spoilt packet, whose count
-  /// may not have been set, any.
+  /// The fields of record `index`, which must be below the count. In a spoilt packet, whose count
+  /// may be missing, any index will do.
   [[nodiscard]] Fields record(const RecordTable& table, std::size_t index);
 
   /// Writes a value that no layout names.

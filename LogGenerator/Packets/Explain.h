@@ -38,8 +38,8 @@ struct ExplainedValue {
   std::optional<std::size_t> row{};  ///< the record's number
   std::string_view key;
   std::vector<ExplainedSource> sources{};
-  /// What is shown; null when the value is not shown. Of a list's count that is not stored as it
-  /// is: the number of records.
+  /// What is shown; null when the value is not shown. For a list's count that is stored in another
+  /// form (one less): the number of records.
   Value text{};
 };
 
