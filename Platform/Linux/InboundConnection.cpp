@@ -71,6 +71,7 @@ void InboundConnection::serve() {
 }
 
 void InboundConnection::arrangeNextTurn() {
+  settle();
   const bool backlog = queue().size() > kReplyBacklog;  // `onDrained` goes on
   const bool unserved = !backlog && reader().hasNext();
   if (unserved) readNextTurn();

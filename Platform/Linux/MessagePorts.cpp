@@ -20,7 +20,8 @@ class UnixMessagePorts final : public MessagePorts {
  public:
   UnixMessagePorts(SystemLog& log, const UnixMessagePortsOptions& options)
       : _directory(portDirectoryPath(options.portDirectory)),
-        _context(std::make_shared<PortContext>(log, options.peerUser.value_or(::geteuid()))) {}
+        _context(std::make_shared<PortContext>(log, options.peerUser.value_or(::geteuid()),
+                                               options.patience)) {}
 
   [[nodiscard]] std::shared_ptr<LocalPort> createLocalPort(std::string_view name,
                                                            ReceiveHandler handler) override;

@@ -4,11 +4,13 @@
 
 #include <sys/types.h>
 
+#include <chrono>
 #include <memory>
 #include <optional>
 #include <string>
 #include <utility>
 
+#include "Platform/Linux/UnfinishedFrames.h"
 #include "Platform/MessagePort.h"
 #include "Platform/SystemLog.h"
 
@@ -19,7 +21,9 @@ struct UnixMessagePortsOptions {
   /// $XDG_RUNTIME_DIR/kestro, else /tmp/kestro-<uid>.
   std::optional<std::string> portDirectory;
   /// The one user whose processes may be peers; without a value the process's effective user.
-  std::optional<uid_t> peerUser;
+  std::optional<uid_t> peerUser = std::nullopt;
+  /// How long a frame that has not ended may wait for its next byte.
+  std::chrono::milliseconds patience = UnfinishedFrames::kPatience;
 };
 
 /// Ports of this process. They belong to the calling thread, which must run Qt's event loop; ports
@@ -29,8 +33,8 @@ struct UnixMessagePortsOptions {
 
 [[nodiscard]] inline std::unique_ptr<MessagePorts> createUnixMessagePorts(
     SystemLog& log, std::optional<std::string> portDirectory) {
-  return createUnixMessagePorts(
-      log, UnixMessagePortsOptions{.portDirectory = std::move(portDirectory), .peerUser = {}});
+  return createUnixMessagePorts(log,
+                                UnixMessagePortsOptions{.portDirectory = std::move(portDirectory)});
 }
 
 }  // namespace kestro

@@ -35,7 +35,10 @@ PortConnection::PortConnection(FileDescriptor socket, PortDirection direction, s
   });
 }
 
-PortConnection::~PortConnection() { _context->queuedBytes -= _countedBytes; }
+PortConnection::~PortConnection() {
+  _context->queuedBytes -= _countedBytes;
+  if (_isUnfinished) _context->unfinished.count(*this, 0);
+}
 
 void PortConnection::countQueue() {
   _context->queuedBytes += _queue.size() - _countedBytes;
@@ -82,6 +85,7 @@ void PortConnection::close() {
   _socket.reset();
   _queue = PortSendQueue();
   countQueue();
+  countUnfinished();
   onClosed();
 }
 
@@ -100,7 +104,24 @@ PortFrameReader::FillStatus PortConnection::fill() {
   if (status == PortFrameReader::FillStatus::End && _reader.unreadBytes() != 0) {
     abandon(fmt::format("the stream ends within a frame, {} bytes dropped", _reader.unreadBytes()));
   }
+  countUnfinished();
   return status;
+}
+
+void PortConnection::settle() {
+  _reader.giveBackMemory();
+  countUnfinished();
+}
+
+void PortConnection::countUnfinished() {
+  const std::size_t bytes = isOpen() && !_reader.hasNext() ? _reader.unreadBytes() : 0;
+  if (bytes == 0 && !_isUnfinished) return;
+  _isUnfinished = bytes != 0;
+  context().unfinished.count(*this, bytes);
+}
+
+bool PortConnection::hasUnreadBytes() const {
+  return (waitFor(POLLIN, portDeadline(std::chrono::nanoseconds(0))) & POLLIN) != 0;
 }
 
 std::optional<PortFrame> PortConnection::nextFrame() {

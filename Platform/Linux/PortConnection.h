@@ -14,17 +14,20 @@
 #include "Platform/Linux/PortFrame.h"
 #include "Platform/Linux/PortFrameReader.h"
 #include "Platform/Linux/PortSendQueue.h"
+#include "Platform/Linux/UnfinishedFrames.h"
 #include "Platform/SystemLog.h"
 
 namespace kestro {
 
 /// What the ports of one MessagePorts share; the ports keep it alive.
 struct PortContext {
-  PortContext(SystemLog& systemLog, uid_t user) : log(systemLog), peerUser(user) {}
+  PortContext(SystemLog& systemLog, uid_t user, std::chrono::milliseconds patience)
+      : log(systemLog), peerUser(user), unfinished(patience) {}
 
   SystemLog& log;
   uid_t peerUser;  ///< the one user whose processes may be peers
   PortFlusher flusher;
+  UnfinishedFrames unfinished;
   std::size_t queuedBytes = 0;  ///< what waits to be sent, on all connections together
 };
 
@@ -60,6 +63,12 @@ class PortConnection : public std::enable_shared_from_this<PortConnection> {
   /// Hands over what the system takes at once of what is queued, then closes the socket. Later
   /// calls do nothing.
   void close();
+
+  /// Closes at once, with a log line that says why.
+  void abandon(std::string_view reason);
+
+  /// Whether bytes that have arrived wait to be read from the socket.
+  [[nodiscard]] bool hasUnreadBytes() const;
 
  protected:
   /// `direction`: which way the frames travel that arrive here. `portName` is for log lines.
@@ -103,21 +112,25 @@ class PortConnection : public std::enable_shared_from_this<PortConnection> {
   /// Calls `onReadable` once in the event loop's next turn, whether anything is new or not.
   void readNextTurn();
 
+  /// Gives back the memory of frames that were taken and counts what is left. For those who have
+  /// taken frames, when no body is of use any more. May close the connection.
+  void settle();
+
   /// Writes a log line about this connection.
   void note(std::string_view what);
-
-  /// Closes at once, with a log line that says why.
-  void abandon(std::string_view reason);
 
  private:
   /// Queues are written out when they reach this size even before the turn ends.
   static constexpr std::size_t kFlushSize = std::size_t{64} * 1024;
+
+  void countUnfinished();
 
   FileDescriptor _socket;
   std::string _portName;
   std::shared_ptr<PortContext> _context;
   PortFrameReader _reader;
   PortSendQueue _queue;
+  bool _isUnfinished = false;     ///< whether the context counts bytes of an unfinished frame
   std::size_t _countedBytes = 0;  ///< this queue's part of what waits on all connections
   std::unique_ptr<QSocketNotifier> _readNotifier;
   std::unique_ptr<QSocketNotifier> _writeNotifier;  ///< enabled while the system takes no more

@@ -51,7 +51,27 @@ void PortFrameReader::makeRoom() {
     _end = unreadBytes();
     _begin = 0;
   }
-  if (_end == _capacity) moveTo(_capacity * 2);
+  if (_end == _capacity) moveTo(nextCapacity());
+}
+
+/// Twice as much, but no more than the frame that is arriving takes.
+std::size_t PortFrameReader::nextCapacity() const {
+  const auto header = decodePortFrameHeader(unread(), _direction);
+  const std::size_t frame = header ? PortFrameHeader::kSize + header->length : 0;
+  return frame > _capacity ? std::min(frame, _capacity * 2) : _capacity * 2;
+}
+
+void PortFrameReader::giveBackMemory() {
+  if (unreadBytes() == 0) {
+    clear();
+  } else if (_capacity > kReadSize && unreadBytes() <= kReadSize) {
+    moveTo(kReadSize);
+  }
+}
+
+void PortFrameReader::clear() {
+  _buffer.reset();
+  _capacity = _begin = _end = 0;
 }
 
 void PortFrameReader::moveTo(std::size_t capacity) {

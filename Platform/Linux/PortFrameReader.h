@@ -13,7 +13,8 @@
 
 namespace kestro {
 
-/// A frame in a reader's buffer: the body is valid until the reader's next `fill`.
+/// A frame in a reader's buffer: the body is valid until the reader's next `fill` or
+/// `giveBackMemory`.
 struct PortFrame {
   PortFrameHeader header;
   ByteView body;
@@ -39,6 +40,12 @@ class PortFrameReader {
   /// after which the stream is of no more use.
   [[nodiscard]] Result<std::optional<PortFrame>> next();
 
+  /// Keeps no more of the buffer than what is unread needs: nothing of it when all was taken.
+  void giveBackMemory();
+
+  /// Forgets what is unread, too.
+  void clear();
+
   /// Whether `next` would yield something, be it an error.
   [[nodiscard]] bool hasNext() const;
 
@@ -51,6 +58,7 @@ class PortFrameReader {
  private:
   [[nodiscard]] ByteView unread() const noexcept { return {_buffer.get() + _begin, unreadBytes()}; }
   void makeRoom();
+  [[nodiscard]] std::size_t nextCapacity() const;
   void moveTo(std::size_t capacity);
 
   PortDirection _direction;

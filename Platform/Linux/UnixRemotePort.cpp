@@ -91,8 +91,12 @@ SendError UnixRemotePort::transmit(const PortFrameHeader& header, ByteView messa
 RemotePort::Reply UnixRemotePort::awaitReply(std::uint32_t sequence, PortDeadline deadline) {
   for (bool isLastRead = false;;) {
     if (const auto reply = findReply(sequence)) {
-      if (reply->header.kind == PortFrameKind::ReplyWithoutData) return {};
-      return {SendError::None, Bytes(reply->body.begin(), reply->body.end())};
+      Reply result;
+      if (reply->header.kind == PortFrameKind::Reply) {
+        result.data.emplace(reply->body.begin(), reply->body.end());
+      }
+      settle();
+      return result;
     }
     if (!isOpen()) return {SendError::Transport, {}};
     if (isLastRead || waitFor(POLLIN, deadline) == 0) return {SendError::ReceiveTimeout, {}};
@@ -118,7 +122,8 @@ void UnixRemotePort::onReadable() {
   static_cast<void>(findReply(kNobodys));
   const bool open = readOnce();
   static_cast<void>(findReply(kNobodys));
-  if (!open) close();
+  if (!open) return close();
+  settle();
 }
 
 }  // namespace kestro

@@ -31,6 +31,7 @@ class UnixRemotePort final : public RemotePort, public PortConnection {
 
  private:
   void onReadable() override;
+  void onClosed() override { reader().clear(); }
   /// The most that may wait now.
   [[nodiscard]] std::size_t mostQueuedBytes() const;
   [[nodiscard]] SendError transmit(const PortFrameHeader& header, ByteView message,

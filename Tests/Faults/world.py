@@ -17,17 +17,29 @@ from recordings import Recording, feed_stream, write_source
 
 
 class Process:
-    """A program that runs. `limits` are those of its descriptors, soft and hard; a `pipe` takes
-    what it writes, and `fed` gives it an input of its own."""
+    """A program that runs. `limits` are those of its descriptors, soft and hard, `address_space`
+    that of its memory in bytes; a `pipe` takes what it writes, and `fed` gives it an input of its
+    own."""
 
     def __init__(
-        self, name, command, environment, folder, *, limits=None, pipe=False, fed=False
+        self,
+        name,
+        command,
+        environment,
+        folder,
+        *,
+        limits=None,
+        address_space=None,
+        pipe=False,
+        fed=False,
     ):
         self.name = name
         self._output = folder / f"{name}.out"
         self._errors = folder / f"{name}.err"
         if limits is not None:
             command = ["prlimit", "--nofile={}:{}".format(*limits), *command]
+        if address_space is not None:
+            command = ["prlimit", f"--as={address_space}", *command]
         with open(self._output, "wb") as output, open(self._errors, "wb") as errors:
             self._process = subprocess.Popen(
                 command,
@@ -77,6 +89,11 @@ class Process:
         status = pathlib.Path(f"/proc/{self._process.pid}/status").read_text()
         return 1024 * int(status.split("RssAnon:")[1].split()[0])
 
+    def most_resident(self):
+        """The most bytes that were resident at once, what is shared included."""
+        status = pathlib.Path(f"/proc/{self._process.pid}/status").read_text()
+        return 1024 * int(status.split("VmHWM:")[1].split()[0])
+
     def descriptors(self):
         return len(os.listdir(f"/proc/{self._process.pid}/fd"))
 
@@ -96,11 +113,11 @@ class Process:
 class Recorder(Process):
     """`kestro-cli record`, to a file or (`pipe`) to a pipe."""
 
-    def __init__(self, world, name, path=None, pipe=False):
+    def __init__(self, world, name, path=None, pipe=False, **options):
         self.path = path or world.folder / f"{name}.pcap"
         command = [world.program("kestro-cli"), "record", "--output"]
         command += ["/dev/stdout" if pipe else str(self.path)]
-        super().__init__(name, command, world.environment, world.folder, pipe=pipe)
+        super().__init__(name, command, world.environment, world.folder, pipe=pipe, **options)
         self.recording = Recording(name)
         self._file = None
         if pipe:

@@ -29,6 +29,8 @@ namespace kestro::testing {
 
 using namespace std::chrono_literals;
 
+inline constexpr std::size_t kMebibyte = std::size_t{1024} * 1024;
+
 inline Bytes bytesOf(std::string_view text) { return {text.begin(), text.end()}; }
 inline std::string textOf(ByteView bytes) { return {bytes.begin(), bytes.end()}; }
 

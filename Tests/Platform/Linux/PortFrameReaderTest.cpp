@@ -112,6 +112,34 @@ TEST_F(PortFrameReaderTest, ALongFrameArrivesWholeAndItsMemoryIsGivenBack) {
   EXPECT_EQ(reader.capacity(), PortFrameReader::kReadSize);
 }
 
+TEST_F(PortFrameReaderTest, TheBufferOfALongFrameIsNoLongerThanTheFrame) {
+  const Bytes whole = frame(1, 0, 0, std::string(3 * 1024 * 1024 + 1, 'x'));
+  pass(Bytes(whole.begin(), whole.end() - 1));
+  EXPECT_EQ(reader.capacity(), whole.size());
+  pass({whole.back()});
+  EXPECT_TRUE(nextBody());
+}
+
+TEST_F(PortFrameReaderTest, NothingUnreadTakesNoMemory) {
+  pass(frame(1, 0, 0, "short"));
+  EXPECT_EQ(nextBody(), "short");
+  reader.giveBackMemory();
+  EXPECT_EQ(reader.capacity(), 0U);
+  pass(frame(1, 0, 0, "next"));
+  EXPECT_EQ(nextBody(), "next");
+}
+
+TEST_F(PortFrameReaderTest, ABeginningAfterALongFrameTakesLittleMemory) {
+  const Bytes next = frame(1, 0, 0, "next");
+  pass(joined(
+      {frame(1, 0, 0, std::string(3 * 1024 * 1024, 'x')), Bytes(next.begin(), next.end() - 1)}));
+  EXPECT_TRUE(nextBody());
+  reader.giveBackMemory();
+  EXPECT_EQ(reader.capacity(), PortFrameReader::kReadSize);
+  pass({next.back()});
+  EXPECT_EQ(nextBody(), "next");
+}
+
 TEST_F(PortFrameReaderTest, OneReadTakesABoundedAmount) {
   const Bytes whole = frame(1, 0, 0, std::string(2 * 1024 * 1024, 'x'));
   std::thread sending([&] { peer->send(whole); });

@@ -6,6 +6,7 @@
 
 #include <algorithm>
 #include <csignal>
+#include <fstream>
 
 #include "Tests/Platform/Linux/PortFixture.h"
 
@@ -522,6 +523,126 @@ TEST_F(UnixLocalPortTest, APeerThatReadsNoRepliesIsReadNoFurther) {
     return received == 100 * (16 + 512 * 1024);
   }));
   EXPECT_EQ(messages.size(), 100U);
+}
+
+TEST_F(UnixLocalPortTest, UnfinishedFramesShare64MiBAndTheLargestIsClosedBeyond) {
+  const auto port = openPort("A");
+  std::vector<RawPeer> peers;
+  // Bytes of one frame; all but its last arrive.
+  const auto leaveUnfinished = [&](std::size_t size) {
+    Bytes bytes = frame(kMessage, 0, 0, std::string(size - 16, 'x'));
+    bytes.pop_back();
+    peers.push_back(connectRaw("A"));
+    std::atomic<bool> isSent = false;
+    std::thread sending([&] {
+      peers.back().send(bytes);
+      isSent = true;
+    });
+    EXPECT_TRUE(turnUntil([&] { return isSent.load(); }));
+    sending.join();
+    turnUntilIdle();
+  };
+  leaveUnfinished(15 * kMebibyte);
+  leaveUnfinished(16 * kMebibyte);
+  leaveUnfinished(15 * kMebibyte);
+  leaveUnfinished(15 * kMebibyte);
+  leaveUnfinished(3 * kMebibyte + 4);  // 64 MiB, less one byte
+  EXPECT_THAT(log.lines(), IsEmpty());
+  peers.push_back(connectRaw("A"));
+  peers.back().send({1, 0});
+  ASSERT_TRUE(turnUntil([&] { return !log.lines().empty(); }));
+  EXPECT_THAT(
+      logTexts(),
+      ElementsAre("Message port \"A\": closing a connection: 16777215 bytes of a frame that "
+                  "has not ended wait here, and 67108865 on all connections, at most "
+                  "67108864 may"));
+  EXPECT_TRUE(peers[1].isAtEnd());
+  for (const std::size_t other : {0, 2, 3, 4}) peers[other].send({'x'});
+  EXPECT_TRUE(turnUntilMessages(4));
+  EXPECT_EQ(log.lines().size(), 1U);
+}
+
+/// The bytes of this process that are resident and its own.
+std::size_t residentBytes() {
+  std::ifstream statistics("/proc/self/statm");
+  std::size_t size = 0;
+  std::size_t resident = 0;
+  std::size_t shared = 0;
+  statistics >> size >> resident >> shared;
+  return (resident - shared) * static_cast<std::size_t>(::getpagesize());
+}
+
+TEST_F(UnixLocalPortTest, AConnectionKeepsNoMemoryOfALongMessage) {
+#ifdef __SANITIZE_ADDRESS__
+  GTEST_SKIP() << "the sanitizers keep what is freed";
+#endif
+  std::size_t count = 0;
+  const auto port = ports->createLocalPort("A", [&](std::int32_t, ByteView) {
+    ++count;
+    return std::optional<Bytes>();
+  });
+  const Bytes bytes = frame(kMessage, 0, 0, std::string(15 * kMebibyte, 'x'));
+  const std::size_t before = residentBytes();
+  std::vector<RawPeer> peers;
+  for (std::size_t i = 1; i <= 20; ++i) {
+    peers.push_back(connectRaw("A"));
+    std::thread sending([&] { peers.back().send(bytes); });
+    EXPECT_TRUE(turnUntil([&] { return count == i; }));
+    sending.join();
+    turnUntilIdle();
+  }
+  EXPECT_LT(residentBytes(), before + 64 * kMebibyte);
+  EXPECT_THAT(log.lines(), IsEmpty());
+}
+
+/// Ports whose peers may leave a frame as it is for half a second.
+class ImpatientPortTest : public UnixLocalPortTest {
+ protected:
+  ImpatientPortTest() {
+    ports = createUnixMessagePorts(
+        log,
+        UnixMessagePortsOptions{.portDirectory = directory.path().string(), .patience = 500ms});
+  }
+};
+
+TEST_F(ImpatientPortTest, AFrameThatDoesNotGoOnClosesItsConnection) {
+  const auto port = openPort("A");
+  RawPeer stalled = connectRaw("A");
+  RawPeer slow = connectRaw("A");
+  RawPeer idle = connectRaw("A");
+  idle.send(frame(kMessage, 0, 0, "idle"));
+  stalled.send({1, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 0, 9, 0, 0, 0, 'x'});
+  const Bytes whole = frame(kMessage, 0, 0, "slow");
+  const auto begin = std::chrono::steady_clock::now();
+  for (const std::uint8_t byte : whole) {  // 20 bytes, 100 ms apart
+    slow.send({byte});
+    const auto next = std::chrono::steady_clock::now() + 100ms;
+    EXPECT_TRUE(turnUntil([&] { return std::chrono::steady_clock::now() >= next; }));
+    const bool isEarly = std::chrono::steady_clock::now() - begin < 400ms;
+    EXPECT_TRUE(!isEarly || log.lines().empty());
+  }
+  EXPECT_THAT(messages, ElementsAre(Message{0, "idle"}, Message{0, "slow"}));
+  EXPECT_TRUE(stalled.isAtEnd());
+  EXPECT_FALSE(idle.isAtEnd());
+  EXPECT_THAT(logTexts(),
+              ElementsAre("Message port \"A\": closing a connection: nothing of a frame that has "
+                          "not ended came for 0.5 s"));
+}
+
+TEST_F(ImpatientPortTest, WhatArrivedWhileThisProcessStoodStillIsServed) {
+  const auto port = openPort("A");
+  RawPeer peer = connectRaw("A");
+  const Bytes whole = frame(kMessage, 0, 0, "body");
+  peer.send(Bytes(whole.begin(), whole.end() - 1));
+  turnUntilIdle();
+  peer.send({whole.back()});
+  std::this_thread::sleep_for(700ms);
+  EXPECT_TRUE(turnUntilMessages(1));
+  EXPECT_THAT(log.lines(), IsEmpty());
+}
+
+TEST(UnfinishedFrames, MayWaitTenSecondsForTheirNextByte) {
+  EXPECT_EQ(UnixMessagePortsOptions().patience, 10s);
 }
 
 TEST_F(UnixLocalPortTest, WithoutDescriptorsItWaitsAndThenAccepts) {

@@ -15,8 +15,6 @@ using ::testing::ElementsAre;
 using ::testing::HasSubstr;
 using ::testing::IsEmpty;
 
-constexpr std::size_t kMebibyte = std::size_t{1024} * 1024;
-
 class UnixRemotePortTest : public PortFixture {
  protected:
   /// Makes "Peer", connects a remote port to it and takes the other end.
@@ -280,6 +278,29 @@ TEST_F(UnixRemotePortTest, AFloodOfRepliesDoesNotHoldUpASendThatIsNotTaken) {
   EXPECT_GE(elapsed, 200ms);
   EXPECT_LT(elapsed, 1s);
   remote->invalidate();
+}
+
+TEST_F(UnixRemotePortTest, UnfinishedRepliesShare64MiBAndTheLargestIsClosedBeyond) {
+  Bytes begun = frame(3, 0, 1, std::string(13 * kMebibyte, 'x'));
+  begun.pop_back();
+  const Bytes longer = joined({frame(3, 0, 1, std::string(14 * kMebibyte, 'x'))});
+  listener.emplace(pathOf("Peer"));
+  std::vector<std::shared_ptr<RemotePort>> remotes;
+  std::vector<RawPeer> peers;
+  for (int i = 0; i < 5; ++i) {
+    remotes.push_back(ports->createRemotePort("Peer"));
+    peers.push_back(listener->accept());
+    std::atomic<bool> isSent = false;
+    std::thread sending([&] {
+      peers.back().send(i == 2 ? Bytes(longer.begin(), longer.end() - 1) : begun);
+      isSent = true;
+    });
+    EXPECT_TRUE(turnUntil([&] { return isSent.load(); }));
+    sending.join();
+    turnUntilIdle();
+  }
+  EXPECT_THAT(logTexts(), ElementsAre(HasSubstr("14680079 bytes of a frame that has not ended")));
+  for (std::size_t i = 0; i < remotes.size(); ++i) EXPECT_EQ(remotes[i]->isValid(), i != 2) << i;
 }
 
 TEST_F(UnixRemotePortTest, AReplyThatIsThereWhenTheTimeIsOverIsTaken) {
