@@ -11,6 +11,7 @@
 #include "Platform/Bundle.h"
 #include "Platform/Clock.h"
 #include "Platform/DeviceRoot.h"
+#include "Platform/MainQueue.h"
 #include "Platform/Preferences.h"
 
 namespace kestro {
@@ -55,11 +56,9 @@ void KestroApp::applicationDidFinishLaunching(Platform& platform, const LaunchOp
   _systemColours = std::make_unique<SystemColours>();
   createWindow(options.windowSize);
   _model = KestroModel::create(platform, [this] { updateViewControllerFromModel(); });
-  _wasConnected = false;
+  _model->setConnectionHandler([this](bool) { connectionChanged(); });
   _updateMessage = connecting();
   showRootPane();
-  _connectionTimer = platform.mainQueue().scheduleRepeating(kConnectionCheckInterval,
-                                                            [this] { checkConnection(); });
   if (options.connectsAtLaunch) connectAfterFirstFrame();
 }
 
@@ -118,7 +117,6 @@ void KestroApp::applicationWillTerminate() {
   if (!_platform) return;
   if (std::exchange(_unsetRSSI, false)) _setGSMRSSI(false);
   _updateMessage.clear();
-  _connectionTimer.reset();
   _saveViewController = nullptr;
   _navController = nullptr;
   _window->hide();
@@ -189,9 +187,8 @@ void KestroApp::reloadPanes() {
   }
 }
 
-void KestroApp::checkConnection() {
-  const bool isConnected = _model->isConnected();
-  if (std::exchange(_wasConnected, isConnected) == isConnected) return;
+void KestroApp::connectionChanged() {
+  if (!_model) return;  // after the exit, by a retry that was queued before
   updateStatusForViewController(paneAt(_navController->viewControllers().size() - 1));
 }
 

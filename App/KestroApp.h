@@ -18,7 +18,6 @@
 #include "App/Toolkit/NavigationController.h"
 #include "App/Toolkit/SystemColours.h"
 #include "Model/KestroModel.h"
-#include "Platform/MainQueue.h"
 #include "Platform/Platform.h"
 
 namespace kestro {
@@ -29,8 +28,6 @@ inline constexpr std::string_view kSaveButtonPath =
 /// The preference for the signal strength as a number.
 inline constexpr std::string_view kShowGSMRssi = "LumoShowGSMRSSI";
 
-/// How often it is looked whether the model is still connected: no new data tells so.
-inline constexpr std::chrono::milliseconds kConnectionCheckInterval{500};
 /// How long connecting waits, at most, for the window's first frame.
 inline constexpr std::chrono::seconds kFirstFramePatience{1};
 
@@ -113,7 +110,7 @@ class KestroApp : public QApplication, private PaneHost {
   void showRootPane();
   void connectAfterFirstFrame();
   void reloadPanes();
-  void checkConnection();
+  void connectionChanged();
   void showFileError();
   [[nodiscard]] KestroPaneController& paneAt(std::size_t index) const;
 
@@ -128,8 +125,6 @@ class KestroApp : public QApplication, private PaneHost {
 
   std::unique_ptr<SystemColours> _systemColours;
   QPointer<AlertView> _alert;
-  std::unique_ptr<Timer> _connectionTimer;
-  bool _wasConnected = false;
   bool _isPlain = false;
 };
 

@@ -1,22 +1,11 @@
 // SPDX-License-Identifier: MIT
 #include "Model/KestroModel.h"
 
-#include <fmt/format.h>
-
 #include <utility>
 
-#include "Platform/PropertyListCoding.h"
 #include "Platform/SystemLog.h"
-#include "Platform/TelephonyProtocol.h"
-#include "Platform/TelephonyService.h"
-#include "Platform/Uuids.h"
 
 namespace kestro {
-namespace {
-
-constexpr std::int32_t kMessageId = messageId(TelephonyMessage::Channel);
-
-}  // namespace
 
 std::shared_ptr<KestroModel> KestroModel::create(
     Platform& platform, std::function<void()> updateViewControllerFromModel,
@@ -29,114 +18,34 @@ KestroModel::KestroModel(Platform& platform, std::function<void()> updateViewCon
                          GeneratorFactory generatorFromTechnology)
     : _platform(platform),
       _updateViewControllerFromModel(std::move(updateViewControllerFromModel)),
-      _generatorFromTechnology(std::move(generatorFromTechnology)) {}
+      _generatorFromTechnology(std::move(generatorFromTechnology)),
+      _client(platform, *this, ChannelWatch::ByUser) {}
 
 KestroModel::~KestroModel() {
-  _platform.telephonyService().cancelNotifications();
+  _connectionChanged = {};
   destroyPorts();
 }
 
-bool KestroModel::isConnected() const noexcept { return _recvPort && _sendPort; }
-
-// --- Ports ---------------------------------------------------------------------------------------
-
-bool KestroModel::createPorts() {
-  const auto uuid = _platform.uuids().create();
-  if (!uuid) return false;
-  const std::string name = fmt::format("KestroApp.{}", *uuid);
-  createLocalPort(name);
-  if (!createRemotePort(name)) return false;
-  _platform.systemLog().log(LogPriority::Error, " ***** Created ports (send={}, recv={})",
-                            addressText(_sendPort.get()), addressText(_recvPort.get()));
-  return isConnected();
+void KestroModel::setConnectionHandler(std::function<void(bool isConnected)> connectionChanged) {
+  _connectionChanged = std::move(connectionChanged);
 }
 
-void KestroModel::createLocalPort(std::string_view name) {
-  _recvPort = _platform.messagePorts().createLocalPort(
-      name, [this](std::int32_t messageId, ByteView message) -> std::optional<Bytes> {
-        if (messageId == kMessageId) updateWithData(message);
-        return std::nullopt;
-      });
-  // Without a port the request for a channel goes out all the same, and fails or is torn down.
-  if (!_recvPort) return;
-  _recvPort->setInvalidationHandler(
-      [this, port = _recvPort.get()] { receivePortInvalidated(port); });
-}
+// --- Connection ----------------------------------------------------------------------------------
 
-bool KestroModel::createRemotePort(std::string_view localPortName) {
-  TelephonyService& telephony = _platform.telephonyService();
-  const auto connection = telephony._TqServerConnectionCreate([this] { refresh(); });
-  if (!connection) {
-    logError("Could not create TqServerConnection");
-    return false;
-  }
-  const LogChannelReply channel =
-      telephony._TqServerConnectionNetworkMonitorCreateLogChannel(*connection, localPortName);
-  if (channel.error != 0) {
-    _platform.systemLog().log(
-        LogPriority::Error, "_TqServerConnectionNetworkMonitorCreateLogChannel returns error: {}!",
-        channel.error);
-    return false;
-  }
-  if (!channel.portName || channel.portName->empty()) {
-    logError("Could not create a log channel (Tq returned null port)!");
-    return false;
-  }
-  _sendPort = _platform.messagePorts().createRemotePort(*channel.portName);
-  if (!_sendPort) logError("Could not create the remote port!");
-  return _sendPort != nullptr;
-}
+bool KestroModel::isConnected() const noexcept { return _client.isConnected(); }
 
-void KestroModel::receivePortInvalidated(const LocalPort* port) {
-  _platform.systemLog().log(LogPriority::Error, " ***** INVALIDATED {} *****", addressText(port));
-  restartMonitor();
-}
+bool KestroModel::createPorts() { return _client.openPorts(); }
 
-void KestroModel::destroyPorts() {
-  if (const auto timer = std::exchange(_displayUpdateTimer, nullptr)) timer->invalidate();
-  if (const auto port = std::exchange(_recvPort, nullptr)) {
-    port->setInvalidationHandler({});  // closing the port is no reason to restart
-    port->invalidate();
-  }
-  if (const auto port = std::exchange(_sendPort, nullptr)) port->invalidate();
-}
+void KestroModel::destroyPorts() { _client.close(); }
 
-// --- Connect cycle -------------------------------------------------------------------------------
+void KestroModel::configureGenerator() { _client.requestTechnology(); }
 
-void KestroModel::configureGenerator() {
-  const Dictionary command{{kTelephonyGetTechnology, kTelephonyGetTechnology}};
-  const auto request = _platform.propertyListCoding().xml(command);
-  if (!request) {
-    logError(" Could not generate GetTechnology command; cannot configure");
-    return;
-  }
-  const RemotePort::Reply reply =
-      _sendPort->request(kMessageId, *request, kCommandTimeout, kCommandTimeout);
-  if (reply.error != SendError::None) {
-    _platform.systemLog().log(LogPriority::Error,
-                              " ***** Could not send the GetTechnology command (got error={})",
-                              static_cast<int>(reply.error));
-    return;
-  }
-  if (!reply.data) {
-    logError(" ***** No response to GetTechnology; cannot configure");
-    return;
-  }
-  setGeneratorFromReply(*reply.data);
-}
+void KestroModel::startMonitor() { _client.start(); }
 
-void KestroModel::setGeneratorFromReply(ByteView reply) {
-  const Result<Value> parsed = _platform.propertyListCoding().parse(reply);
-  if (!parsed) {
-    logError(" ***** Could not parse reply to GetTechnology; cannot configure");
-    return;
-  }
-  const Value technology = parsed->dictionary()[kTelephonyGetTechnology];
-  if (technology.isNull()) {
-    logError(" ***** Reply to GetTechnology had no answer; cannot configure");
-    return;
-  }
-  setGenerator(technology.text());
+void KestroModel::restartMonitor() { _client.restart(); }
+
+void KestroModel::technologyAnswered(std::string_view technology) {
+  setGenerator(technology);
   _platform.systemLog().log(LogPriority::Error, "Got log generated: {}",
                             addressText(_logGenerator.get()));
 }
@@ -153,54 +62,36 @@ void KestroModel::setGenerator(std::string_view technology) {
   _stateKeysOfTechnology.assign(keys.begin(), keys.end());
 }
 
-void KestroModel::startMonitor() {
-  if (_displayUpdateTimer || tryStartMonitor()) return;
-  destroyPorts();
-  _platform.mainQueue().postAfter(kRetryDelay,
-                                  [model = shared_from_this()] { model->startMonitor(); });
+std::optional<Dictionary> KestroModel::startCommand() {
+  if (_logGenerator) return _logGenerator->getStartCommand();
+  logError("No log generator technology works");
+  return std::nullopt;
 }
 
-bool KestroModel::tryStartMonitor() {
-  if (!createPorts()) {
-    logError("Could not create the ports necessary");
-    return false;
-  }
-  configureGenerator();
-  if (!_logGenerator) {
-    logError("No log generator technology works");
-    return false;
-  }
-  const auto command = _platform.propertyListCoding().xml(_logGenerator->getStartCommand());
-  if (!command) {
-    logError(" Could not generate PLIST");
-    return false;
-  }
-  const SendError error = _sendPort->send(kMessageId, *command, kCommandTimeout);
-  if (error != SendError::None) {
-    _platform.systemLog().log(LogPriority::Error,
-                              " ***** Could not send the START command (got error={})",
-                              static_cast<int>(error));
-    return false;
-  }
+void KestroModel::messageArrived(ByteView message) { updateWithData(message); }
+
+void KestroModel::channelStarted() {
   logError("Starting the display update timer");
   _displayUpdateTimer =
       _platform.mainQueue().scheduleRepeating(kDisplayUpdateInterval, [this] { refresh(); });
-  return true;
 }
 
-void KestroModel::restartMonitor() {
-  destroyPorts();
-  startMonitor();
+void KestroModel::channelStops() {
+  if (const auto timer = std::exchange(_displayUpdateTimer, nullptr)) timer->invalidate();
 }
+
+void KestroModel::connectionChanged(bool isConnected) {
+  if (_connectionChanged) _connectionChanged(isConnected);
+}
+
+void KestroModel::serverNotified() { refresh(); }
+
+std::shared_ptr<const void> KestroModel::keptByRetry() { return shared_from_this(); }
 
 // --- Display -------------------------------------------------------------------------------------
 
 void KestroModel::refresh() {
-  if (isConnected() && !_sendPort->isValid()) {
-    // Its handler restarts the monitor, which lets go of the port that is being invalidated.
-    const std::shared_ptr<LocalPort> port = _recvPort;
-    port->invalidate();
-  }
+  _client.check();
   if (!_updated) return;
   _updated = false;
   _nodes.reset();

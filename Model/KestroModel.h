@@ -1,32 +1,29 @@
 // SPDX-License-Identifier: MIT
-// The one object that talks to the telephony server: it keeps a log channel open, hands its
-// messages to the technology's generator and keeps the tree of display nodes.
+// The display of a log channel: hands the channel's messages to the technology's generator and
+// keeps the tree of display nodes.
 #pragma once
 
 #include <chrono>
 #include <functional>
 #include <memory>
+#include <optional>
 #include <string>
 #include <string_view>
 #include <vector>
 
 #include "LogGenerator/LogGenerator.h"
 #include "Model/KestroModelNode.h"
+#include "Model/LogChannelClient.h"
 #include "Platform/MainQueue.h"
-#include "Platform/MessagePort.h"
 
 namespace kestro {
 
 /// How often the display is refreshed while connected.
 inline constexpr std::chrono::seconds kDisplayUpdateInterval{2};
-/// How long after a failure the whole connect cycle is run again.
-inline constexpr std::chrono::seconds kRetryDelay{5};
-/// The most that one command to the log channel waits to be sent, and its reply to arrive.
-inline constexpr std::chrono::seconds kCommandTimeout{1};
 
 /// Main thread only. The platform outlives the model. A model that waits for its next attempt to
 /// connect is kept alive by that attempt.
-class KestroModel : public std::enable_shared_from_this<KestroModel> {
+class KestroModel : public std::enable_shared_from_this<KestroModel>, private LogChannelUser {
  public:
   /// Makes the generator for a technology; null when there is none.
   using GeneratorFactory =
@@ -38,9 +35,14 @@ class KestroModel : public std::enable_shared_from_this<KestroModel> {
       Platform& platform, std::function<void()> updateViewControllerFromModel,
       GeneratorFactory generatorFromTechnology = LogGenerator::generatorFromTechnology);
 
-  ~KestroModel();
+  ~KestroModel() override;
   KestroModel(const KestroModel&) = delete;
   KestroModel& operator=(const KestroModel&) = delete;
+
+  /// `connectionChanged` is called, while the model lives, when the connection has come or gone;
+  /// one that is replaced at once has not gone. It runs within the model's operations and must not
+  /// destroy the model.
+  void setConnectionHandler(std::function<void(bool isConnected)> connectionChanged);
 
   /// Whether both ports exist; it does not look whether they still work.
   [[nodiscard]] bool isConnected() const noexcept;
@@ -78,21 +80,24 @@ class KestroModel : public std::enable_shared_from_this<KestroModel> {
   KestroModel(Platform& platform, std::function<void()> updateViewControllerFromModel,
               GeneratorFactory generatorFromTechnology);
 
-  void createLocalPort(std::string_view name);
-  [[nodiscard]] bool createRemotePort(std::string_view localPortName);
-  /// Everything of a start but the retry; false when a step failed.
-  [[nodiscard]] bool tryStartMonitor();
-  void setGeneratorFromReply(ByteView reply);
+  void technologyAnswered(std::string_view technology) override;
+  [[nodiscard]] std::optional<Dictionary> startCommand() override;
+  void messageArrived(ByteView message) override;
+  void channelStarted() override;
+  void channelStops() override;
+  void connectionChanged(bool isConnected) override;
+  void serverNotified() override;
+  [[nodiscard]] std::shared_ptr<const void> keptByRetry() override;
+
   void setGenerator(std::string_view technology);
-  void receivePortInvalidated(const LocalPort* port);
   void logError(std::string_view line);
 
   Platform& _platform;
   std::function<void()> _updateViewControllerFromModel;
   GeneratorFactory _generatorFromTechnology;
+  std::function<void(bool isConnected)> _connectionChanged;
 
-  std::shared_ptr<LocalPort> _recvPort;
-  std::shared_ptr<RemotePort> _sendPort;
+  LogChannelClient _client;
   std::unique_ptr<Timer> _displayUpdateTimer;
   Dictionary _state;
   NodePointer _nodes;

@@ -6,31 +6,15 @@
 
 #include <utility>
 
-#include "CommandLine/Commands/WatchSession.h"
 #include "Platform/Clock.h"
 #include "Platform/TelephonyProtocol.h"
 
 namespace kestro {
+namespace {
 
-/// Takes the messages of any technology as they are.
-class RecordSession::Generator : public LogGenerator {
- public:
-  Generator(Platform& platform, std::weak_ptr<RecordSession*> session)
-      : LogGenerator(platform), _session(std::move(session)) {}
+constexpr const char* kConnectingRemark = "connecting...";
 
-  void updateStateWithData(Dictionary&, ByteView data) override {
-    if (const auto session = _session.lock()) (*session)->recordMessage(data);
-  }
-  Value generateLogUsingState(Dictionary&) override { return {}; }
-  /// Without lists of codes everything is streamed.
-  [[nodiscard]] Dictionary getStartCommand() const override {
-    return {{kTelephonySetState, kTelephonyStreaming}};
-  }
-  [[nodiscard]] Array getSaveContentsFromState(const Dictionary&) override { return {}; }
-
- private:
-  std::weak_ptr<RecordSession*> _session;
-};
+}  // namespace
 
 RecordSession::RecordSession(Platform& platform, std::string path, Remark remark,
                              std::function<void(const std::string& reason)> failed)
@@ -38,19 +22,11 @@ RecordSession::RecordSession(Platform& platform, std::string path, Remark remark
       _path(std::move(path)),
       _remark(std::move(remark)),
       _failed(std::move(failed)),
-      _self(std::make_shared<RecordSession*>(this)),
-      _model(KestroModel::create(
-          platform, [] {},
-          [weak = std::weak_ptr(_self)](Platform&, std::string_view technology) {
-            const auto session = weak.lock();
-            return session ? (*session)->recordTechnology(technology) : nullptr;
-          })) {}
+      _client(platform, *this, ChannelWatch::ByClient) {}
 
 void RecordSession::start() {
-  _model->restartMonitor();
-  _connectionTimer = _platform.mainQueue().scheduleRepeating(kConnectionCheckInterval,
-                                                             [this] { checkConnection(); });
-  checkConnection();
+  _client.start();
+  if (!_client.isConnected()) _remark(kConnectingRemark);
 }
 
 void RecordSession::stop() { _isOver = true; }
@@ -61,14 +37,16 @@ std::optional<std::string> RecordSession::summary() const {
                      _byteCount, _recording->leftOutCount(), fmt::join(_recording->files(), ", "));
 }
 
-std::unique_ptr<LogGenerator> RecordSession::recordTechnology(std::string_view technology) {
-  if (_isOver) return nullptr;
-  if (const auto opened = openFile(technology); !opened) {
-    fail(opened.error().message);
-    return nullptr;
-  }
+void RecordSession::technologyAnswered(std::string_view technology) {
+  if (_isOver) return;
+  if (const auto opened = openFile(technology); !opened) return fail(opened.error().message);
   _remark(fmt::format("recording {} to {}", technology, _recording->files().back()));
-  return std::make_unique<Generator>(_platform, _self);
+}
+
+/// Without lists of codes everything is streamed.
+std::optional<Dictionary> RecordSession::startCommand() {
+  if (_isOver || !_recording) return std::nullopt;
+  return Dictionary{{kTelephonySetState, kTelephonyStreaming}};
 }
 
 Result<void> RecordSession::openFile(std::string_view technology) {
@@ -79,7 +57,7 @@ Result<void> RecordSession::openFile(std::string_view technology) {
   return {};
 }
 
-void RecordSession::recordMessage(ByteView message) {
+void RecordSession::messageArrived(ByteView message) {
   if (_isOver) return;
   const std::uint64_t leftOutBefore = _recording->leftOutCount();
   if (const auto written = _recording->write(_platform.clock().now(), message); !written) {
@@ -93,10 +71,8 @@ void RecordSession::recordMessage(ByteView message) {
   }
 }
 
-void RecordSession::checkConnection() {
-  const bool isConnected = _model->isConnected();
-  if (!isConnected && _wasConnected) _remark("connecting...");
-  _wasConnected = isConnected;
+void RecordSession::connectionChanged(bool isConnected) {
+  if (!isConnected && !_isOver) _remark(kConnectingRemark);
 }
 
 void RecordSession::fail(const std::string& reason) {

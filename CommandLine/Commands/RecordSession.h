@@ -2,24 +2,21 @@
 // Recording what arrives on the log channel.
 #pragma once
 
-#include <chrono>
 #include <cstdint>
 #include <functional>
-#include <memory>
 #include <optional>
 #include <string>
+#include <string_view>
 
-#include "Model/KestroModel.h"
-#include "Platform/MainQueue.h"
+#include "Model/LogChannelClient.h"
 #include "Platform/Platform.h"
 #include "Recordings/PcapRecording.h"
 
 namespace kestro {
 
-/// Connects as the model does and writes every message to a capture, undecoded. When the technology
-/// changes, the recording goes on in the next file; one without a link type ends it. Main thread
-/// only.
-class RecordSession {
+/// Writes every message of a log channel to a capture, undecoded. When the technology changes, the
+/// recording goes on in the next file; one without a link type ends it. Main thread only.
+class RecordSession : private LogChannelUser {
  public:
   /// A remark for the person who records: that it connects, records, or leaves a message out.
   using Remark = std::function<void(const std::string& text)>;
@@ -38,13 +35,12 @@ class RecordSession {
   [[nodiscard]] std::optional<std::string> summary() const;
 
  private:
-  class Generator;
+  void technologyAnswered(std::string_view technology) override;
+  [[nodiscard]] std::optional<Dictionary> startCommand() override;
+  void messageArrived(ByteView message) override;
+  void connectionChanged(bool isConnected) override;
 
-  /// Stands in for the technology's generator.
-  [[nodiscard]] std::unique_ptr<LogGenerator> recordTechnology(std::string_view technology);
   [[nodiscard]] Result<void> openFile(std::string_view technology);
-  void recordMessage(ByteView message);
-  void checkConnection();
   void fail(const std::string& reason);
 
   Platform& _platform;
@@ -54,10 +50,7 @@ class RecordSession {
   std::optional<PcapRecording> _recording;
   std::uint64_t _byteCount = 0;
   bool _isOver = false;  ///< stopped or failed: nothing is recorded any more
-  bool _wasConnected = true;
-  std::shared_ptr<RecordSession*> _self;  ///< what generators find this by, while it lives
-  std::shared_ptr<KestroModel> _model;
-  std::unique_ptr<Timer> _connectionTimer;
+  LogChannelClient _client;
 };
 
 }  // namespace kestro

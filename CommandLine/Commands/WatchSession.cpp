@@ -25,12 +25,13 @@ WatchSession::WatchSession(Platform& platform, WatchView& view,
         if (const auto session = weak.lock()) (*session)->refresh();
       })) {
   _state.status = kConnecting;
+  _model->setConnectionHandler([weak = std::weak_ptr(_self)](bool) {
+    if (const auto session = weak.lock()) (*session)->connectionChanged();
+  });
 }
 
 void WatchSession::start() {
   redraw();
-  _connectionTimer = _platform.mainQueue().scheduleRepeating(kConnectionCheckInterval,
-                                                             [this] { checkConnection(); });
   _model->restartMonitor();
 }
 
@@ -54,7 +55,7 @@ void WatchSession::refresh() {
   endIfOver();
 }
 
-void WatchSession::checkConnection() {
+void WatchSession::connectionChanged() {
   const std::string before = _state.status;
   updateStatus();
   if (_state.status != before) redraw();

@@ -2,7 +2,6 @@
 // The live display's behaviour, apart from how it is shown.
 #pragma once
 
-#include <chrono>
 #include <cstdint>
 #include <functional>
 #include <memory>
@@ -10,13 +9,9 @@
 
 #include "CommandLine/Terminal/WatchView.h"
 #include "Model/KestroModel.h"
-#include "Platform/MainQueue.h"
 #include "Platform/Platform.h"
 
 namespace kestro {
-
-/// How often it is looked whether the model is still connected: no new data tells so.
-inline constexpr std::chrono::milliseconds kConnectionCheckInterval{500};
 
 /// Shows a model's displays in a view: the status is "Connecting..." while the model is not
 /// connected and until the first data, else the time of the last refresh. Main thread only.
@@ -34,7 +29,7 @@ class WatchSession {
 
  private:
   void refresh();
-  void checkConnection();
+  void connectionChanged();
   void updateStatus();
   void endIfOver();
 
@@ -48,7 +43,6 @@ class WatchSession {
   WatchState _state;
   std::shared_ptr<WatchSession*> _self;  ///< what a queued redraw finds this by, while it lives
   std::shared_ptr<KestroModel> _model;
-  std::unique_ptr<Timer> _connectionTimer;
 };
 
 }  // namespace kestro

@@ -42,10 +42,6 @@ class AppFixture : public ModelFixture {
     sendLog(message);
     queue().advance(2s);
   }
-  void loseServer() {
-    platform.telephonyService().setReachable(false);
-    channel.reset();
-  }
 
   static NavigationController& stack() { return *app().navController(); }
   static KestroPaneController& top() {

@@ -170,7 +170,7 @@ TEST_F(KestroAppTest, ALostConnectionShowsWithoutNewDataAndKeepsTheDisplay) {
   launchConnected();
   show(display("-70"));
   loseServer();
-  queue().advance(2500ms);
+  queue().advance(2s);
   EXPECT_EQ(status(), "Connecting...");
   EXPECT_TRUE(isLoading());
   EXPECT_EQ(app().updateMessage(), "Updated 2012-03-04 at 13:00:03");
@@ -181,7 +181,7 @@ TEST_F(KestroAppTest, ARedrawWhileDisconnectedKeepsTheTimeOfTheLastUpdate) {
   launchConnected();
   show(display("-70"));
   loseServer();
-  queue().advance(2500ms);
+  queue().advance(2s);
   app().updateViewControllerFromModel();
   EXPECT_EQ(app().updateMessage(), "Updated 2012-03-04 at 13:00:03");
   EXPECT_EQ(status(), "Connecting...");
@@ -191,7 +191,7 @@ TEST_F(KestroAppTest, AScreenChangeWhileDisconnectedShowsConnecting) {
   launchConnected();
   show(display("-70"));
   loseServer();
-  queue().advance(2500ms);
+  queue().advance(2s);
   open(0);
   EXPECT_EQ(status(), "Connecting...");
   EXPECT_TRUE(isLoading());
@@ -202,8 +202,7 @@ TEST_F(KestroAppTest, AfterReconnectingTheOldUpdateShowsUntilNewData) {
   show(display("-70"));
   loseServer();
   queue().advance(3s);
-  platform.telephonyService().setReachable(true);
-  openChannel();
+  bringServerBack();
   queue().advance(6s);
   EXPECT_EQ(status(), "Updated 2012-03-04 at 13:00:03");
   EXPECT_FALSE(isLoading());
@@ -216,6 +215,16 @@ TEST_F(KestroAppTest, AQueuedRedrawAfterTheExitTouchesNothing) {
   app().applicationWillTerminate();
   queue().runReady();
   EXPECT_EQ(app().window(), nullptr);
+}
+
+TEST_F(KestroAppTest, ARetryAfterTheExitTouchesNothing) {
+  platform.telephonyService().setReachable(false);
+  launchConnected();
+  app().applicationWillTerminate();
+  platform.telephonyService().setReachable(true);
+  queue().advance(5s);
+  EXPECT_THAT(channelRequests, ::testing::SizeIs(1));
+  EXPECT_THAT(platform.messagePorts().names(), ElementsAre("Channel"));
 }
 
 TEST_F(KestroAppTest, TheExitClosesThePorts) {

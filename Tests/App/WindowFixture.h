@@ -7,6 +7,7 @@
 #include <unistd.h>
 
 #include <QTest>
+#include <chrono>
 #include <cstdint>
 #include <cstdlib>
 #include <filesystem>
@@ -17,6 +18,8 @@
 
 #include "App/KestroApp.h"
 #include "Platform/Linux/LinuxPlatform.h"
+#include "Platform/MessagePort.h"
+#include "Platform/TelephonyProtocol.h"
 #include "Tests/App/Screen.h"
 #include "Tests/EndToEnd/Process.h"
 #include "Tests/Support/TemporaryFile.h"
@@ -74,7 +77,21 @@ class WindowTest : public ::testing::Test {
   void launchConnected() {
     startServer();
     launch();
-    ASSERT_TRUE(waitFor([&] { return !isLoadingShown(stack().toolbar()); }));
+    waitForConnection();
+  }
+  /// Waits until the window is connected and the server has seen all that it sent, the start
+  /// command with it.
+  void waitForConnection() {
+    ASSERT_TRUE(waitFor([] { return !isLoadingShown(stack().toolbar()); }));
+    constexpr std::chrono::seconds kReplyTimeout{10};
+    const auto port = platform->messagePorts().createRemotePort("TelephonyServer");
+    ASSERT_TRUE(port);
+    // The first answer may overtake the start command, when both wait to be read; the second not.
+    for (int i = 0; i < 2; ++i) {
+      const auto reply = port->request(messageId(TelephonyMessage::CreateLogChannel), {},
+                                       kReplyTimeout, kReplyTimeout);
+      ASSERT_EQ(reply.error, SendError::None);
+    }
   }
 
   /// Feeds the server one message: a property list's entries as XML.

@@ -67,7 +67,7 @@ TEST_F(WindowTest, AKilledServerShowsAndIsConnectedToAgain) {
   EXPECT_THAT(rows(), ElementsAre("RSCP = -70", "Band = 1"));
   std::filesystem::remove(ports() + "/TelephonyServer");
   startServer();
-  ASSERT_TRUE(waitFor([] { return !isLoadingShown(stack().toolbar()); }));
+  waitForConnection();
   send(display("-73"));
   ASSERT_TRUE(waitForRows({"RSCP = -73", "Band = 1"}));
 }

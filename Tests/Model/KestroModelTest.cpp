@@ -419,6 +419,36 @@ TEST_F(KestroModelTest, ReconnectsOnANotificationAfterItsChannelWasClosed) {
   EXPECT_TRUE(model->isConnected());
 }
 
+TEST_F(KestroModelTest, TellsThatTheConnectionCameAndWent) {
+  std::vector<bool> told;
+  model->setConnectionHandler([&](bool isConnected) { told.push_back(isConnected); });
+  model->restartMonitor();
+  EXPECT_THAT(told, ElementsAre(true));
+  loseServer();
+  queue().advance(2s);
+  EXPECT_THAT(told, ElementsAre(true, false));
+  bringServerBack();
+  queue().advance(5s);
+  EXPECT_THAT(told, ElementsAre(true, false, true));
+}
+
+TEST_F(KestroModelTest, DoesNotTellItsOwnEndAsALostConnection) {
+  std::vector<bool> told;
+  model->setConnectionHandler([&](bool isConnected) { told.push_back(isConnected); });
+  model->restartMonitor();
+  model.reset();
+  EXPECT_THAT(told, ElementsAre(true));
+}
+
+TEST_F(KestroModelTest, RefreshesNothingWhileItWaitsToRetry) {
+  model->restartMonitor();
+  loseServer();
+  queue().advance(2s);
+  model->updateWithData(*coding->xml(Dictionary{{"A", "1"}}));
+  queue().advance(4s);
+  EXPECT_EQ(redraws, 0);
+}
+
 TEST_F(KestroModelTest, ClosesItsPortsWithoutRestarting) {
   model->restartMonitor();
   queue().runReady();

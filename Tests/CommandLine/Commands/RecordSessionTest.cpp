@@ -8,7 +8,7 @@
 #include "CommandLine/Commands/RecordSession.h"
 #include "Recordings/PcapReader.h"
 #include "Tests/Support/FileSizeLimit.h"
-#include "Tests/Support/ModelFixture.h"
+#include "Tests/Support/LogChannelFixture.h"
 #include "Tests/Support/TemporaryFile.h"
 
 namespace kestro {
@@ -19,7 +19,7 @@ using ::testing::ElementsAre;
 using testing::FileSizeLimit;
 using ::testing::IsEmpty;
 
-class RecordSessionTest : public testing::ModelFixture {
+class RecordSessionTest : public testing::LogChannelFixture {
  protected:
   RecordSessionTest() { platform.clock().setNow(Moment(1'330'866'000s)); }
 
@@ -28,13 +28,6 @@ class RecordSessionTest : public testing::ModelFixture {
         platform, path, [this](const std::string& text) { remarks.push_back(text); },
         [this](const std::string& reason) { failures.push_back(reason); });
     session->start();
-  }
-
-  void send(const Bytes& message) {
-    const auto port = platform.messagePorts().createRemotePort(channelRequests.back());
-    ASSERT_TRUE(port);
-    ASSERT_EQ(port->post(0, message), SendError::None);
-    queue().runReady();
   }
 
   /// The channel goes, and comes back with another technology.
@@ -107,11 +100,9 @@ TEST_F(RecordSessionTest, AChangeOfTechnologyGoesOnInTheNextFile) {
 TEST_F(RecordSessionTest, GoesOnAfterALostConnection) {
   start(file.path());
   send(testing::bytesOf("a"));
-  platform.telephonyService().setReachable(false);
-  channel.reset();
+  loseServer();
   queue().advance(3s);
-  platform.telephonyService().setReachable(true);
-  openChannel();
+  bringServerBack();
   queue().advance(5s);
   send(testing::bytesOf("b"));
   EXPECT_THAT(messagesIn(file.path()), ElementsAre("IFX: 0, a", "IFX: 8, b"));

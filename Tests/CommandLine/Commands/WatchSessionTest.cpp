@@ -81,9 +81,8 @@ TEST_F(WatchSessionTest, ALostConnectionShowsWithoutNewDataAndKeepsTheDisplay) {
   sendValue("1");
   queue().advance(2s);
   view.take();
-  platform.telephonyService().setReachable(false);
-  channel.reset();
-  queue().advance(2500ms);
+  loseServer();
+  queue().advance(2s);
   EXPECT_THAT(view.take(), ElementsAre("- Connecting... | 1"));
 }
 
@@ -91,17 +90,27 @@ TEST_F(WatchSessionTest, AfterReconnectingTheOldUpdateShowsUntilNewData) {
   start();
   sendValue("1");
   queue().advance(2s);
-  platform.telephonyService().setReachable(false);
-  channel.reset();
+  loseServer();
   queue().advance(3s);
   view.take();
-  platform.telephonyService().setReachable(true);
-  openChannel();
+  bringServerBack();
   queue().advance(5s);
   EXPECT_THAT(view.take(), ElementsAre("- Updated 2012-03-04 at 13:00:02 | 1"));
   sendValue("2");
   queue().advance(2s);
   EXPECT_THAT(view.take(), ElementsAre(::testing::EndsWith("| 1 > 2")));
+}
+
+TEST_F(WatchSessionTest, AConnectionThatIsReplacedAtOnceShowsNoChange) {
+  start();
+  sendValue("1");
+  queue().advance(2s);
+  view.take();
+  channel->invalidate();
+  openChannel();
+  queue().advance(2s);
+  EXPECT_THAT(channelRequests, ::testing::SizeIs(2));
+  EXPECT_THAT(view.take(), IsEmpty());
 }
 
 TEST_F(WatchSessionTest, ATechnologyThatNobodyDecodesKeepsTheDisplay) {

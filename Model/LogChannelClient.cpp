@@ -1,0 +1,137 @@
+// SPDX-License-Identifier: MIT
+#include "Model/LogChannelClient.h"
+
+#include <utility>
+
+#include "Platform/MessagePort.h"
+#include "Platform/PropertyListCoding.h"
+#include "Platform/SystemLog.h"
+#include "Platform/TelephonyProtocol.h"
+
+namespace kestro {
+
+LogChannelClient::LogChannelClient(Platform& platform, LogChannelUser& user, ChannelWatch watch)
+    : _platform(platform),
+      _user(user),
+      _watch(watch),
+      _ports(platform, {.received = [this](ByteView message) { _user.messageArrived(message); },
+                        .lost = [this] { restart(); },
+                        .notified = [this] { serverNotified(); }}),
+      _self(std::make_shared<LogChannelClient*>(this)) {}
+
+void LogChannelClient::start() {
+  if (_isRunning) return;
+  if (!tryStart()) {
+    stopPorts();
+    scheduleRetry();
+  }
+  tellConnection();
+}
+
+void LogChannelClient::restart() {
+  stopPorts();
+  start();
+}
+
+void LogChannelClient::close() {
+  stopPorts();
+  tellConnection();
+}
+
+void LogChannelClient::stopPorts() {
+  _user.channelStops();
+  _isRunning = false;
+  _checkTimer.reset();
+  _ports.close();
+}
+
+bool LogChannelClient::tryStart() {
+  if (!openPorts()) {
+    logError("Could not create the ports necessary");
+    return false;
+  }
+  requestTechnology();
+  if (!sendStartCommand()) return false;
+  _isRunning = true;
+  if (_watch == ChannelWatch::ByClient) {
+    _checkTimer =
+        _platform.mainQueue().scheduleRepeating(kChannelCheckInterval, [this] { check(); });
+  }
+  _user.channelStarted();
+  return true;
+}
+
+void LogChannelClient::scheduleRetry() {
+  _platform.mainQueue().postAfter(kRetryDelay,
+                                  [weak = std::weak_ptr(_self), kept = _user.keptByRetry()] {
+                                    if (const auto client = weak.lock()) (*client)->start();
+                                  });
+}
+
+void LogChannelClient::requestTechnology() {
+  const Dictionary command{{kTelephonyGetTechnology, kTelephonyGetTechnology}};
+  const auto request = _platform.propertyListCoding().xml(command);
+  if (!request) {
+    logError(" Could not generate GetTechnology command; cannot configure");
+    return;
+  }
+  const RemotePort::Reply reply = _ports.request(*request);
+  if (reply.error != SendError::None) {
+    _platform.systemLog().log(LogPriority::Error,
+                              " ***** Could not send the GetTechnology command (got error={})",
+                              static_cast<int>(reply.error));
+    return;
+  }
+  if (!reply.data) {
+    logError(" ***** No response to GetTechnology; cannot configure");
+    return;
+  }
+  readTechnology(*reply.data);
+}
+
+void LogChannelClient::readTechnology(ByteView reply) {
+  const Result<Value> parsed = _platform.propertyListCoding().parse(reply);
+  if (!parsed) {
+    logError(" ***** Could not parse reply to GetTechnology; cannot configure");
+    return;
+  }
+  const Value technology = parsed->dictionary()[kTelephonyGetTechnology];
+  if (technology.isNull()) {
+    logError(" ***** Reply to GetTechnology had no answer; cannot configure");
+    return;
+  }
+  _user.technologyAnswered(technology.text());
+}
+
+bool LogChannelClient::sendStartCommand() {
+  const std::optional<Dictionary> command = _user.startCommand();
+  if (!command) return false;
+  const auto message = _platform.propertyListCoding().xml(*command);
+  if (!message) {
+    logError(" Could not generate PLIST");
+    return false;
+  }
+  const SendError error = _ports.send(*message);
+  if (error == SendError::None) return true;
+  _platform.systemLog().log(LogPriority::Error,
+                            " ***** Could not send the START command (got error={})",
+                            static_cast<int>(error));
+  return false;
+}
+
+void LogChannelClient::serverNotified() {
+  if (_watch == ChannelWatch::ByClient) return check();
+  _user.serverNotified();
+}
+
+void LogChannelClient::tellConnection() {
+  const bool isConnectedNow = isConnected();
+  if (std::exchange(_toldConnected, isConnectedNow) == isConnectedNow) return;
+  _user.connectionChanged(isConnectedNow);
+}
+
+void LogChannelClient::logError(std::string_view line) {
+  _platform.systemLog().write(LogPriority::Error, line);
+}
+
+}  // namespace kestro
