@@ -127,7 +127,7 @@ C2KParser* C2KLogGenerator::parserOf(LogCode code) const noexcept {
 }
 
 void C2KLogGenerator::updateStateWithData(Dictionary& state, ByteView data) {
-  getDisplayFromState(state);
+  if (_displayKey.in(state).isNull()) getDisplayFromState(state);
   updateFromLogUsingLookupUsingState(data, _lookupKey.in(state).dictionary(), state);
 }
 

@@ -5,18 +5,26 @@ namespace kestro {
 
 std::vector<std::string_view> C2KParser::lookupNames() const {
   std::vector<std::string_view> names;
-  for (const Field& field : _reading.fields) {
+  for (const Field& field : reading().fields) {
     if (field.text.kind != TextRule::Kind::Hidden) names.push_back(field.key);
   }
-  for (const ListReading& list : _reading.lists) names.push_back(list.key);
+  for (const ListReading& list : reading().lists) names.push_back(list.key);
   return names;
 }
 
-bool C2KParser::isLongEnough(PacketView packet, SystemLog& log) const {
-  if (isLongEnough(packet)) return true;
-  log.log(LogPriority::Error, "Log code 0x{:04x} is {} bytes long but must be at least {} bytes.",
-          _reading.packet.code, packet.size(), _reading.packet.minimumLength);
-  return false;
+void C2KParser::parse(PacketView packet, C2KOutput& output) {
+  TakenPacket taken{.bytes = packet};
+  if (isTaken(_rules, taken)) return take(taken, output);
+  logRefusal(_rules, packet, output.log);
+}
+
+void C2KParser::explain(PacketView packet, const ExplainVisitor& visit) const {
+  TakenPacket taken{.bytes = packet};
+  if (isTaken(_rules, taken)) explainTaken(taken, visit);
+}
+
+void C2KParser::explainTaken(const TakenPacket& packet, const ExplainVisitor& visit) const {
+  Explainer(reading().packet.name, packet.bytes, visit).reading(reading());
 }
 
 StoredFields::StoredFields(std::span<const Field> fields) {

@@ -7,8 +7,10 @@
 #include <vector>
 
 #include "LogGenerator/C2K/LookupTable.h"
+#include "LogGenerator/C2K/PacketCheck.h"
 #include "LogGenerator/Packets/Decode.h"
 #include "LogGenerator/Packets/Explain.h"
+#include "LogGenerator/Packets/Requirement.h"
 #include "LogGenerator/Packets/Section.h"
 #include "Platform/PropertyList.h"
 #include "Platform/SystemLog.h"
@@ -32,31 +34,32 @@ class C2KParser {
 
   /// The packet's code, name and length, and whatever of it a layout describes. The keys of its
   /// shown fields and lists are lookup names.
-  [[nodiscard]] const PacketReading& reading() const noexcept { return _reading; }
+  [[nodiscard]] const PacketReading& reading() const noexcept { return _rules.reading; }
 
-  /// Stores what the packet, header included, shows. A packet that it rejects leaves a line in the
-  /// log and nothing else.
-  virtual void parse(PacketView packet, C2KOutput& output) = 0;
+  /// What the packet must have. `refusalOf` tells of one that lacks some of it.
+  [[nodiscard]] const PacketRules& rules() const noexcept { return _rules; }
+
+  /// Stores what the packet, header included, shows. A packet that is refused leaves its lines in
+  /// the log and nothing else.
+  void parse(PacketView packet, C2KOutput& output);
 
   /// Visits every value that `parse` takes from the packet, under the packet's name as its section
-  /// and the lookup name as its key or, for a row, its list. Nothing for a packet that it rejects.
-  virtual void explain(PacketView packet, const ExplainVisitor& visit) const = 0;
+  /// and the lookup name as its key or, for a row, its list. Nothing for a packet that is refused.
+  void explain(PacketView packet, const ExplainVisitor& visit) const;
 
   /// The names of all values that it may store, in that order.
   [[nodiscard]] virtual std::vector<std::string_view> lookupNames() const;
 
  protected:
-  /// `reading` must be a constant.
-  explicit C2KParser(const PacketReading& reading) noexcept : _reading(reading) {}
+  explicit C2KParser(const PacketRules& rules) noexcept : _rules(rules) {}
 
-  [[nodiscard]] bool isLongEnough(PacketView packet) const noexcept {
-    return packet.size() >= _reading.packet.minimumLength;
-  }
-  /// Like the overload without a log; a packet that is too short leaves a line in `log`.
-  [[nodiscard]] bool isLongEnough(PacketView packet, SystemLog& log) const;
+  /// `parse` and `explain` for a packet that is taken. Unless a parser says otherwise, what is
+  /// explained is the reading.
+  virtual void take(const TakenPacket& packet, C2KOutput& output) = 0;
+  virtual void explainTaken(const TakenPacket& packet, const ExplainVisitor& visit) const;
 
  private:
-  const PacketReading& _reading;
+  PacketRules _rules;
 };
 
 /// The text for a value that the phone does not know in its present state.
@@ -77,6 +80,20 @@ class StoredFields {
   };
 
   std::vector<StoredField> _fields;
+};
+
+/// The parser of a packet that is nothing but the fields of its reading.
+class FieldParser : public C2KParser {
+ protected:
+  explicit FieldParser(const PacketRules& fieldRules)
+      : C2KParser(fieldRules), _fields(fieldRules.reading.fields) {}
+
+  void take(const TakenPacket& packet, C2KOutput& output) override {
+    _fields.store(packet.bytes, {}, output.lookup);
+  }
+
+ private:
+  StoredFields _fields;
 };
 
 }  // namespace kestro

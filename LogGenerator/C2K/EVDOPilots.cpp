@@ -22,6 +22,11 @@ constexpr ListReading kActivePilots[] = {
     {.table = {.name = "pilot", .count = u8(15), .base = 25, .stride = 12, .fields = kActivePilot},
      .key = "kActiveSetPilots"}};
 
+constexpr Requirement kActiveSetRequirements[] = {
+    kMinimumLength,
+    {Requirement::Kind::HoldsRecords,
+     "Log code 0x12b6 is {0} bytes long, but has {3} substructs."}};
+
 // --- 0x108A: fingers, records of 14 bytes from byte 23 -------------------------------------------
 
 constexpr Place kFingerPN = u16(0);
@@ -41,32 +46,25 @@ constexpr ListReading kFingers[] = {{.table = {.name = "finger",
                                                .keep = between(kFingerPN, 0, kUnusedFinger - 1)},
                                      .key = "kFingerC2I"}};
 
+// The size shown is the header's alone, whatever the count.
+constexpr Requirement kFingersRequirements[] = {
+    kMinimumLength,
+    {Requirement::Kind::EndsWithRecords,
+     "Log code 0x108a has bad length of {0} bytes, but has {3} substructs (size={1})."}};
+
 }  // namespace
 
 constexpr PacketReading kEVDOActiveSetReading = {.packet = kEVDOActiveSetPacket,
                                                  .lists = kActivePilots};
 constexpr PacketReading kEVDOFingersReading = {.packet = kEVDOFingersPacket, .lists = kFingers};
 
-// --- EVDOPilots ----------------------------------------------------------------------------------
+EVDOPilots::EVDOPilots(const PacketRules& pilotsRules)
+    : C2KParser(pilotsRules), _energy(table().fields[1]), _name(pilotsRules.reading.lists[0].key) {}
 
-EVDOPilots::EVDOPilots(const PacketReading& pilotsReading)
-    : C2KParser(pilotsReading), _energy(table().fields[1]), _name(pilotsReading.lists[0].key) {}
-
-std::size_t EVDOPilots::recordsIn(PacketView packet) const { return recordCount(table(), packet); }
-
-std::size_t EVDOPilots::lengthWithRecords(PacketView packet) const {
-  return table().base + table().stride * recordsIn(packet);
-}
-
-void EVDOPilots::parse(PacketView packet, C2KOutput& output) {
-  if (!isLongEnough(packet, output.log)) return;
-  if (!hasRightLength(packet)) {
-    reportLength(packet, output.log);
-    return;
-  }
-  forEachRecord(table(), packet, [&](std::size_t index, const RecordPosition& position) {
-    _pilots.add(index, readBits(table().fields[0].places[0], packet, position),
-                _energy.value(packet, position));
+void EVDOPilots::take(const TakenPacket& packet, C2KOutput& output) {
+  forEachRecord(table(), packet.bytes, [&](std::size_t index, const RecordPosition& position) {
+    _pilots.add(index, readBits(table().fields[0].places[0], packet.bytes, position),
+                _energy.value(packet.bytes, position));
   });
   if (_pilots.empty()) {
     output.lookup.store(_name, kNoPilots);
@@ -75,31 +73,7 @@ void EVDOPilots::parse(PacketView packet, C2KOutput& output) {
   }
 }
 
-void EVDOPilots::explain(PacketView packet, const ExplainVisitor& visit) const {
-  if (!isLongEnough(packet) || !hasRightLength(packet)) return;
-  Explainer(reading().packet.name, packet, visit).reading(reading());
-}
-
-// --- The two lists -------------------------------------------------------------------------------
-
-bool EVDOActiveSet::hasRightLength(PacketView packet) const {
-  return packet.size() >= lengthWithRecords(packet);
-}
-
-void EVDOActiveSet::reportLength(PacketView packet, SystemLog& log) const {
-  log.log(LogPriority::Error, "Log code 0x12b6 is {} bytes long, but has {} substructs.",
-          packet.size(), recordsIn(packet));
-}
-
-bool EVDOFingers::hasRightLength(PacketView packet) const {
-  return packet.size() == lengthWithRecords(packet);
-}
-
-void EVDOFingers::reportLength(PacketView packet, SystemLog& log) const {
-  // The size shown is the header's alone, whatever the count.
-  log.log(LogPriority::Error,
-          "Log code 0x108a has bad length of {} bytes, but has {} substructs (size={}).",
-          packet.size(), recordsIn(packet), reading().packet.minimumLength);
-}
+EVDOActiveSet::EVDOActiveSet() : EVDOPilots({kEVDOActiveSetReading, kActiveSetRequirements}) {}
+EVDOFingers::EVDOFingers() : EVDOPilots({kEVDOFingersReading, kFingersRequirements}) {}
 
 }  // namespace kestro

@@ -18,19 +18,10 @@ extern const PacketReading kEVDOFingersReading;
 
 /// Shows one list of pilots. The code decides how long a packet with so many pilots has to be.
 class EVDOPilots : public C2KParser {
- public:
-  void parse(PacketView packet, C2KOutput& output) override;
-  void explain(PacketView packet, const ExplainVisitor& visit) const override;
-
  protected:
-  explicit EVDOPilots(const PacketReading& pilotsReading);
+  explicit EVDOPilots(const PacketRules& pilotsRules);
 
-  /// The length of a packet with as many records as this one says it has.
-  [[nodiscard]] std::size_t lengthWithRecords(PacketView packet) const;
-  [[nodiscard]] std::size_t recordsIn(PacketView packet) const;
-
-  [[nodiscard]] virtual bool hasRightLength(PacketView packet) const = 0;
-  virtual void reportLength(PacketView packet, SystemLog& log) const = 0;
+  void take(const TakenPacket& packet, C2KOutput& output) override;
 
  private:
   [[nodiscard]] const RecordTable& table() const { return reading().lists[0].table; }
@@ -42,20 +33,12 @@ class EVDOPilots : public C2KParser {
 
 class EVDOActiveSet : public EVDOPilots {
  public:
-  EVDOActiveSet() : EVDOPilots(kEVDOActiveSetReading) {}
-
- protected:
-  [[nodiscard]] bool hasRightLength(PacketView packet) const override;
-  void reportLength(PacketView packet, SystemLog& log) const override;
+  EVDOActiveSet();
 };
 
 class EVDOFingers : public EVDOPilots {
  public:
-  EVDOFingers() : EVDOPilots(kEVDOFingersReading) {}
-
- protected:
-  [[nodiscard]] bool hasRightLength(PacketView packet) const override;
-  void reportLength(PacketView packet, SystemLog& log) const override;
+  EVDOFingers();
 };
 
 }  // namespace kestro

@@ -33,22 +33,15 @@ constexpr Field kEVDOStatusFields[] = {
 };
 static_assert(isLayout(kEVDOStatusFields));
 
+// A longer packet is none of these either.
+constexpr Requirement kEVDOStatusRequirements[] = {
+    {Requirement::Kind::ExactLength, "Log code 0x1183 is {0} bytes long but should be {1} bytes."}};
+
 }  // namespace
 
 constexpr PacketReading kEVDOStatusReading = {.packet = kEVDOStatusPacket,
                                               .fields = kEVDOStatusFields};
 
-void EVDOStatus::parse(PacketView packet, C2KOutput& output) {
-  if (!hasRightLength(packet)) {
-    output.log.log(LogPriority::Error, "Log code 0x1183 is {} bytes long but should be {} bytes.",
-                   packet.size(), reading().packet.minimumLength);
-    return;
-  }
-  _fields.store(packet, {}, output.lookup);
-}
-
-void EVDOStatus::explain(PacketView packet, const ExplainVisitor& visit) const {
-  if (hasRightLength(packet)) Explainer(reading().packet.name, packet, visit).reading(reading());
-}
+EVDOStatus::EVDOStatus() : FieldParser({kEVDOStatusReading, kEVDOStatusRequirements}) {}
 
 }  // namespace kestro

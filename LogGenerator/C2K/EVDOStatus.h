@@ -12,20 +12,9 @@ inline constexpr PacketKind kEVDOStatusPacket = {
 extern const PacketReading kEVDOStatusReading;
 
 /// Shows where the phone's EV-DO receiver is tuned to and what state it is in.
-class EVDOStatus : public C2KParser {
+class EVDOStatus : public FieldParser {
  public:
-  EVDOStatus() : C2KParser(kEVDOStatusReading), _fields(reading().fields) {}
-
-  void parse(PacketView packet, C2KOutput& output) override;
-  void explain(PacketView packet, const ExplainVisitor& visit) const override;
-
- private:
-  /// A packet that is longer is none of these either.
-  [[nodiscard]] bool hasRightLength(PacketView packet) const noexcept {
-    return packet.size() == reading().packet.minimumLength;
-  }
-
-  StoredFields _fields;
+  EVDOStatus();
 };
 
 }  // namespace kestro

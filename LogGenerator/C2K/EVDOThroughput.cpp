@@ -88,7 +88,7 @@ EVDOThroughput::Keys::Keys(std::string_view stateKey)
       previous(std::string(stateKey).append("2")) {}
 
 EVDOThroughput::EVDOThroughput(const ThroughputLayout& layout)
-    : C2KParser(layout.reading),
+    : C2KParser({layout.reading}),
       _layout(layout),
       _rate(layout.rateName),
       _sequence(layout.sequenceStateKey),
@@ -97,7 +97,7 @@ EVDOThroughput::EVDOThroughput(const ThroughputLayout& layout)
 std::vector<std::string_view> EVDOThroughput::lookupNames() const { return {_layout.rateName}; }
 
 std::int64_t EVDOThroughput::sentIn(PacketView packet) const noexcept {
-  if (!isLongEnough(packet)) return 0;
+  if (packet.size() < reading().packet.minimumLength) return 0;
   std::int64_t sent = 0;
   for (const SentCounter& counter : _layout.counters) {
     // All of them lie in a packet that is long enough: a view of just four bytes need not look.
@@ -118,11 +118,10 @@ void EVDOThroughput::keep(const Sample& sample, Dictionary& state, Dictionary& e
   _sent.newest.set(extraInfo, sample.sent);
 }
 
-void EVDOThroughput::parse(PacketView packet, C2KOutput& output) {
-  if (!isLongEnough(packet, output.log)) return;
+void EVDOThroughput::take(const TakenPacket& packet, C2KOutput& output) {
   const Sample previous = keptIn(output.state);
-  const Sample current{Value::integer(readNumber(_layout.sequenceNumber, packet, {})),
-                       Value::integer(sentIn(packet))};
+  const Sample current{Value::integer(readNumber(_layout.sequenceNumber, packet.bytes, {})),
+                       Value::integer(sentIn(packet.bytes))};
   Dictionary extraInfo = _extraInfo.in(output.state).dictionary();
   if (previous.sequence.isInteger() && previous.sent.isInteger()) {
     storeRate(previous, current, output.lookup);
@@ -147,9 +146,8 @@ void EVDOThroughput::storeRate(const Sample& previous, const Sample& current,
   lookup.store(_rate, text.text());
 }
 
-void EVDOThroughput::explain(PacketView packet, const ExplainVisitor& visit) const {
-  if (!isLongEnough(packet)) return;
-  const Explainer explainer(reading().packet.name, packet, visit);
+void EVDOThroughput::explainTaken(const TakenPacket& packet, const ExplainVisitor& visit) const {
+  const Explainer explainer(reading().packet.name, packet.bytes, visit);
   ExplainedValue rate{.section = reading().packet.name, .key = _layout.rateName};
   rate.sources.push_back(explainer.source(_layout.sequenceNumber, {}));
   for (const SentCounter& counter : _layout.counters) {

@@ -46,12 +46,14 @@ class EVDOThroughput : public C2KParser {
   /// `layout` must be a constant.
   explicit EVDOThroughput(const ThroughputLayout& layout);
 
-  void parse(PacketView packet, C2KOutput& output) override;
-  void explain(PacketView packet, const ExplainVisitor& visit) const override;
   [[nodiscard]] std::vector<std::string_view> lookupNames() const override;
 
   /// What the packet's counters add up to, in bits; 0 for a packet that is too short.
   [[nodiscard]] std::int64_t sentIn(PacketView packet) const noexcept;
+
+ protected:
+  void take(const TakenPacket& packet, C2KOutput& output) override;
+  void explainTaken(const TakenPacket& packet, const ExplainVisitor& visit) const override;
 
  private:
   /// One value of a packet: its keys in the state, and in the extra information as the newest and

@@ -2,7 +2,6 @@
 #include "LogGenerator/C2K/FrameErrorRate.h"
 
 #include "LogGenerator/C2K/C2KState.h"
-#include "LogGenerator/C2K/SubPackets.h"
 
 namespace kestro {
 namespace {
@@ -20,6 +19,13 @@ Value percentText(const NumberFormat& format, float rate) {
 
 /// The average depends on all frames.
 constexpr std::string_view kWithEarlierPackets = "(with the packets before)";
+
+constexpr Requirement kTrafficFrameRequirements[] = {
+    kMinimumLength,
+    {.kind = Requirement::Kind::SubPackets,
+     .line = "Log code 0x119d: missing traffic demod subpacket.",
+     .priority = LogPriority::Warning,
+     .subPackets = {&kTrafficDemodulationId, 1}}};
 
 }  // namespace
 
@@ -52,28 +58,23 @@ constexpr PacketReading kTrafficFrameReading = {.packet = kOneXTrafficFramePacke
 
 std::vector<std::string_view> TrafficFrame::lookupNames() const { return {kFrameErrorRateName}; }
 
-void TrafficFrame::parse(PacketView packet, C2KOutput& output) {
-  if (!isLongEnough(packet, output.log)) return;
-  const auto demodulation = findSubPacket(packet, kTrafficDemodulationId, output.log);
-  if (!demodulation) {
-    output.log.write(LogPriority::Warning, "Log code 0x119d: missing traffic demod subpacket.");
-    return;
-  }
-  const bool isBad = readBits(kIsBadFrame, packet, {.here = *demodulation}) != 0;
+TrafficFrame::TrafficFrame()
+    : C2KParser({kTrafficFrameReading, kTrafficFrameRequirements}), _rate(kFrameErrorRateName) {}
+
+void TrafficFrame::take(const TakenPacket& packet, C2KOutput& output) {
+  const bool isBad = readBits(kIsBadFrame, packet.bytes, {.here = packet.subPackets[0]}) != 0;
   const auto rate = FrameErrorRate::after(FrameErrorRate::ofState(output.state), isBad);
   rate.keepIn(output.state);
   output.lookup.store(_rate, rate.text());
 }
 
-void TrafficFrame::explain(PacketView packet, const ExplainVisitor& visit) const {
-  const auto demodulation = searchSubPacket(packet, kTrafficDemodulationId).start;
-  if (!isLongEnough(packet) || !demodulation) return;
+void TrafficFrame::explainTaken(const TakenPacket& packet, const ExplainVisitor& visit) const {
   const std::string_view section = reading().packet.name;
-  visit(
-      {.section = section,
-       .key = kFrameErrorRateName,
-       .sources = {Explainer(section, packet, visit).source(kIsBadFrame, {.here = *demodulation})},
-       .text = kWithEarlierPackets});
+  const Explainer explainer(section, packet.bytes, visit);
+  visit({.section = section,
+         .key = kFrameErrorRateName,
+         .sources = {explainer.source(kIsBadFrame, {.here = packet.subPackets[0]})},
+         .text = kWithEarlierPackets});
 }
 
 }  // namespace kestro

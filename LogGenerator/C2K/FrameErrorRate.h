@@ -45,11 +45,13 @@ inline constexpr Place kIsBadFrame = u8(24);  ///< 0 for a good frame
 
 class TrafficFrame : public C2KParser {
  public:
-  TrafficFrame() : C2KParser(kTrafficFrameReading), _rate(kFrameErrorRateName) {}
+  TrafficFrame();
 
-  void parse(PacketView packet, C2KOutput& output) override;
-  void explain(PacketView packet, const ExplainVisitor& visit) const override;
   [[nodiscard]] std::vector<std::string_view> lookupNames() const override;
+
+ protected:
+  void take(const TakenPacket& packet, C2KOutput& output) override;
+  void explainTaken(const TakenPacket& packet, const ExplainVisitor& visit) const override;
 
  private:
   LookupName _rate;

@@ -47,6 +47,21 @@ constexpr std::string_view kActiveSetName = "k1xActiveSetInfo";
 /// What was in the traffic that ended is not in this packet.
 constexpr std::string_view kFromEarlierPackets = "(from the packets before)";
 
+constexpr std::uint8_t kOneXSubPackets[] = {kOneXStateId, kOneXRadioId, kOneXActiveSetId,
+                                            kOneXFingersId};
+constexpr Requirement kOneXStatusRequirements[] = {
+    kMinimumLength,
+    {.kind = Requirement::Kind::SubPackets,
+     .line = "Log code 0x119c: missing subpacket (ss={},rf={},ai={},fi={}).",
+     .priority = LogPriority::Warning,
+     .subPackets = kOneXSubPackets}};
+
+/// Where the fields of the radio sub-packet lie, with the state sub-packet as its twin.
+RecordPosition positionIn(const TakenPacket& packet) {
+  return {.here = packet.subPackets[1], .twin = packet.subPackets[0]};
+}
+std::size_t activeSetIn(const TakenPacket& packet) { return packet.subPackets[2]; }
+
 }  // namespace
 
 constexpr PacketReading kOneXStatusReading = {.packet = kOneXStatusPacket};
@@ -54,7 +69,7 @@ constexpr PacketReading kOneXStatusReading = {.packet = kOneXStatusPacket};
 constinit const std::span<const Field> kOneXStatusFields = kOneXFields;
 
 OneXStatus::OneXStatus()
-    : C2KParser(kOneXStatusReading),
+    : C2KParser({kOneXStatusReading, kOneXStatusRequirements}),
       _fields(kOneXFields),
       _activeSet(kActiveSetName),
       _errorRate(kFrameErrorRateName) {}
@@ -67,23 +82,11 @@ std::vector<std::string_view> OneXStatus::lookupNames() const {
   return names;
 }
 
-void OneXStatus::parse(PacketView packet, C2KOutput& output) {
-  if (!isLongEnough(packet, output.log)) return;
-  const SubPackets found{findSubPacket(packet, kOneXStateId, output.log),
-                         findSubPacket(packet, kOneXRadioId, output.log),
-                         findSubPacket(packet, kOneXActiveSetId, output.log),
-                         findSubPacket(packet, kOneXFingersId, output.log)};
-  if (!found.areComplete()) {
-    output.log.log(LogPriority::Warning,
-                   "Log code 0x119c: missing subpacket (ss={:d},rf={:d},ai={:d},fi={:d}).",
-                   found.state.has_value(), found.radio.has_value(), found.activeSet.has_value(),
-                   found.fingers.has_value());
-    return;
-  }
-  _fields.store(packet, found.position(), output.lookup);
-  OneXActiveSet(packet, *found.activeSet).addTo(_pilots);
+void OneXStatus::take(const TakenPacket& packet, C2KOutput& output) {
+  _fields.store(packet.bytes, positionIn(packet), output.lookup);
+  OneXActiveSet(packet.bytes, activeSetIn(packet)).addTo(_pilots);
   _pilots.store(_activeSet, output.lookup);
-  if (!holds(kInTraffic, packet, found.position())) storeOldErrorRate(output);
+  if (!holds(kInTraffic, packet.bytes, positionIn(packet))) storeOldErrorRate(output);
 }
 
 void OneXStatus::storeOldErrorRate(C2KOutput& output) {
@@ -93,21 +96,15 @@ void OneXStatus::storeOldErrorRate(C2KOutput& output) {
   FrameErrorRate::removeFrom(output.state);
 }
 
-void OneXStatus::explain(PacketView packet, const ExplainVisitor& visit) const {
-  if (!isLongEnough(packet)) return;
-  const SubPackets found{searchSubPacket(packet, kOneXStateId).start,
-                         searchSubPacket(packet, kOneXRadioId).start,
-                         searchSubPacket(packet, kOneXActiveSetId).start,
-                         searchSubPacket(packet, kOneXFingersId).start};
-  if (!found.areComplete()) return;
+void OneXStatus::explainTaken(const TakenPacket& packet, const ExplainVisitor& visit) const {
   const std::string_view section = reading().packet.name;
-  const Explainer explainer(section, packet, visit);
-  explainer.fields(kOneXFields, found.position());
-  OneXActiveSet(packet, *found.activeSet).explain(section, kActiveSetName, visit);
-  if (holds(kInTraffic, packet, found.position())) return;
+  const Explainer explainer(section, packet.bytes, visit);
+  explainer.fields(kOneXFields, positionIn(packet));
+  OneXActiveSet(packet.bytes, activeSetIn(packet)).explain(section, kActiveSetName, visit);
+  if (holds(kInTraffic, packet.bytes, positionIn(packet))) return;
   visit({.section = section,
          .key = kFrameErrorRateName,
-         .sources = {explainer.source(kOneXState, found.position())},
+         .sources = {explainer.source(kOneXState, positionIn(packet))},
          .text = kFromEarlierPackets});
 }
 

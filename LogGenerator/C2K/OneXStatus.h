@@ -3,12 +3,10 @@
 #pragma once
 
 #include <cstdint>
-#include <optional>
 #include <span>
 
 #include "LogGenerator/C2K/C2KParser.h"
 #include "LogGenerator/C2K/PilotList.h"
-#include "LogGenerator/C2K/SubPackets.h"
 
 namespace kestro {
 
@@ -32,23 +30,13 @@ class OneXStatus : public C2KParser {
  public:
   OneXStatus();
 
-  void parse(PacketView packet, C2KOutput& output) override;
-  void explain(PacketView packet, const ExplainVisitor& visit) const override;
   [[nodiscard]] std::vector<std::string_view> lookupNames() const override;
 
+ protected:
+  void take(const TakenPacket& packet, C2KOutput& output) override;
+  void explainTaken(const TakenPacket& packet, const ExplainVisitor& visit) const override;
+
  private:
-  /// Where the sub-packets begin, as far as they were found.
-  struct SubPackets {
-    std::optional<std::size_t> state;
-    std::optional<std::size_t> radio;
-    std::optional<std::size_t> activeSet;
-    std::optional<std::size_t> fingers;
-
-    [[nodiscard]] bool areComplete() const { return state && radio && activeSet && fingers; }
-    /// For `kOneXStatusFields`.
-    [[nodiscard]] RecordPosition position() const { return {.here = *radio, .twin = *state}; }
-  };
-
   void storeOldErrorRate(C2KOutput& output);
 
   StoredFields _fields;

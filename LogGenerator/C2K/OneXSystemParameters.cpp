@@ -21,7 +21,6 @@ constexpr NamedValue kRoamingIndicators[] = {
 };
 
 constexpr Place kVersion = u8(13);
-constexpr std::int64_t kFirstKnownVersion = 2;
 
 constexpr Place kSystemType = u32(46).shared();
 constexpr std::int64_t kCDMA2000System = 2;
@@ -47,27 +46,18 @@ constexpr Field kSystemParametersFields[] = {
 };
 static_assert(isLayout(kSystemParametersFields));
 
-std::int64_t versionOf(PacketView packet) { return readNumber(kVersion, packet, {}); }
+constexpr Requirement kSystemParametersRequirements[] = {
+    kMinimumLength,
+    {.kind = Requirement::Kind::Number,
+     .line = "Log code 0x134f has version={}; only version 2 or higher expected; dropping.",
+     .condition = between(kVersion, 2, 255)}};
 
 }  // namespace
 
 constexpr PacketReading kOneXSystemParametersReading = {.packet = kOneXSystemParametersPacket,
                                                         .fields = kSystemParametersFields};
 
-void OneXSystemParameters::parse(PacketView packet, C2KOutput& output) {
-  if (!isLongEnough(packet, output.log)) return;
-  if (versionOf(packet) < kFirstKnownVersion) {
-    output.log.log(LogPriority::Error,
-                   "Log code 0x134f has version={}; only version 2 or higher expected; dropping.",
-                   versionOf(packet));
-    return;
-  }
-  _fields.store(packet, {}, output.lookup);
-}
-
-void OneXSystemParameters::explain(PacketView packet, const ExplainVisitor& visit) const {
-  if (!isLongEnough(packet) || versionOf(packet) < kFirstKnownVersion) return;
-  Explainer(reading().packet.name, packet, visit).reading(reading());
-}
+OneXSystemParameters::OneXSystemParameters()
+    : FieldParser({kOneXSystemParametersReading, kSystemParametersRequirements}) {}
 
 }  // namespace kestro

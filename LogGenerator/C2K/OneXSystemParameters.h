@@ -13,15 +13,9 @@ extern const PacketReading kOneXSystemParametersReading;
 
 /// Shows which system and base station serve the phone, and whether it roams. Packets of an early
 /// version are rejected.
-class OneXSystemParameters : public C2KParser {
+class OneXSystemParameters : public FieldParser {
  public:
-  OneXSystemParameters() : C2KParser(kOneXSystemParametersReading), _fields(reading().fields) {}
-
-  void parse(PacketView packet, C2KOutput& output) override;
-  void explain(PacketView packet, const ExplainVisitor& visit) const override;
-
- private:
-  StoredFields _fields;
+  OneXSystemParameters();
 };
 
 }  // namespace kestro

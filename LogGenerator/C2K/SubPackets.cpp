@@ -22,13 +22,4 @@ SubPacketSearch searchSubPacket(PacketView packet, std::uint8_t id) {
   return {};
 }
 
-std::optional<std::size_t> findSubPacket(PacketView packet, std::uint8_t id, SystemLog& log) {
-  const SubPacketSearch search = searchSubPacket(packet, id);
-  if (search.endedAtBadSize) {
-    log.log(LogPriority::Error, "Log code error in subpkt#{}: bad size ({}).", search.badIndex,
-            search.badSize);
-  }
-  return search.start;
-}
-
 }  // namespace kestro

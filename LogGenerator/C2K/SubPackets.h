@@ -8,7 +8,6 @@
 
 #include "LogGenerator/Packets/Field.h"
 #include "LogGenerator/Packets/PacketView.h"
-#include "Platform/SystemLog.h"
 
 namespace kestro {
 
@@ -34,9 +33,5 @@ struct SubPacketSearch {
 /// the packet's end. Takes at most as many steps as a packet can have sub-packets, 255, whatever
 /// their sizes.
 [[nodiscard]] SubPacketSearch searchSubPacket(PacketView packet, std::uint8_t id);
-
-/// The start of that sub-packet, if there is one. A bad size leaves a line in `log`.
-[[nodiscard]] std::optional<std::size_t> findSubPacket(PacketView packet, std::uint8_t id,
-                                                       SystemLog& log);
 
 }  // namespace kestro

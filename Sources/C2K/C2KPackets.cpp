@@ -11,6 +11,7 @@
 #include "LogGenerator/C2K/OneXStatus.h"
 #include "LogGenerator/C2K/OneXSystemParameters.h"
 #include "LogGenerator/C2K/PilotList.h"
+#include "LogGenerator/C2K/SubPackets.h"
 #include "Sources/ReadingWriter.h"
 
 namespace kestro {

@@ -55,6 +55,17 @@ TEST_P(C2KEveryLengthTest, ExplainsEveryPrefixWithinThePacketOrMarksIt) {
   }
 }
 
+TEST_P(C2KEveryLengthTest, ExplainsAPrefixUnlessTheLogSaysWhyItIsRefused) {
+  const Bytes whole = message();
+  for (std::size_t length = kPacketHeaderSize; length <= whole.size(); ++length) {
+    const ByteView prefix = ByteView(whole).first(length);
+    receive(prefix);
+    std::size_t count = 0;
+    generator->explainMessage(prefix, [&](const ExplainedValue&) { ++count; });
+    ASSERT_EQ(takeLines().empty(), count != 0) << length;
+  }
+}
+
 TEST_P(C2KEveryLengthTest, TakesEveryByteAtItsHighest) {
   Bytes whole = message();
   for (std::size_t i = 13; i < whole.size(); ++i) {
