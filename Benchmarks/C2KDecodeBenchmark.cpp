@@ -38,7 +38,7 @@ class Display {
   /// An empty display.
   void startAfresh() {
     _state = Dictionary();
-    _generator = C2KLogGenerator::generator(_platform);
+    _generator = C2KLogGenerator::generator(generatorServices(_platform));
     _generator->getDisplayFromState(_state);
   }
 

@@ -107,7 +107,7 @@ class LiveDisplay {
   /// An empty display.
   void startAfresh() {
     _state = Dictionary();
-    _generator = Generator::generator(_platform);
+    _generator = Generator::generator(generatorServices(_platform));
     _generator->getDisplayFromState(_state);
     static_cast<void>(_platform.systemLog().take());
   }

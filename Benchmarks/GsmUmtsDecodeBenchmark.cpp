@@ -245,7 +245,7 @@ void decodeNothing(benchmark::State& state, const std::string& section, LogCode 
   const auto coding = createPropertyListCoding();
   VirtualPlatform platform(*coding);
   platform.systemLog().setThreshold(LogPriority::Error);
-  const Ondrel_GSMClassIndex index(platform);
+  const Ondrel_GSMClassIndex index(generatorServices(platform));
   Base& decoder = *index.getClass(section);
   const Value list = Array();
   if (decoder.sectionKind() == SectionKind::List) decoder.updateSectionRef(list);

@@ -34,7 +34,9 @@ class GeneratorChannel {
   void addTemplates() { testing::addTemplates(_platform); }
 
   /// A generator that goes on with the state, as after a reconnection.
-  void start() { _generator = LogGenerator::generatorFromTechnology(_platform, _technology); }
+  void start() {
+    _generator = LogGenerator::generatorFromTechnology(generatorServices(_platform), _technology);
+  }
 
   /// Hands a message over. It may raise what messages are known to raise, and nothing else; false
   /// when it does.

@@ -50,7 +50,7 @@ class Recording {
   ReplayOptions _options;
   ReplayClock _clock{_channel.platform().clock()};
   std::unique_ptr<LogGenerator> _generator =
-      LogGenerator::generatorFromTechnology(_channel.platform(), _technology);
+      LogGenerator::generatorFromTechnology(generatorServices(_channel.platform()), _technology);
   Replay _replay{*_generator, _clock, _options,
                  [this](const ReplayRefresh& refresh) { didRefresh(refresh); }};
   Moment _time{std::chrono::seconds(1'330'862'709)};

@@ -6,17 +6,17 @@
 
 namespace kestro {
 
-Value loadTemplate(Platform& platform, std::string_view name) {
-  const auto contents = platform.bundle().resource(name, kTemplateExtension);
+Value loadTemplate(const GeneratorServices& services, std::string_view name) {
+  const auto contents = services.bundle.resource(name, kTemplateExtension);
   if (!contents) return {};
-  Result<Value> parsed = platform.propertyListCoding().parse(*contents);
+  Result<Value> parsed = services.propertyListCoding.parse(*contents);
   return parsed && parsed->isDictionary() ? *parsed : Value();
 }
 
-Value templateOfState(Platform& platform, std::string_view name, Dictionary& state) {
+Value templateOfState(const GeneratorServices& services, std::string_view name, Dictionary& state) {
   Value known = state[kStateTemplate];
   if (!known.isNull()) return known;
-  Value loaded = loadTemplate(platform, name);
+  Value loaded = loadTemplate(services, name);
   if (!loaded.isNull()) state.set(kStateTemplate, loaded);
   return loaded;
 }

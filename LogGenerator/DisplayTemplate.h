@@ -4,7 +4,7 @@
 
 #include <string_view>
 
-#include "Platform/Platform.h"
+#include "LogGenerator/GeneratorServices.h"
 #include "Platform/PropertyList.h"
 
 namespace kestro {
@@ -17,10 +17,11 @@ inline constexpr std::string_view kTemplateExtension = "plist";
 
 /// The dictionary in the resource `name`, which has the extension above; null when there is no such
 /// resource, or it does not parse, or it holds something else.
-[[nodiscard]] Value loadTemplate(Platform& platform, std::string_view name);
+[[nodiscard]] Value loadTemplate(const GeneratorServices& services, std::string_view name);
 
 /// The state's template, whatever it is. When it has none, the one that `loadTemplate` finds, which
 /// the state then keeps; null when there is none either.
-[[nodiscard]] Value templateOfState(Platform& platform, std::string_view name, Dictionary& state);
+[[nodiscard]] Value templateOfState(const GeneratorServices& services, std::string_view name,
+                                    Dictionary& state);
 
 }  // namespace kestro

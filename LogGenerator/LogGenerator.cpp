@@ -20,12 +20,12 @@ namespace {
 
 struct TechnologyRow {
   std::string_view technology;
-  std::unique_ptr<LogGenerator> (*generator)(Platform& platform);
+  std::unique_ptr<LogGenerator> (*generator)(const GeneratorServices& services);
 };
 
 template <class Generator>
-std::unique_ptr<LogGenerator> makeGenerator(Platform& platform) {
-  return Generator::generator(platform);
+std::unique_ptr<LogGenerator> makeGenerator(const GeneratorServices& services) {
+  return Generator::generator(services);
 }
 
 /// Tested in this order; a technology whose generator does not exist has no row.
@@ -60,7 +60,7 @@ Dictionary makeHistoryEntry(const Dictionary& state, const Clock& clock) {
 }  // namespace
 
 void LogGenerator::init() {
-  _platform.systemLog().log(LogPriority::Warning, "Creating Log object: {}", addressText(this));
+  _services.systemLog.log(LogPriority::Warning, "Creating Log object: {}", addressText(this));
 }
 
 std::span<const std::string_view> LogGenerator::stateKeys() const {
@@ -74,10 +74,10 @@ void LogGenerator::catalogue(const CatalogueVisitor& /*visit*/) const {}
 
 std::span<const std::string_view> LogGenerator::technologies() { return kTechnologyNames; }
 
-std::unique_ptr<LogGenerator> LogGenerator::generatorFromTechnology(Platform& platform,
-                                                                    std::string_view technology) {
+std::unique_ptr<LogGenerator> LogGenerator::generatorFromTechnology(
+    const GeneratorServices& services, std::string_view technology) {
   const auto row = std::ranges::find(kTechnologies, technology, &TechnologyRow::technology);
-  return row == kTechnologies.end() ? nullptr : row->generator(platform);
+  return row == kTechnologies.end() ? nullptr : row->generator(services);
 }
 
 void LogGenerator::updateHistoryInState(Dictionary& state, const Clock& clock) {

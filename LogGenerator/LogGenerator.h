@@ -7,10 +7,10 @@
 #include <span>
 #include <string_view>
 
+#include "LogGenerator/GeneratorServices.h"
 #include "LogGenerator/Packets/Catalogue.h"
 #include "LogGenerator/Packets/Explain.h"
 #include "Platform/Bytes.h"
-#include "Platform/Platform.h"
 #include "Platform/PropertyList.h"
 
 namespace kestro {
@@ -33,7 +33,7 @@ inline constexpr std::size_t kMaximumHistoryEntries = 5;
 /// The generator state is one dictionary, owned by the model and handed to every operation; it
 /// outlives generators. A generator writes its raw data under "DisplayState", the display object
 /// (nested dictionaries, arrays and texts) under "Display", and extra information under
-/// "ExtraInfo". Main thread only. The platform must outlive the generator.
+/// "ExtraInfo". Main thread only. What its services refer to must outlive the generator.
 class LogGenerator {
  public:
   virtual ~LogGenerator() = default;
@@ -75,7 +75,7 @@ class LogGenerator {
   /// A new generator for the technology that the telephony server reports; null when none speaks
   /// it.
   [[nodiscard]] static std::unique_ptr<LogGenerator> generatorFromTechnology(
-      Platform& platform, std::string_view technology);
+      const GeneratorServices& services, std::string_view technology);
 
   /// Appends one entry to the state's history, dropping the oldest so that at most five remain. The
   /// entry holds deep copies: it keeps the display as it is now. It ends before the first of
@@ -83,20 +83,20 @@ class LogGenerator {
   static void updateHistoryInState(Dictionary& state, const Clock& clock);
 
  protected:
-  explicit LogGenerator(Platform& platform) noexcept : _platform(platform) {}
+  explicit LogGenerator(const GeneratorServices& services) noexcept : _services(services) {}
 
   /// The first step of every generator's construction: leaves a line with the new object's address
   /// in the system log.
   void init();
 
-  [[nodiscard]] Platform& platform() const noexcept { return _platform; }
+  [[nodiscard]] const GeneratorServices& services() const noexcept { return _services; }
 
   /// A new array with the entries of the state's history, the entries themselves shared; empty when
   /// there is no history.
   [[nodiscard]] static Array historyOfState(const Dictionary& state);
 
  private:
-  Platform& _platform;
+  GeneratorServices _services;
 };
 
 }  // namespace kestro

@@ -51,7 +51,7 @@ void KestroModel::technologyAnswered(std::string_view technology) {
 }
 
 void KestroModel::setGenerator(std::string_view technology) {
-  _logGenerator = _generatorFromTechnology(_platform, technology);
+  _logGenerator = _generatorFromTechnology(generatorServices(_platform), technology);
   if (!_logGenerator) return;
   if (technology != _technology) {
     // A display of another technology would be neither shown right nor ever updated again.

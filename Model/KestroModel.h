@@ -15,6 +15,7 @@
 #include "Model/KestroModelNode.h"
 #include "Model/LogChannelClient.h"
 #include "Platform/MainQueue.h"
+#include "Platform/Platform.h"
 
 namespace kestro {
 
@@ -26,8 +27,8 @@ inline constexpr std::chrono::seconds kDisplayUpdateInterval{2};
 class KestroModel : public std::enable_shared_from_this<KestroModel>, private LogChannelUser {
  public:
   /// Makes the generator for a technology; null when there is none.
-  using GeneratorFactory =
-      std::function<std::unique_ptr<LogGenerator>(Platform& platform, std::string_view technology)>;
+  using GeneratorFactory = std::function<std::unique_ptr<LogGenerator>(
+      const GeneratorServices& services, std::string_view technology)>;
 
   /// A model with an empty state and no ports. `updateViewControllerFromModel` is called on the
   /// main queue when the display must be rebuilt; it may outlive the model in a queued call.

@@ -9,7 +9,7 @@
 #include "CommandLine/Commands/Command.h"
 #include "CommandLine/ExitStatus.h"
 #include "CommandLine/Formats/CodesFormats.h"
-#include "CommandLine/OfflinePlatform.h"
+#include "CommandLine/OfflineServices.h"
 #include "CommandLine/Output.h"
 #include "Options/ProgramOptions.h"
 
@@ -25,11 +25,11 @@ struct CodesOptions {
 };
 
 int runCodes(const CodesOptions& options) {
-  OfflinePlatform platform;
+  OfflineServices services;
   std::vector<TechnologyCodes> technologies;
   for (const std::string_view technology : LogGenerator::technologies()) {
     if (!options.technology.empty() && options.technology != technology) continue;
-    technologies.push_back(codesOfTechnology(platform, technology));
+    technologies.push_back(codesOfTechnology(services.forGenerator(), technology));
   }
   const auto format = std::ranges::find(codesFormats(), options.format, &CodesFormat::name);
   Output output = Output::standardOutput();

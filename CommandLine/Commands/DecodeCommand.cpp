@@ -11,7 +11,7 @@
 #include "CommandLine/Commands/RecordingFeed.h"
 #include "CommandLine/ExitStatus.h"
 #include "CommandLine/Formats/DecodeWriter.h"
-#include "CommandLine/OfflinePlatform.h"
+#include "CommandLine/OfflineServices.h"
 #include "CommandLine/Output.h"
 #include "Model/Replay.h"
 #include "Recordings/PcapReader.h"
@@ -36,7 +36,7 @@ class Decoder {
   Decoder(const DecodeOptions& options, PcapReader reader, std::optional<Output> logFile)
       : _options(options),
         _feed(options.capture, std::move(reader)),
-        _platform(std::move(logFile)) {}
+        _services(std::move(logFile)) {}
 
   int run() {
     // The generator is gone before the log is finished: it leaves lines when it goes.
@@ -46,10 +46,10 @@ class Decoder {
  private:
   /// Writes the capture's displays; false when nothing could be done.
   [[nodiscard]] bool decode() {
-    const auto generator = _feed.makeGenerator(_platform);
+    const auto generator = _feed.makeGenerator(_services.forGenerator());
     if (!generator) return false;
     const std::unique_ptr<DecodeWriter> writer = makeWriter();
-    Replay replay(*generator, _platform.clock(),
+    Replay replay(*generator, _services.clock(),
                   {.refreshInterval = durationOfSeconds(_options.refreshSeconds)},
                   [&](const ReplayRefresh& refresh) { writer->refreshed(refresh); });
     writer->begin();
@@ -75,7 +75,7 @@ class Decoder {
       complain(_output.failureMessage());
       return kExitNothingDone;
     }
-    if (const auto logged = _platform.finishLog(); !logged) {
+    if (const auto logged = _services.finishLog(); !logged) {
       complain(logged.error().message);
       return kExitNothingDone;
     }
@@ -84,7 +84,7 @@ class Decoder {
 
   const DecodeOptions& _options;
   RecordingFeed _feed;
-  OfflinePlatform _platform;
+  OfflineServices _services;
   Output _output = Output::standardOutput();
 };
 

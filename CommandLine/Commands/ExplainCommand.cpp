@@ -15,7 +15,7 @@
 #include "CommandLine/Formats/ExplainWriter.h"
 #include "CommandLine/Formats/LayoutText.h"
 #include "CommandLine/Formats/PacketNames.h"
-#include "CommandLine/OfflinePlatform.h"
+#include "CommandLine/OfflineServices.h"
 #include "CommandLine/Output.h"
 #include "LogGenerator/Packets/PacketHeader.h"
 #include "Recordings/PcapReader.h"
@@ -53,7 +53,7 @@ class Explanation {
       : _options(options), _feed(options.capture, std::move(reader)) {}
 
   int run() {
-    _generator = _feed.makeGenerator(_platform);
+    _generator = _feed.makeGenerator(_services.forGenerator());
     if (!_generator) return kExitNothingDone;
     const PacketNames names(*_generator);
     if (names.isEmpty()) {
@@ -131,7 +131,7 @@ class Explanation {
 
   const ExplainOptions& _options;
   RecordingFeed _feed;
-  OfflinePlatform _platform;
+  OfflineServices _services;
   Output _output = Output::standardOutput();
   std::unique_ptr<LogGenerator> _generator;
   const PacketNames* _names = nullptr;

@@ -7,8 +7,9 @@
 
 namespace kestro {
 
-std::unique_ptr<LogGenerator> RecordingFeed::makeGenerator(Platform& platform) const {
-  auto generator = LogGenerator::generatorFromTechnology(platform, technology());
+std::unique_ptr<LogGenerator> RecordingFeed::makeGenerator(
+    const GeneratorServices& services) const {
+  auto generator = LogGenerator::generatorFromTechnology(services, technology());
   if (!generator) {
     complain(fmt::format("{}: nothing here decodes the technology {}", _path, technology()));
   }

@@ -25,7 +25,8 @@ class RecordingFeed {
 
   /// The generator for the capture's technology. Null, with a line that says so, when there is
   /// none.
-  [[nodiscard]] std::unique_ptr<LogGenerator> makeGenerator(Platform& platform) const;
+  [[nodiscard]] std::unique_ptr<LogGenerator> makeGenerator(
+      const GeneratorServices& services) const;
 
   /// What is done with a whole message; an error is named with the message's number.
   using Handler = std::function<Result<void>(const RecordedMessage&)>;

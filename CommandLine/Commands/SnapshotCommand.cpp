@@ -15,7 +15,7 @@
 #include "CommandLine/ExitStatus.h"
 #include "CommandLine/Formats/SnapshotText.h"
 #include "CommandLine/Input.h"
-#include "CommandLine/OfflinePlatform.h"
+#include "CommandLine/OfflineServices.h"
 #include "CommandLine/Output.h"
 #include "CommandLine/ReplaceFile.h"
 #include "LogGenerator/Ondrel/Reframing.h"
@@ -92,17 +92,17 @@ int runSave(const SnapshotOptions& options) {
   auto reader = PcapReader::open(options.input);
   if (!reader) return nothingDone(reader.error().message);
   RecordingFeed feed(options.input, *std::move(reader));
-  OfflinePlatform platform;
-  platform.clock().setNow(createSystemClock()->now());  // for a capture without a message
-  const auto generator = feed.makeGenerator(platform);
+  OfflineServices services;
+  services.clock().setNow(createSystemClock()->now());  // for a capture without a message
+  const auto generator = feed.makeGenerator(services.forGenerator());
   if (!generator) return kExitNothingDone;
-  Replay replay(*generator, platform.clock(), {}, [](const ReplayRefresh&) {});
+  Replay replay(*generator, services.clock(), {}, [](const ReplayRefresh&) {});
   while (feed.feedNext(replay)) {
   }
   if (feed.status() == kExitNothingDone) return kExitNothingDone;
   replay.finish();
-  const Snapshot snapshot(platform.clock(), generator->getSaveContentsFromState(replay.state()));
-  const auto file = snapshot.file(platform.propertyListCoding(), options.description);
+  const Snapshot snapshot(services.clock(), generator->getSaveContentsFromState(replay.state()));
+  const auto file = snapshot.file(services.propertyListCoding(), options.description);
   if (!file) return nothingDone(fmt::format("{}: {}", options.input, file.error().message));
   return writeFile(options, *file, feed.status());
 }

@@ -41,8 +41,8 @@ std::vector<ListedCode> listCodes(const LogGenerator& generator) {
   return codes;
 }
 
-TechnologyCodes codesOfTechnology(Platform& platform, std::string_view technology) {
-  TechnologyCodes result{.generator = LogGenerator::generatorFromTechnology(platform, technology),
+TechnologyCodes codesOfTechnology(const GeneratorServices& services, std::string_view technology) {
+  TechnologyCodes result{.generator = LogGenerator::generatorFromTechnology(services, technology),
                          .technology = technology,
                          .families = {}};
   for (ListedCode& code : listCodes(*result.generator)) {

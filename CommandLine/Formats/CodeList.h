@@ -41,6 +41,7 @@ inline constexpr std::string_view kExtraPacketsFamily = "Extra Packets";
 
 /// The codes of a technology that a generator speaks. A code belongs to the group of the first
 /// section that takes a key from it.
-[[nodiscard]] TechnologyCodes codesOfTechnology(Platform& platform, std::string_view technology);
+[[nodiscard]] TechnologyCodes codesOfTechnology(const GeneratorServices& services,
+                                                std::string_view technology);
 
 }  // namespace kestro

@@ -96,12 +96,12 @@ class CodeEntries {
 
 }  // namespace
 
-std::unique_ptr<C2KLogGenerator> C2KLogGenerator::generator(Platform& platform) {
-  return std::make_unique<C2KLogGenerator>(platform);
+std::unique_ptr<C2KLogGenerator> C2KLogGenerator::generator(const GeneratorServices& services) {
+  return std::make_unique<C2KLogGenerator>(services);
 }
 
-C2KLogGenerator::C2KLogGenerator(Platform& platform)
-    : OndrelLogGenerator(platform), _parsers(makeParsers()) {
+C2KLogGenerator::C2KLogGenerator(const GeneratorServices& services)
+    : OndrelLogGenerator(services), _parsers(makeParsers()) {
   init();
 }
 
@@ -137,12 +137,12 @@ void C2KLogGenerator::updateFromLogUsingLookupUsingState(ByteView message, const
   const PacketView packet(packetOfMessage(message));
   if (logTypeOf(packet) != kBasebandLogType) {
     // The packet is not dropped, whatever the line says.
-    platform().systemLog().log(LogPriority::Error, "Invalid log type: {:x}. Dropping.",
-                               logTypeOf(packet));
+    services().systemLog.log(LogPriority::Error, "Invalid log type: {:x}. Dropping.",
+                             logTypeOf(packet));
   }
   C2KParser* parser = parserOf(logCodeOf(packet));
   if (parser == nullptr) return;
-  C2KOutput output{state, LookupTable(lookup), platform().systemLog()};
+  C2KOutput output{state, LookupTable(lookup), services().systemLog};
   parser->parse(packet, output);
   collect(packet.bytes());
 }
@@ -168,16 +168,16 @@ void C2KLogGenerator::catalogue(const CatalogueVisitor& visit) const {
 Value C2KLogGenerator::generateLogUsingState(Dictionary& state) {
   Value display = getDisplayFromState(state);
   handOverCollected(state);
-  updateHistoryInState(state, platform().clock());
+  updateHistoryInState(state, services().clock);
   return display;
 }
 
 Value C2KLogGenerator::getDisplayFromState(Dictionary& state) {
   const Value& known = _displayKey.in(state);
   if (!known.isNull()) return known;
-  const Value displayTemplate = templateOfState(platform(), kTemplateName, state);
+  const Value displayTemplate = templateOfState(services(), kTemplateName, state);
   if (displayTemplate.isNull()) {
-    platform().systemLog().write(LogPriority::Error, "Cannot load C2K template for display");
+    services().systemLog.write(LogPriority::Error, "Cannot load C2K template for display");
     return {};
   }
   Dictionary display;
@@ -205,11 +205,11 @@ void C2KLogGenerator::processTemplateStoreDisplayIntoDictStoreLookupIntoDict(
       table.addTarget(value, key, display);
     }
   }
-  platform().systemLog().write(LogPriority::Warning, "Processing the template");
+  services().systemLog.write(LogPriority::Warning, "Processing the template");
 }
 
 const TemplatePlaces& C2KLogGenerator::places() const {
-  if (!_places) _places.emplace(loadTemplate(platform(), kTemplateName).dictionary());
+  if (!_places) _places.emplace(loadTemplate(services(), kTemplateName).dictionary());
   return *_places;
 }
 

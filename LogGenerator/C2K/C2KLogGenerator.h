@@ -19,9 +19,10 @@ namespace kestro {
 /// a lookup table leads from the name to all leaves that do.
 class C2KLogGenerator : public OndrelLogGenerator {
  public:
-  [[nodiscard]] static std::unique_ptr<C2KLogGenerator> generator(Platform& platform);
+  [[nodiscard]] static std::unique_ptr<C2KLogGenerator> generator(
+      const GeneratorServices& services);
 
-  explicit C2KLogGenerator(Platform& platform);
+  explicit C2KLogGenerator(const GeneratorServices& services);
 
   /// Makes sure that the display exists and takes the message's packet.
   void updateStateWithData(Dictionary& state, ByteView data) override;

@@ -44,8 +44,8 @@ using GSMServingCell = CellMonitorTableDecoder<kGSMServingCellSection>;
 /// or the GSM neighbours of the cell monitor: whichever came last.
 class NeighboringCells : public CellMonitorDecoder {
  public:
-  explicit NeighboringCells(Platform& platform)
-      : CellMonitorDecoder(platform, kNeighboringCellsSection) {}
+  explicit NeighboringCells(const GeneratorServices& services)
+      : CellMonitorDecoder(services, kNeighboringCellsSection) {}
 
  protected:
   /// Notes the rows of a BSIC list.

@@ -5,7 +5,7 @@
 
 namespace kestro {
 Ondrel_GSMClassIndex::~Ondrel_GSMClassIndex() {
-  platform().standardOutput().writeLine("Deallocing Ondrel_GSMClassIndex");
+  services().standardOutput.writeLine("Deallocing Ondrel_GSMClassIndex");
 }
 
 }  // namespace kestro

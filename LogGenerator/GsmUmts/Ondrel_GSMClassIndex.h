@@ -18,7 +18,7 @@ namespace kestro {
 /// Owns one decoder for each section, made in the order of the fields.
 class Ondrel_GSMClassIndex : public ClassIndex {
  public:
-  explicit Ondrel_GSMClassIndex(Platform& platform) : ClassIndex(platform) {}
+  explicit Ondrel_GSMClassIndex(const GeneratorServices& services) : ClassIndex(services) {}
   /// Leaves a line on the standard output.
   ~Ondrel_GSMClassIndex() override;
 

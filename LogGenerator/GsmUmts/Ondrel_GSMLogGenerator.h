@@ -11,9 +11,10 @@ namespace kestro {
 /// The template-driven generator with the GSM/UMTS decoders and the template "Ondrel_GSM".
 class Ondrel_GSMLogGenerator : public OndrelLogGenerator2 {
  public:
-  [[nodiscard]] static std::unique_ptr<Ondrel_GSMLogGenerator> generator(Platform& platform);
+  [[nodiscard]] static std::unique_ptr<Ondrel_GSMLogGenerator> generator(
+      const GeneratorServices& services);
 
-  explicit Ondrel_GSMLogGenerator(Platform& platform);
+  explicit Ondrel_GSMLogGenerator(const GeneratorServices& services);
   /// Leaves a line with the object's address in the system log.
   ~Ondrel_GSMLogGenerator() override;
 };

@@ -39,14 +39,16 @@ Array processArray(const Array& array) {
 
 }  // namespace
 
-std::unique_ptr<GSMLogGenerator> GSMLogGenerator::generator(Platform& platform) {
-  return std::make_unique<GSMLogGenerator>(platform);
+std::unique_ptr<GSMLogGenerator> GSMLogGenerator::generator(const GeneratorServices& services) {
+  return std::make_unique<GSMLogGenerator>(services);
 }
 
-GSMLogGenerator::GSMLogGenerator(Platform& platform) : LogGenerator(platform) { init(); }
+GSMLogGenerator::GSMLogGenerator(const GeneratorServices& services) : LogGenerator(services) {
+  init();
+}
 
 void GSMLogGenerator::updateStateWithData(Dictionary& state, ByteView data) {
-  const Result<Value> parsed = platform().propertyListCoding().parse(data);
+  const Result<Value> parsed = services().propertyListCoding.parse(data);
   if (!parsed) {
     throw InternalConsistencyFailure("Could not deserialize the object", kSource, kUnparsableLine);
   }
@@ -57,7 +59,7 @@ void GSMLogGenerator::updateStateWithData(Dictionary& state, ByteView data) {
 }
 
 Value GSMLogGenerator::generateLogUsingState(Dictionary& state) {
-  updateHistoryInState(state, platform().clock());
+  updateHistoryInState(state, services().clock);
   return state[kStateDisplay];
 }
 

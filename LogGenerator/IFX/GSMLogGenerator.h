@@ -11,9 +11,10 @@ namespace kestro {
 /// InternalConsistencyFailure and leave the state as it was.
 class GSMLogGenerator : public LogGenerator {
  public:
-  [[nodiscard]] static std::unique_ptr<GSMLogGenerator> generator(Platform& platform);
+  [[nodiscard]] static std::unique_ptr<GSMLogGenerator> generator(
+      const GeneratorServices& services);
 
-  explicit GSMLogGenerator(Platform& platform);
+  explicit GSMLogGenerator(const GeneratorServices& services);
 
   void updateStateWithData(Dictionary& state, ByteView data) override;
   Value generateLogUsingState(Dictionary& state) override;

@@ -1,13 +1,11 @@
 // SPDX-License-Identifier: MIT
 #include "LogGenerator/LTE/LTEClassIndex.h"
 
-#include "Platform/Platform.h"
+#include "LogGenerator/GeneratorServices.h"
 #include "Platform/TextSink.h"
 
 namespace kestro {
 
-LTEClassIndex::~LTEClassIndex() {
-  platform().standardOutput().writeLine("Deallocing LTEClassIndex");
-}
+LTEClassIndex::~LTEClassIndex() { services().standardOutput.writeLine("Deallocing LTEClassIndex"); }
 
 }  // namespace kestro

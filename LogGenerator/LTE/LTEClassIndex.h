@@ -15,7 +15,7 @@ namespace kestro {
 /// Owns one decoder for each section, made in the order of the fields.
 class LTEClassIndex : public ClassIndex {
  public:
-  explicit LTEClassIndex(Platform& platform) : ClassIndex(platform) {}
+  explicit LTEClassIndex(const GeneratorServices& services) : ClassIndex(services) {}
   /// Leaves a line on the standard output.
   ~LTEClassIndex() override;
 

@@ -11,9 +11,10 @@ namespace kestro {
 /// The template-driven generator with the LTE decoders and the template "LTE".
 class LTELogGenerator : public OndrelLogGenerator2 {
  public:
-  [[nodiscard]] static std::unique_ptr<LTELogGenerator> generator(Platform& platform);
+  [[nodiscard]] static std::unique_ptr<LTELogGenerator> generator(
+      const GeneratorServices& services);
 
-  explicit LTELogGenerator(Platform& platform);
+  explicit LTELogGenerator(const GeneratorServices& services);
   /// Leaves a line with the object's address in the system log.
   ~LTELogGenerator() override;
 };

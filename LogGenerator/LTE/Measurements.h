@@ -32,8 +32,8 @@ using NeighborMeasurementMisc = TableDecoder<kNeighborMeasurementSection>;
 /// Also writes every record's identity and levels to the system log.
 class NeighborCellsList : public SectionDecoder {
  public:
-  explicit NeighborCellsList(Platform& platform)
-      : SectionDecoder(platform, kNeighborCellsListSection) {}
+  explicit NeighborCellsList(const GeneratorServices& services)
+      : SectionDecoder(services, kNeighborCellsListSection) {}
 
  protected:
   void willPublish(const ListReading& list, PacketView packet, std::vector<Value>& rows) override;

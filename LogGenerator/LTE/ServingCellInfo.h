@@ -17,8 +17,8 @@ extern const Section kLTEServingCellInfoSection;
 /// Reports a decoded antenna packet as unknown all the same.
 class LTEServingCellInfo : public CellMonitorDecoder {
  public:
-  explicit LTEServingCellInfo(Platform& platform)
-      : CellMonitorDecoder(platform, kLTEServingCellInfoSection) {}
+  explicit LTEServingCellInfo(const GeneratorServices& services)
+      : CellMonitorDecoder(services, kLTEServingCellInfoSection) {}
 
  protected:
   void didRead(const PacketReading& reading, PacketView packet) override;

@@ -52,7 +52,7 @@ std::vector<std::string> CodeDictionary::keys() const {
 
 // --- Base ----------------------------------------------------------------------------------------
 
-Base::Base(Platform& platform) : _platform(platform), _systemLog(platform.systemLog()) {}
+Base::Base(const GeneratorServices& services) : _services(services) {}
 
 void Base::initWithDictCodeDict(ClassDictionary& sections, CodeDictionary& codes) {
   sections.insert_or_assign(std::string(getSectionName()), this);

@@ -10,11 +10,11 @@
 #include <unordered_map>
 #include <vector>
 
+#include "LogGenerator/GeneratorServices.h"
 #include "LogGenerator/Packets/Catalogue.h"
 #include "LogGenerator/Packets/Explain.h"
 #include "LogGenerator/Packets/Packet.h"
 #include "LogGenerator/Packets/Section.h"
-#include "Platform/Platform.h"
 #include "Platform/PropertyList.h"
 
 namespace kestro {
@@ -86,10 +86,10 @@ class Base {
   static void replaceArrayWith(Array& array, std::vector<Value> elements);
 
  protected:
-  explicit Base(Platform& platform);
+  explicit Base(const GeneratorServices& services);
 
-  [[nodiscard]] Platform& platform() const noexcept { return _platform; }
-  [[nodiscard]] SystemLog& systemLog() const noexcept { return _systemLog; }
+  [[nodiscard]] const GeneratorServices& services() const noexcept { return _services; }
+  [[nodiscard]] SystemLog& systemLog() const noexcept { return _services.systemLog; }
   /// The section as a list or as a dictionary; a null handle before the template was processed, and
   /// when the template has a container of the other kind there.
   [[nodiscard]] Array sectionList() const { return _sectionRef.lock().array(); }
@@ -98,8 +98,7 @@ class Base {
   void reportUnknownCode(LogCode code) const;
 
  private:
-  Platform& _platform;
-  SystemLog& _systemLog;
+  GeneratorServices _services;
   WeakValue _sectionRef;
 };
 

@@ -90,7 +90,7 @@ void writeCellValues(const Dictionary& cell, std::span<const ListedValue> values
 bool CellMonitorDecoder::updateWithOtherPacket(const Packet& packet, LogCode code) {
   const PropertyListReading& reading = *section().propertyList;
   if (code != reading.packet.code) return false;
-  const Array list = readCellArray(packet, platform().propertyListCoding(), systemLog());
+  const Array list = readCellArray(packet, services().propertyListCoding, systemLog());
   if (section().kind == SectionKind::List) {
     Array rows = sectionList();
     clearElementsInArray(rows);
@@ -107,7 +107,7 @@ void CellMonitorDecoder::explainOtherPacket(const Packet& packet, LogCode code,
                                             const ExplainVisitor& visit) const {
   const PropertyListReading& reading = *section().propertyList;
   if (code != reading.packet.code) return;
-  const Result<Value>& root = packet.propertyList(platform().propertyListCoding());
+  const Result<Value>& root = packet.propertyList(services().propertyListCoding);
   if (!root) return;
   std::size_t row = 0;
   for (const Dictionary& cell : chosenCells(reading, root->array())) {

@@ -96,8 +96,8 @@ class CellMonitorDecoder : public SectionDecoder {
 template <const Section& description>
 class CellMonitorTableDecoder : public CellMonitorDecoder {
  public:
-  explicit CellMonitorTableDecoder(Platform& platform)
-      : CellMonitorDecoder(platform, description) {}
+  explicit CellMonitorTableDecoder(const GeneratorServices& services)
+      : CellMonitorDecoder(services, description) {}
 };
 
 }  // namespace kestro

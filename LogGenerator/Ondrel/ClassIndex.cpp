@@ -6,7 +6,7 @@
 
 namespace kestro {
 
-ClassIndex::~ClassIndex() { _platform.standardOutput().writeLine("Deallocing ClassIndex"); }
+ClassIndex::~ClassIndex() { _services.standardOutput.writeLine("Deallocing ClassIndex"); }
 
 Base* ClassIndex::getClass(std::string_view sectionName) const noexcept {
   const auto entry = classDict.find(sectionName);
@@ -15,8 +15,8 @@ Base* ClassIndex::getClass(std::string_view sectionName) const noexcept {
 
 void ClassIndex::status() const {
   // classDict is a dictionary and no text, whatever is registered in it.
-  _platform.systemLog().write(LogPriority::Warning, "Dictionary = 1");
-  _platform.systemLog().write(LogPriority::Warning, "String = 0");
+  _services.systemLog.write(LogPriority::Warning, "Dictionary = 1");
+  _services.systemLog.write(LogPriority::Warning, "String = 0");
 }
 
 }  // namespace kestro

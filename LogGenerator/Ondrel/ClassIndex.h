@@ -16,7 +16,7 @@ namespace kestro {
 /// decoders in a fixed order, which is also the order in which subscribers of one code are called.
 class ClassIndex {
  public:
-  explicit ClassIndex(Platform& platform) noexcept : _platform(platform) {}
+  explicit ClassIndex(const GeneratorServices& services) noexcept : _services(services) {}
   /// Leaves a line on the standard output.
   virtual ~ClassIndex();
   ClassIndex(const ClassIndex&) = delete;
@@ -34,18 +34,18 @@ class ClassIndex {
   void status() const;
 
  protected:
-  [[nodiscard]] Platform& platform() const noexcept { return _platform; }
+  [[nodiscard]] const GeneratorServices& services() const noexcept { return _services; }
 
   /// Makes a decoder and registers it. The index's derived class owns it through the result.
   template <class Decoder>
   [[nodiscard]] std::unique_ptr<Decoder> make() {
-    auto decoder = std::make_unique<Decoder>(_platform);
+    auto decoder = std::make_unique<Decoder>(_services);
     decoder->initWithDictCodeDict(classDict, codeDictionary);
     return decoder;
   }
 
  private:
-  Platform& _platform;
+  GeneratorServices _services;
   ClassDictionary classDict;
   CodeDictionary codeDictionary;
 };

@@ -47,12 +47,12 @@ void OndrelLogGenerator::handOverCollected(Dictionary& state) {
 std::optional<Bytes> OndrelLogGenerator::versionReport() {
   Bytes report(kVersionReportSize, 0);
   std::uint32_t written = 0;
-  const Bundle& bundle = platform().bundle();
+  const Bundle& bundle = services().bundle;
   const int status = QbxDLFAddVersionReport(report, kVersionReportSize, written, kReportVersion,
                                             kReportVersion, versionText(bundle), kExecutableName,
-                                            bundle.buildDate(), reportTime(platform().clock()));
+                                            bundle.buildDate(), reportTime(services().clock));
   if (status == kVersionReportWritten) return report;
-  platform().systemLog().log(LogPriority::Error, "Could not write DLF header (result={})", status);
+  services().systemLog.log(LogPriority::Error, "Could not write DLF header (result={})", status);
   return std::nullopt;
 }
 
@@ -64,7 +64,7 @@ std::optional<Bytes> OndrelLogGenerator::generateDlfFromState(const Dictionary& 
     const Value packets = entry.dictionary()[kStateDisplayState];
     if (packets.isNull()) continue;
     if (!packets.isData()) {
-      platform().systemLog().write(
+      services().systemLog.write(
           LogPriority::Error,
           "Got wrong class writing history to DLF; aborting writing the DLF file");
       return std::nullopt;

@@ -26,7 +26,8 @@ class OndrelLogGenerator : public LogGenerator {
   [[nodiscard]] Array getSaveContentsFromState(const Dictionary& state) override;
 
  protected:
-  explicit OndrelLogGenerator(Platform& platform) noexcept : LogGenerator(platform) {}
+  explicit OndrelLogGenerator(const GeneratorServices& services) noexcept
+      : LogGenerator(services) {}
 
   void collect(ByteView packet) { _binData.insert(_binData.end(), packet.begin(), packet.end()); }
 

@@ -26,18 +26,18 @@ bool isContainerOf(SectionKind kind, const Value& value) {
 
 void OndrelLogGenerator2::initWithPListNameCIndexObj(std::string pListName,
                                                      std::unique_ptr<ClassIndex> index) {
-  platform().systemLog().log(LogPriority::Error, "Creating OndrelLogGenerator2 object with {}",
-                             addressText(index.get()));
+  services().systemLog.log(LogPriority::Error, "Creating OndrelLogGenerator2 object with {}",
+                           addressText(index.get()));
   init();
   _cIndex = std::move(index);
   _pListName = std::move(pListName);
   // The index has one owner, this generator.
-  platform().systemLog().log(LogPriority::Error, "Class Index: {}", _cIndex ? 1 : 0);
+  services().systemLog.log(LogPriority::Error, "Class Index: {}", _cIndex ? 1 : 0);
 }
 
 OndrelLogGenerator2::~OndrelLogGenerator2() {
-  platform().systemLog().log(LogPriority::Warning, "Ondrel_GSMLogGenerator is destructed {}",
-                             addressText(this));
+  services().systemLog.log(LogPriority::Warning, "Ondrel_GSMLogGenerator is destructed {}",
+                           addressText(this));
 }
 
 // --- Packets -------------------------------------------------------------------------------------
@@ -54,7 +54,7 @@ void OndrelLogGenerator2::updateWithData(ByteView message) {
   const PacketView view(packetOfMessage(message));
   const std::uint8_t type = logTypeOf(view);
   if (!isKnownLogType(type)) {
-    platform().systemLog().log(LogPriority::Error, "Invalid log type: {:x}. Dropping.", type);
+    services().systemLog.log(LogPriority::Error, "Invalid log type: {:x}. Dropping.", type);
     return;
   }
   const LogCode code = logCodeOf(view);
@@ -112,7 +112,7 @@ Dictionary OndrelLogGenerator2::getStartCommand() const {
 Value OndrelLogGenerator2::generateLogUsingState(Dictionary& state) {
   Value display = getDisplayFromState(state);
   handOverCollected(state);
-  updateHistoryInState(state, platform().clock());
+  updateHistoryInState(state, services().clock);
   return display;
 }
 
@@ -132,13 +132,13 @@ Value OndrelLogGenerator2::getDisplayFromState(Dictionary& state) {
 }
 
 void OndrelLogGenerator2::buildDisplay(Dictionary& state) {
-  const Value displayTemplate = templateOfState(platform(), _pListName, state);
+  const Value displayTemplate = templateOfState(services(), _pListName, state);
   if (displayTemplate.isNull()) {
-    platform().systemLog().write(LogPriority::Error, "Cannot load template for display");
+    services().systemLog.write(LogPriority::Error, "Cannot load template for display");
     return;
   }
-  platform().systemLog().log(LogPriority::Warning, "Initialized class index: {}, Self: {}",
-                             addressText(_cIndex.get()), addressText(this));
+  services().systemLog.log(LogPriority::Warning, "Initialized class index: {}, Self: {}",
+                           addressText(_cIndex.get()), addressText(this));
   if (_cIndex) _cIndex->status();
   const Value display = processTemplate(displayTemplate);
   printDict(display);
@@ -150,7 +150,7 @@ void OndrelLogGenerator2::buildDisplay(Dictionary& state) {
 const OndrelLogGenerator2::SectionGroups& OndrelLogGenerator2::sectionGroups() const {
   if (_sectionGroups) return *_sectionGroups;
   _sectionGroups.emplace();
-  for (const auto& [group, sections] : loadTemplate(platform(), _pListName).dictionary()) {
+  for (const auto& [group, sections] : loadTemplate(services(), _pListName).dictionary()) {
     if (!group.isText()) continue;
     for (const auto& [section, value] : sections.dictionary()) {
       if (decoderOf(section) == nullptr) continue;
@@ -168,8 +168,8 @@ Value OndrelLogGenerator2::processTemplate(const Value& templateObject) {
     for (const Value& element : templateObject.array()) result.append(processTemplate(element));
     return result;
   }
-  platform().systemLog().write(LogPriority::Error, "Received an object of unknown type");
-  platform().systemLog().write(LogPriority::Warning, "Processing the template");
+  services().systemLog.write(LogPriority::Error, "Received an object of unknown type");
+  services().systemLog.write(LogPriority::Warning, "Processing the template");
   return {};
 }
 
@@ -177,7 +177,7 @@ Value OndrelLogGenerator2::processDictionary(const Dictionary& dictionary) {
   Dictionary result;
   for (const auto& [key, value] : dictionary) {
     if (!key.isText()) {
-      platform().systemLog().write(LogPriority::Error, "Dictionary Key is not a string?");
+      services().systemLog.write(LogPriority::Error, "Dictionary Key is not a string?");
       continue;
     }
     Value processed = processTemplate(value);
@@ -193,7 +193,7 @@ void OndrelLogGenerator2::printDict(const Value& object) const {
   } else if (object.isArray()) {
     for (const Value& element : object.array()) printDict(element);
   } else if (!object.isText()) {
-    platform().systemLog().write(LogPriority::Error, "Received an object of unknown type");
+    services().systemLog.write(LogPriority::Error, "Received an object of unknown type");
   }
 }
 

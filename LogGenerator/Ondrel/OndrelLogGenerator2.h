@@ -45,7 +45,8 @@ class OndrelLogGenerator2 : public OndrelLogGenerator {
   void printDict(const Value& object) const;
 
  protected:
-  explicit OndrelLogGenerator2(Platform& platform) noexcept : OndrelLogGenerator(platform) {}
+  explicit OndrelLogGenerator2(const GeneratorServices& services) noexcept
+      : OndrelLogGenerator(services) {}
 
   /// The construction's second step, after the subclass has made its index and chosen the template.
   void initWithPListNameCIndexObj(std::string pListName, std::unique_ptr<ClassIndex> index);

@@ -3,8 +3,8 @@
 
 namespace kestro {
 
-SectionDecoder::SectionDecoder(Platform& platform, const Section& section)
-    : Base(platform), _section(section), _codes(codesOf(section)) {
+SectionDecoder::SectionDecoder(const GeneratorServices& services, const Section& section)
+    : Base(services), _section(section), _codes(codesOf(section)) {
   _readings.reserve(section.readings.size());
   for (const PacketReading& reading : section.readings) _readings.emplace_back(reading);
 }

@@ -16,7 +16,7 @@ namespace kestro {
 class SectionDecoder : public Base, protected FieldSupplier {
  public:
   /// `section` must outlive the decoder; sections are constants.
-  SectionDecoder(Platform& platform, const Section& section);
+  SectionDecoder(const GeneratorServices& services, const Section& section);
 
   [[nodiscard]] std::string_view getSectionName() const override { return _section.name; }
   [[nodiscard]] std::span<const LogCode> getLogCodeArray() const override { return _codes; }
@@ -65,7 +65,8 @@ class SectionDecoder : public Base, protected FieldSupplier {
 template <const Section& description>
 class TableDecoder : public SectionDecoder {
  public:
-  explicit TableDecoder(Platform& platform) : SectionDecoder(platform, description) {}
+  explicit TableDecoder(const GeneratorServices& services)
+      : SectionDecoder(services, description) {}
 };
 
 }  // namespace kestro

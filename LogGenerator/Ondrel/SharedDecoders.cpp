@@ -67,7 +67,7 @@ LogCode_0xFF0000::PropertyListReader::PropertyListReader(const Packet& packet,
 
 bool SimInfo::updateWithOtherPacket(const Packet& packet, LogCode code) {
   if (code != kSimFiles.packet.code) return false;
-  const LogCode_0xFF0000::PropertyListReader files(packet, platform().propertyListCoding(),
+  const LogCode_0xFF0000::PropertyListReader files(packet, services().propertyListCoding,
                                                    systemLog());
   Dictionary target = sectionDictionary();
   for (const ListedValue& file : kSimFileValues) {
@@ -78,7 +78,7 @@ bool SimInfo::updateWithOtherPacket(const Packet& packet, LogCode code) {
 
 void SimInfo::explainOtherPacket(const Packet& packet, LogCode code,
                                  const ExplainVisitor& visit) const {
-  const Result<Value>& root = packet.propertyList(platform().propertyListCoding());
+  const Result<Value>& root = packet.propertyList(services().propertyListCoding);
   if (code != kSimFiles.packet.code || !root) return;
   const Dictionary files = root->dictionary();
   for (const ListedValue& file : kSimFileValues) {
@@ -92,7 +92,7 @@ void SimInfo::explainOtherPacket(const Packet& packet, LogCode code,
 }
 
 bool PDPContextList::updateWithOtherPacket(const Packet& packet, LogCode /*code*/) {
-  const Result<Value>& root = packet.propertyList(platform().propertyListCoding());
+  const Result<Value>& root = packet.propertyList(services().propertyListCoding);
   if (!root || !root->isArray()) return true;
   const auto contexts = root->array();
   Array target = sectionList();
@@ -102,7 +102,7 @@ bool PDPContextList::updateWithOtherPacket(const Packet& packet, LogCode /*code*
 
 void PDPContextList::explainOtherPacket(const Packet& packet, LogCode /*code*/,
                                         const ExplainVisitor& visit) const {
-  const Result<Value>& root = packet.propertyList(platform().propertyListCoding());
+  const Result<Value>& root = packet.propertyList(services().propertyListCoding);
   if (!root) return;
   std::size_t row = 0;
   for (const Value& context : root->array()) {

@@ -40,7 +40,7 @@ extern const Section kPDPContextListSection;
 /// Shows selected SIM files, each as the packet has it. A file that a packet lacks keeps its value.
 class SimInfo : public SectionDecoder {
  public:
-  explicit SimInfo(Platform& platform) : SectionDecoder(platform, kSimInfoSection) {}
+  explicit SimInfo(const GeneratorServices& services) : SectionDecoder(services, kSimInfoSection) {}
 
  protected:
   bool updateWithOtherPacket(const Packet& packet, LogCode code) override;
@@ -52,7 +52,8 @@ class SimInfo : public SectionDecoder {
 /// an array changes nothing.
 class PDPContextList : public SectionDecoder {
  public:
-  explicit PDPContextList(Platform& platform) : SectionDecoder(platform, kPDPContextListSection) {}
+  explicit PDPContextList(const GeneratorServices& services)
+      : SectionDecoder(services, kPDPContextListSection) {}
 
  protected:
   bool updateWithOtherPacket(const Packet& packet, LogCode code) override;

@@ -3,7 +3,7 @@
 
 #include <fmt/format.h>
 
-#include "Platform/Platform.h"
+#include "LogGenerator/GeneratorServices.h"
 #include "Platform/PropertyListDescription.h"
 #include "Platform/TextSink.h"
 
@@ -71,7 +71,7 @@ void RRC_State::didRead(const PacketReading& /*reading*/, PacketView packet) {
   const int mode = modeOf(packet);
   TextBuffer text;
   writeText(kModeRule, mode, text);
-  platform().consoleLog().writeLine(
+  services().consoleLog.writeLine(
       fmt::format("Display Dict = {}, rrc mode = {} {}", describe(section), mode, text.text()));
 }
 

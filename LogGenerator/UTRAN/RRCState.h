@@ -15,7 +15,8 @@ extern const Section kRRCStateSection;
 /// packet that is too short is reported and shown all the same: it has no known mode.
 class RRC_State : public SectionDecoder {
  public:
-  explicit RRC_State(Platform& platform) : SectionDecoder(platform, kRRCStateSection) {}
+  explicit RRC_State(const GeneratorServices& services)
+      : SectionDecoder(services, kRRCStateSection) {}
 
  protected:
   void didRead(const PacketReading& reading, PacketView packet) override;

@@ -15,7 +15,7 @@ namespace kestro {
 /// Owns one decoder for each section, made in the order of the fields.
 class UTRANClassIndex : public ClassIndex {
  public:
-  explicit UTRANClassIndex(Platform& platform) : ClassIndex(platform) {}
+  explicit UTRANClassIndex(const GeneratorServices& services) : ClassIndex(services) {}
 
  private:
   // NOLINTBEGIN(readability-identifier-naming): the fields' given names

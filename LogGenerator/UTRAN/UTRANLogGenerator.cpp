@@ -6,9 +6,9 @@
 #include <string>
 
 #include "LogGenerator/DisplayTemplate.h"
+#include "LogGenerator/GeneratorServices.h"
 #include "LogGenerator/UTRAN/UTRANClassIndex.h"
 #include "Platform/Bundle.h"
-#include "Platform/Platform.h"
 #include "Platform/SystemLog.h"
 
 namespace kestro {
@@ -39,15 +39,16 @@ std::optional<std::string> templateName(const Bundle& bundle) {
 
 }  // namespace
 
-std::unique_ptr<UTRANLogGenerator> UTRANLogGenerator::generator(Platform& platform) {
-  return std::make_unique<UTRANLogGenerator>(platform);
+std::unique_ptr<UTRANLogGenerator> UTRANLogGenerator::generator(const GeneratorServices& services) {
+  return std::make_unique<UTRANLogGenerator>(services);
 }
 
-UTRANLogGenerator::UTRANLogGenerator(Platform& platform) : OndrelLogGenerator2(platform) {
-  auto name = templateName(platform.bundle());
+UTRANLogGenerator::UTRANLogGenerator(const GeneratorServices& services)
+    : OndrelLogGenerator2(services) {
+  auto name = templateName(services.bundle);
   if (!name) return;
-  initWithPListNameCIndexObj(std::move(*name), std::make_unique<UTRANClassIndex>(platform));
-  platform.systemLog().write(LogPriority::Error, "Created UTRANLogGenerator object");
+  initWithPListNameCIndexObj(std::move(*name), std::make_unique<UTRANClassIndex>(services));
+  services.systemLog.write(LogPriority::Error, "Created UTRANLogGenerator object");
 }
 
 }  // namespace kestro

@@ -13,9 +13,10 @@ namespace kestro {
 /// for no codes, drops every packet and shows nothing.
 class UTRANLogGenerator : public OndrelLogGenerator2 {
  public:
-  [[nodiscard]] static std::unique_ptr<UTRANLogGenerator> generator(Platform& platform);
+  [[nodiscard]] static std::unique_ptr<UTRANLogGenerator> generator(
+      const GeneratorServices& services);
 
-  explicit UTRANLogGenerator(Platform& platform);
+  explicit UTRANLogGenerator(const GeneratorServices& services);
 };
 
 }  // namespace kestro

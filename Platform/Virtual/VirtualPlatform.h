@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT
 // A platform without an operating system: its time passes when told to, its ports are in memory,
-// and its services fail when asked to. For tests, benchmarks, and the offline commands.
+// and its services fail when asked to. For tests, fuzzers and benchmarks.
 #pragma once
 
 #include "Platform/Platform.h"

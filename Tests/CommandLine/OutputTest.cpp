@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <gtest/gtest.h>
 
-#include "CommandLine/OfflinePlatform.h"
+#include "CommandLine/OfflineServices.h"
 #include "CommandLine/Output.h"
 #include "Tests/Support/TemporaryFile.h"
 
@@ -37,26 +37,26 @@ TEST(Output, RemembersThatTheDiskIsFull) {
   EXPECT_FALSE(output->readerIsGone());
 }
 
-TEST(OfflinePlatform, WritesSystemLogLinesAsJson) {
+TEST(OfflineServices, WritesSystemLogLinesAsJson) {
   const TemporaryFile file;
-  OfflinePlatform platform(*Output::create(file.path()));
-  platform.systemLog().write(LogPriority::Error, " ***** \"x\"\n");
-  platform.systemLog().log(LogPriority::Debug, "{}", 1);
-  ASSERT_TRUE(platform.finishLog());
+  OfflineServices services(*Output::create(file.path()));
+  services.systemLog().write(LogPriority::Error, " ***** \"x\"\n");
+  services.systemLog().log(LogPriority::Debug, "{}", 1);
+  ASSERT_TRUE(services.finishLog());
   EXPECT_EQ(file.contents(),
             "{\"priority\":3,\"message\":\" ***** \\\"x\\\"\\n\"}\n"
             "{\"priority\":7,\"message\":\"1\"}\n");
 }
 
-TEST(OfflinePlatform, WithoutALogFileNoLineIsFormatted) {
-  OfflinePlatform platform;
-  EXPECT_FALSE(platform.systemLog().accepts(LogPriority{0}));
+TEST(OfflineServices, WithoutALogFileNoLineIsFormatted) {
+  OfflineServices services;
+  EXPECT_FALSE(services.systemLog().accepts(LogPriority{0}));
 }
 
-TEST(OfflinePlatform, SaysWhyTheLogCannotBeWritten) {
-  OfflinePlatform platform(*Output::create("/dev/full"));
-  platform.systemLog().write(LogPriority::Error, "x");
-  const auto outcome = platform.finishLog();
+TEST(OfflineServices, SaysWhyTheLogCannotBeWritten) {
+  OfflineServices services(*Output::create("/dev/full"));
+  services.systemLog().write(LogPriority::Error, "x");
+  const auto outcome = services.finishLog();
   ASSERT_FALSE(outcome);
   EXPECT_EQ(outcome.error().message, "/dev/full: No space left on device");
 }

@@ -26,7 +26,7 @@ class Channel {
  public:
   explicit Channel(std::string_view technology) {
     addTemplates(_platform);
-    _generator = LogGenerator::generatorFromTechnology(_platform, technology);
+    _generator = LogGenerator::generatorFromTechnology(generatorServices(_platform), technology);
   }
 
   [[nodiscard]] const LogGenerator& generator() const noexcept { return *_generator; }

@@ -30,7 +30,8 @@ class LogGeneratorTest : public ::testing::Test {
   /// Whether the technology's generator is of this class.
   template <class Generator>
   [[nodiscard]] bool makes(std::string_view technology) {
-    const auto made = LogGenerator::generatorFromTechnology(platform, technology);
+    const auto made =
+        LogGenerator::generatorFromTechnology(generatorServices(platform), technology);
     return dynamic_cast<Generator*>(made.get()) != nullptr;
   }
 
@@ -50,9 +51,9 @@ class LogGeneratorTest : public ::testing::Test {
 };
 
 TEST_F(LogGeneratorTest, KnowsNoGeneratorForAnotherTechnology) {
-  EXPECT_FALSE(LogGenerator::generatorFromTechnology(platform, "Semaphore"));
-  EXPECT_FALSE(LogGenerator::generatorFromTechnology(platform, ""));
-  EXPECT_FALSE(LogGenerator::generatorFromTechnology(platform, "ifx"));
+  EXPECT_FALSE(LogGenerator::generatorFromTechnology(generatorServices(platform), "Semaphore"));
+  EXPECT_FALSE(LogGenerator::generatorFromTechnology(generatorServices(platform), ""));
+  EXPECT_FALSE(LogGenerator::generatorFromTechnology(generatorServices(platform), "ifx"));
 }
 
 TEST_F(LogGeneratorTest, NamesTheTechnologiesInTheOrderOfTheSearch) {
@@ -69,8 +70,8 @@ TEST_F(LogGeneratorTest, EveryTechnologyHasItsGenerator) {
 }
 
 TEST_F(LogGeneratorTest, LogsTheAddressOfANewGenerator) {
-  const auto generator =
-      LogGenerator::generatorFromTechnology(platform, kTqLogChannelTechnology_IFX);
+  const auto generator = LogGenerator::generatorFromTechnology(generatorServices(platform),
+                                                               kTqLogChannelTechnology_IFX);
   ASSERT_TRUE(generator);
   EXPECT_THAT(platform.systemLog().lines(),
               ElementsAre(RecordingSystemLog::Line{

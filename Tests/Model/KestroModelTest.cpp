@@ -478,7 +478,7 @@ TEST_F(KestroModelTest, ReplacesTheGeneratorAtEachConnectionAndKeepsTheState) {
 /// A generator that shows which state it was given.
 class StateKeysGenerator : public LogGenerator {
  public:
-  explicit StateKeysGenerator(Platform& platform) : LogGenerator(platform) {}
+  explicit StateKeysGenerator(const GeneratorServices& services) : LogGenerator(services) {}
   void updateStateWithData(Dictionary& state, ByteView /*data*/) override {
     for (const char* key : {"DisplayState", "Display", "ExtraInfo", "History", "Running"}) {
       state.set(key, "old");
@@ -498,7 +498,8 @@ class TechnologyChangeTest : public ModelFixture {
   TechnologyChangeTest() {
     model = KestroModel::create(
         platform, [] {},
-        [](Platform& services, std::string_view technology) -> std::unique_ptr<LogGenerator> {
+        [](const GeneratorServices& services,
+           std::string_view technology) -> std::unique_ptr<LogGenerator> {
           if (technology == "none") return nullptr;
           return std::make_unique<StateKeysGenerator>(services);
         });

@@ -21,7 +21,7 @@ using ::testing::IsEmpty;
 /// Shows the last message's text; "!" ends the application.
 class EchoGenerator : public LogGenerator {
  public:
-  explicit EchoGenerator(Platform& platform) : LogGenerator(platform) {}
+  explicit EchoGenerator(const GeneratorServices& services) : LogGenerator(services) {}
 
   void updateStateWithData(Dictionary& state, ByteView data) override {
     const std::string text(data.begin(), data.end());
@@ -54,7 +54,7 @@ class ReplayTest : public ::testing::Test {
 
   std::unique_ptr<PropertyListCoding> coding = createPropertyListCoding();
   VirtualPlatform platform{*coding};
-  EchoGenerator generator{platform};
+  EchoGenerator generator{generatorServices(platform)};
   ReplayClock clock{platform.clock()};
   std::unique_ptr<Replay> replay;
   std::uint64_t number = 0;

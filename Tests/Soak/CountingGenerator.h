@@ -13,9 +13,9 @@ namespace kestro::soak {
 /// Counts each message, then hands it to the technology's own generator, as everything else.
 class CountingGenerator : public LogGenerator {
  public:
-  CountingGenerator(Platform& platform, std::unique_ptr<LogGenerator> generator,
+  CountingGenerator(const GeneratorServices& services, std::unique_ptr<LogGenerator> generator,
                     std::uint64_t& count)
-      : LogGenerator(platform), _generator(std::move(generator)), _count(count) {}
+      : LogGenerator(services), _generator(std::move(generator)), _count(count) {}
 
   void updateStateWithData(Dictionary& state, ByteView data) override {
     ++_count;

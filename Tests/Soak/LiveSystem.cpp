@@ -40,19 +40,20 @@ LiveSystem::LiveSystem(std::string_view technology, double speed, std::size_t pr
   connectService();
   _model = KestroModel::create(
       _platform, [this] { redraw(); },
-      [this](Platform&, std::string_view name) { return makeGenerator(name); });
+      [this](const GeneratorServices&, std::string_view name) { return makeGenerator(name); });
   if (premadeCount != 0) {
     _premade = std::make_shared<PremadeMessages>(*openSimulation(), premadeCount);
   }
 }
 
 std::unique_ptr<LogGenerator> LiveSystem::makeGenerator(std::string_view technology) {
-  auto generator = LogGenerator::generatorFromTechnology(_platform, technology);
+  auto generator = LogGenerator::generatorFromTechnology(generatorServices(_platform), technology);
   require(generator != nullptr, "the server names a technology");
   const auto command = parseChannelCommand(*_coding, *_coding->xml(generator->getStartCommand()));
   require(command && std::holds_alternative<StartCommand>(*command), "the start command is one");
   _filter = std::get<StartCommand>(*command).filter;
-  return std::make_unique<CountingGenerator>(_platform, std::move(generator), _counts.received);
+  return std::make_unique<CountingGenerator>(generatorServices(_platform), std::move(generator),
+                                             _counts.received);
 }
 
 void LiveSystem::connectService() {

@@ -41,7 +41,8 @@ std::set<LogCode> askedForBy(std::string_view technology) {
   const auto coding = createPropertyListCoding();
   VirtualPlatform platform(*coding);
   addTemplates(platform);
-  return subscribedCodes(*LogGenerator::generatorFromTechnology(platform, technology));
+  return subscribedCodes(
+      *LogGenerator::generatorFromTechnology(generatorServices(platform), technology));
 }
 
 /// The technologies whose generators ask for codes.

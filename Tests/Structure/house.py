@@ -42,7 +42,7 @@ class Room:
 _SOURCES = ("LogGenerator", "Recordings", "Platform")
 _MODEL = ("LogGenerator", "Recordings", "Platform")
 _SERVER = ("Sources", "Options", *_SOURCES)
-_COMMAND_LINE = ("Model", "Options", "Platform/Virtual", *_SERVER)
+_COMMAND_LINE = ("Model", "Options", *_SERVER)
 _FORMATS = ("CommandLine", "CommandLine/Formats", *_COMMAND_LINE)
 _TERMINAL = ("CommandLine/Terminal", *_FORMATS)
 _APP = ("Model", "Options", *_SOURCES, "Sources")

@@ -85,7 +85,7 @@ class DecoderFixture : public ::testing::Test {
 
   std::unique_ptr<PropertyListCoding> coding = createPropertyListCoding();
   VirtualPlatform platform{*coding};
-  Decoder decoder{platform};
+  Decoder decoder{generatorServices(platform)};
 
  private:
   Value _section;

@@ -19,7 +19,7 @@ class DisplayReader {
   explicit DisplayReader(std::string_view technology) {
     addTemplates(_platform);
     _platform.systemLog().setThreshold(LogPriority::Error);
-    _generator = LogGenerator::generatorFromTechnology(_platform, technology);
+    _generator = LogGenerator::generatorFromTechnology(generatorServices(_platform), technology);
     static_cast<void>(_generator->generateLogUsingState(_state));
     static_cast<void>(_platform.systemLog().take());
   }

@@ -47,7 +47,7 @@ inline std::string textOf(const ExplainedValue& value) {
 class ExplainedPlacesFixture : public ::testing::Test {
  protected:
   explicit ExplainedPlacesFixture(std::string_view technology)
-      : generator(LogGenerator::generatorFromTechnology(platform, technology)) {}
+      : generator(LogGenerator::generatorFromTechnology(generatorServices(platform), technology)) {}
 
   /// What is no record: the sections' own fields, and the counts of their records.
   [[nodiscard]] std::vector<std::string> places(const PacketBytes& packet) const {

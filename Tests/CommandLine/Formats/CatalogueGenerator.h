@@ -13,8 +13,8 @@ namespace kestro::testing {
 
 class CatalogueGenerator : public LogGenerator {
  public:
-  CatalogueGenerator(Platform& platform, std::vector<CatalogueEntry> entries)
-      : LogGenerator(platform), _entries(std::move(entries)) {}
+  CatalogueGenerator(const GeneratorServices& services, std::vector<CatalogueEntry> entries)
+      : LogGenerator(services), _entries(std::move(entries)) {}
 
   void updateStateWithData(Dictionary&, ByteView) override {}
   Value generateLogUsingState(Dictionary&) override { return {}; }

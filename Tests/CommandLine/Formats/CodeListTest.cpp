@@ -3,7 +3,7 @@
 #include <gtest/gtest.h>
 
 #include "CommandLine/Formats/CodeList.h"
-#include "CommandLine/OfflinePlatform.h"
+#include "CommandLine/OfflineServices.h"
 #include "Tests/CommandLine/Formats/CatalogueGenerator.h"
 
 namespace kestro::testing {
@@ -16,10 +16,10 @@ using ::testing::SizeIs;
 class CodeListTest : public ::testing::Test {
  protected:
   std::vector<ListedCode> list(std::vector<CatalogueEntry> entries) {
-    return listCodes(CatalogueGenerator(platform, std::move(entries)));
+    return listCodes(CatalogueGenerator(services.forGenerator(), std::move(entries)));
   }
 
-  OfflinePlatform platform;
+  OfflineServices services;
 };
 
 TEST_F(CodeListTest, IsInTheOrderOfTheCodes) {
@@ -52,7 +52,7 @@ std::vector<std::string_view> familyNames(const TechnologyCodes& technology) {
 }
 
 TEST_F(CodeListTest, FamiliesAreTheDisplaysGroupsInItsOrder) {
-  const TechnologyCodes lte = codesOfTechnology(platform, "LTE");
+  const TechnologyCodes lte = codesOfTechnology(services.forGenerator(), "LTE");
   EXPECT_EQ(lte.technology, "LTE");
   EXPECT_THAT(familyNames(lte),
               ElementsAre("Serving Cell", "Neighbors", "Reselection", "Extra Packets"));
@@ -64,7 +64,7 @@ TEST_F(CodeListTest, FamiliesAreTheDisplaysGroupsInItsOrder) {
 
 /// Section GPRS Information wants 0x7135 before Serving PLMN does, and shows nothing of it.
 TEST_F(CodeListTest, ACodeBelongsToTheFirstSectionThatShowsSomethingOfIt) {
-  const TechnologyCodes gsm = codesOfTechnology(platform, "Ondrel_GSM");
+  const TechnologyCodes gsm = codesOfTechnology(services.forGenerator(), "Ondrel_GSM");
   EXPECT_THAT(familyNames(gsm), ElementsAre("Network", "UMTS Cells", "UMTS Link", "GSM Cells",
                                             "GSM Link", "Extra Packets"));
   const auto& network = gsm.families[0].codes;
@@ -72,7 +72,7 @@ TEST_F(CodeListTest, ACodeBelongsToTheFirstSectionThatShowsSomethingOfIt) {
 }
 
 TEST_F(CodeListTest, AChannelWithoutPacketsHasNone) {
-  EXPECT_THAT(codesOfTechnology(platform, "IFX").families, IsEmpty());
+  EXPECT_THAT(codesOfTechnology(services.forGenerator(), "IFX").families, IsEmpty());
 }
 
 }  // namespace

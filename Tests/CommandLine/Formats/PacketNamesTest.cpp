@@ -2,7 +2,7 @@
 #include <gtest/gtest.h>
 
 #include "CommandLine/Formats/PacketNames.h"
-#include "CommandLine/OfflinePlatform.h"
+#include "CommandLine/OfflineServices.h"
 #include "Tests/CommandLine/Formats/CatalogueGenerator.h"
 #include "Tests/Support/PacketBytes.h"
 
@@ -15,9 +15,9 @@ class PacketNamesTest : public ::testing::Test {
     return names.reasonForNothing(bytes.bytes());
   }
 
-  OfflinePlatform platform;
+  OfflineServices services;
   CatalogueGenerator generator{
-      platform,
+      services.forGenerator(),
       {{.code = 0xB17F, .packetName = "level", .minimumLength = 33, .section = "A"},
        {.code = 0x4031, .section = "B"}}};
   PacketNames names{generator};
@@ -28,7 +28,7 @@ TEST_F(PacketNamesTest, KnowsTheNames) {
   EXPECT_EQ(names.nameOf(0xB17F), "level");
   EXPECT_EQ(names.nameOf(0x4031), "");
   EXPECT_EQ(names.nameOf(0x1111), "");
-  EXPECT_TRUE(PacketNames(CatalogueGenerator(platform, {})).isEmpty());
+  EXPECT_TRUE(PacketNames(CatalogueGenerator(services.forGenerator(), {})).isEmpty());
 }
 
 TEST_F(PacketNamesTest, SaysWhyNothingIsRead) {

@@ -152,7 +152,8 @@ class C2KFixture : public ::testing::Test {
 
   std::unique_ptr<PropertyListCoding> coding = createPropertyListCoding();
   VirtualPlatform platform{*coding};
-  std::unique_ptr<C2KLogGenerator> generator = C2KLogGenerator::generator(platform);
+  std::unique_ptr<C2KLogGenerator> generator =
+      C2KLogGenerator::generator(generatorServices(platform));
   Dictionary state;
 };
 

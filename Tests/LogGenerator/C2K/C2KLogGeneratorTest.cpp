@@ -30,7 +30,7 @@ class C2KLogGeneratorTest : public C2KFixture {
 };
 
 TEST_F(C2KLogGeneratorTest, LogsItsCreationAndNotItsEnd) {
-  auto made = C2KLogGenerator::generator(platform);
+  auto made = C2KLogGenerator::generator(generatorServices(platform));
   EXPECT_THAT(takeLines(),
               ElementsAre(warningLine("Creating Log object: " + addressText(made.get()))));
   made.reset();
@@ -240,7 +240,7 @@ TEST_F(C2KLogGeneratorTest, ARefreshKeepsTheDisplayInTheHistory) {
 
 TEST_F(C2KLogGeneratorTest, ANewGeneratorGoesOnWithTheOldState) {
   receive(frame(1));
-  generator = C2KLogGenerator::generator(platform);
+  generator = C2KLogGenerator::generator(generatorServices(platform));
   receive(frame(0));
   EXPECT_EQ(text("k1xTrafficFER"), "1.54%");
 }

@@ -75,12 +75,12 @@ class Ondrel_GSMTest : public ::testing::Test {
 // --- The index -----------------------------------------------------------------------------------
 
 TEST_F(Ondrel_GSMTest, TheIndexHasADecoderForEverySection) {
-  const Ondrel_GSMClassIndex index(platform);
+  const Ondrel_GSMClassIndex index(generatorServices(platform));
   expectDecoders(index, platform, rows());
 }
 
 TEST_F(Ondrel_GSMTest, TheIndexLeavesItsLineBeforeTheBasesOne) {
-  { const Ondrel_GSMClassIndex index(platform); }
+  { const Ondrel_GSMClassIndex index(generatorServices(platform)); }
   EXPECT_THAT(platform.standardOutput().lines(),
               ElementsAre("Deallocing Ondrel_GSMClassIndex", "Deallocing ClassIndex"));
 }
@@ -103,12 +103,14 @@ class Ondrel_GSMLogGeneratorTest : public Ondrel_GSMTest {
   }
   Entries entries(std::string_view name) { return entriesOf(section(name).dictionary()); }
 
-  std::unique_ptr<Ondrel_GSMLogGenerator> generator = Ondrel_GSMLogGenerator::generator(platform);
+  std::unique_ptr<Ondrel_GSMLogGenerator> generator =
+      Ondrel_GSMLogGenerator::generator(generatorServices(platform));
   Dictionary state;
 };
 
 TEST_F(Ondrel_GSMLogGeneratorTest, SpeaksItsTechnology) {
-  const auto found = LogGenerator::generatorFromTechnology(platform, "Ondrel_GSM");
+  const auto found =
+      LogGenerator::generatorFromTechnology(generatorServices(platform), "Ondrel_GSM");
   EXPECT_NE(dynamic_cast<Ondrel_GSMLogGenerator*>(found.get()), nullptr);
 }
 

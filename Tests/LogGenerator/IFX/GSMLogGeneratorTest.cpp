@@ -37,7 +37,8 @@ class GSMLogGeneratorTest : public ::testing::Test {
 
   std::unique_ptr<PropertyListCoding> coding = createPropertyListCoding();
   VirtualPlatform platform{*coding};
-  std::unique_ptr<GSMLogGenerator> generator = GSMLogGenerator::generator(platform);
+  std::unique_ptr<GSMLogGenerator> generator =
+      GSMLogGenerator::generator(generatorServices(platform));
   Dictionary state;
 };
 

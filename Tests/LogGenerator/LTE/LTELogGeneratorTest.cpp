@@ -54,12 +54,12 @@ TEST_F(LTETest, TheIndexHasADecoderForEverySection) {
       {kSections[9], kDictionary, "SimInfo", kSilent, {0xFF0000}},
       {kSections[10], kList, "PDPContextList", kSilent, {0xFF0002}},
   };
-  const LTEClassIndex index(platform);
+  const LTEClassIndex index(generatorServices(platform));
   expectDecoders(index, platform, rows);
 }
 
 TEST_F(LTETest, TheIndexLeavesItsLineBeforeTheBasesOne) {
-  { const LTEClassIndex index(platform); }
+  { const LTEClassIndex index(generatorServices(platform)); }
   EXPECT_THAT(platform.standardOutput().lines(),
               ElementsAre("Deallocing LTEClassIndex", "Deallocing ClassIndex"));
 }
@@ -75,13 +75,14 @@ class LTELogGeneratorTest : public LTETest {
     return display()[group].dictionary()[name];
   }
 
-  std::unique_ptr<LTELogGenerator> generator = LTELogGenerator::generator(platform);
+  std::unique_ptr<LTELogGenerator> generator =
+      LTELogGenerator::generator(generatorServices(platform));
   Dictionary state;
 };
 
 TEST_F(LTELogGeneratorTest, IsWhatTheTechnologySelects) {
-  const auto selected =
-      LogGenerator::generatorFromTechnology(platform, kTqLogChannelTechnology_Ondrel_LTE);
+  const auto selected = LogGenerator::generatorFromTechnology(generatorServices(platform),
+                                                              kTqLogChannelTechnology_Ondrel_LTE);
   EXPECT_NE(dynamic_cast<LTELogGenerator*>(selected.get()), nullptr);
 }
 

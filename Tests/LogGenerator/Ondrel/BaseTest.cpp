@@ -64,7 +64,7 @@ using Second = TableDecoder<kSecondSection>;
 
 class TestIndex : public ClassIndex {
  public:
-  explicit TestIndex(Platform& platform) : ClassIndex(platform) {}
+  explicit TestIndex(const GeneratorServices& services) : ClassIndex(services) {}
 
   std::unique_ptr<First> first = make<First>();
   std::unique_ptr<Second> second = make<Second>();
@@ -74,7 +74,7 @@ class ClassIndexTest : public ::testing::Test {
  protected:
   std::unique_ptr<PropertyListCoding> coding = createPropertyListCoding();
   VirtualPlatform platform{*coding};
-  std::unique_ptr<TestIndex> index = std::make_unique<TestIndex>(platform);
+  std::unique_ptr<TestIndex> index = std::make_unique<TestIndex>(generatorServices(platform));
 };
 
 TEST_F(ClassIndexTest, ListsSubscribersInConstructionOrder) {

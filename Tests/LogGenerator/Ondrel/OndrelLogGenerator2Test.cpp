@@ -42,7 +42,7 @@ constexpr Section kCellSection = {.name = "Cells",
 
 class TestIndex : public ClassIndex {
  public:
-  explicit TestIndex(Platform& platform) : ClassIndex(platform) {}
+  explicit TestIndex(const GeneratorServices& services) : ClassIndex(services) {}
 
  private:
   std::unique_ptr<TableDecoder<kLevelSection>> _level = make<TableDecoder<kLevelSection>>();
@@ -51,8 +51,8 @@ class TestIndex : public ClassIndex {
 
 class TestGenerator : public OndrelLogGenerator2 {
  public:
-  explicit TestGenerator(Platform& platform) : OndrelLogGenerator2(platform) {
-    initWithPListNameCIndexObj("Test", std::make_unique<TestIndex>(platform));
+  explicit TestGenerator(const GeneratorServices& services) : OndrelLogGenerator2(services) {
+    initWithPListNameCIndexObj("Test", std::make_unique<TestIndex>(services));
   }
 };
 
@@ -92,7 +92,8 @@ class OndrelLogGenerator2Test : public ::testing::Test {
 
   std::unique_ptr<PropertyListCoding> coding = createPropertyListCoding();
   VirtualPlatform platform{*coding};
-  std::unique_ptr<TestGenerator> generator = std::make_unique<TestGenerator>(platform);
+  std::unique_ptr<TestGenerator> generator =
+      std::make_unique<TestGenerator>(generatorServices(platform));
   Dictionary state;
 };
 
@@ -319,7 +320,7 @@ TEST_F(OndrelLogGenerator2Test, WalksADisplayForObjectsOfUnknownType) {
 TEST_F(OndrelLogGenerator2Test, ContinuesOnTheDisplayOfAnEarlierGenerator) {
   receive(levelPacket({1, 9}));
   const Dictionary display = state["Display"].dictionary();
-  generator = std::make_unique<TestGenerator>(platform);
+  generator = std::make_unique<TestGenerator>(generatorServices(platform));
   takeLines();
 
   receive(levelPacket({2, 8, 7}));
@@ -335,7 +336,7 @@ TEST_F(OndrelLogGenerator2Test, ContinuesOnTheDisplayOfAnEarlierGenerator) {
 
 TEST_F(OndrelLogGenerator2Test, BindsAnEarlierDisplayOnce) {
   generator->generateLogUsingState(state);
-  generator = std::make_unique<TestGenerator>(platform);
+  generator = std::make_unique<TestGenerator>(generatorServices(platform));
   generator->generateLogUsingState(state);
   takeLines();
   generator->generateLogUsingState(state);

@@ -19,7 +19,7 @@ using ::testing::SizeIs;
 /// The base alone, without a channel.
 class CollectingGenerator : public OndrelLogGenerator {
  public:
-  explicit CollectingGenerator(Platform& platform) : OndrelLogGenerator(platform) {}
+  explicit CollectingGenerator(const GeneratorServices& services) : OndrelLogGenerator(services) {}
   void updateStateWithData(Dictionary& /*state*/, ByteView data) override { collect(data); }
   Value generateLogUsingState(Dictionary& state) override {
     handOverCollected(state);
@@ -51,7 +51,7 @@ class OndrelLogGeneratorTest : public ::testing::Test {
 
   std::unique_ptr<PropertyListCoding> coding = createPropertyListCoding();
   VirtualPlatform platform{*coding};
-  CollectingGenerator generator{platform};
+  CollectingGenerator generator{generatorServices(platform)};
   Dictionary state;
 };
 

@@ -106,7 +106,7 @@ TEST_F(RRCStateTest, IgnoresOtherCodesSilently) {
 }
 
 TEST_F(RRCStateTest, WritesTheConsoleLineWithoutASectionToo) {
-  RRC_State unbound(platform);
+  RRC_State unbound(generatorServices(platform));
   unbound.updateWithDataLogCode(state(1, 3).bytes(), 0xD0E0);
   EXPECT_EQ(consoleLines().back(), "Display Dict = (null), rrc mode = 3 Cell DCH");
 }

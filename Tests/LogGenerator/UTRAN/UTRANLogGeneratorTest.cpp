@@ -32,7 +32,7 @@ class UTRANLogGeneratorTest : public ::testing::Test {
     platform.bundle().setResource(std::move(path), *coding->xml(contents));
   }
 
-  void make() { generator = UTRANLogGenerator::generator(platform); }
+  void make() { generator = UTRANLogGenerator::generator(generatorServices(platform)); }
 
   void receive(const PacketBytes& packet) { generator->updateStateWithData(state, packet.bytes()); }
 
@@ -70,7 +70,7 @@ TEST_F(UTRANLogGeneratorTest, TheIndexHasADecoderForEverySection) {
       {"PDP Context Info", kList, "PDPContextList", kSilent, {0xFF0002}},
       {"SIM Info", kDictionary, "SimInfo", kSilent, {0xFF0000}},
   };
-  const UTRANClassIndex index(platform);
+  const UTRANClassIndex index(generatorServices(platform));
   expectDecoders(index, platform, rows);
 }
 

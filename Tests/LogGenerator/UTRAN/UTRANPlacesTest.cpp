@@ -11,7 +11,7 @@ class UTRANPlacesTest : public ExplainedPlacesFixture {
  protected:
   UTRANPlacesTest() : ExplainedPlacesFixture("UTRAN2") {
     platform.bundle().setResource("UTRAN.plist", {});  // it has no decoders without a template
-    generator = LogGenerator::generatorFromTechnology(platform, "UTRAN2");
+    generator = LogGenerator::generatorFromTechnology(generatorServices(platform), "UTRAN2");
   }
 };
 

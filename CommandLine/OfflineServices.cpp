@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "CommandLine/OfflinePlatform.h"
+#include "CommandLine/OfflineServices.h"
 
 #include <fmt/format.h>
 
@@ -9,8 +9,7 @@
 #include "CommandLine/Formats/JsonWriter.h"
 #include "Platform/Bundle.h"
 #include "Platform/Linux/LinuxPlatform.h"
-#include "Platform/PropertyListCoding.h"
-#include "Platform/Virtual/VirtualPlatform.h"
+#include "Platform/TextSink.h"
 
 namespace kestro {
 namespace {
@@ -20,7 +19,7 @@ constexpr LogPriority kNoPriority{-1};
 
 }  // namespace
 
-struct OfflinePlatform::Services {
+struct OfflineServices::Services {
   class Log : public SystemLog {
    public:
     explicit Log(std::optional<Output> file)
@@ -66,29 +65,27 @@ struct OfflinePlatform::Services {
   ReplayClock clock{*systemClock};
   std::unique_ptr<Bundle> bundle = createBundle();
   std::unique_ptr<PropertyListCoding> coding = createPropertyListCoding();
-  VirtualPlatform others{*coding};
 };
 
-OfflinePlatform::OfflinePlatform(std::optional<Output> logFile)
+OfflineServices::OfflineServices(std::optional<Output> logFile)
     : _services(std::make_unique<Services>(std::move(logFile))) {}
-OfflinePlatform::~OfflinePlatform() = default;
+OfflineServices::~OfflineServices() = default;
 
-SystemLog& OfflinePlatform::systemLog() { return _services->log; }
-TextSink& OfflinePlatform::consoleLog() { return _services->standardError; }
-TextSink& OfflinePlatform::standardOutput() { return _services->standardError; }
-ReplayClock& OfflinePlatform::clock() { return _services->clock; }
-Bundle& OfflinePlatform::bundle() { return *_services->bundle; }
-PropertyListCoding& OfflinePlatform::propertyListCoding() { return *_services->coding; }
-MainQueue& OfflinePlatform::mainQueue() { return _services->others.mainQueue(); }
-MessagePorts& OfflinePlatform::messagePorts() { return _services->others.messagePorts(); }
-TelephonyService& OfflinePlatform::telephonyService() {
-  return _services->others.telephonyService();
+SystemLog& OfflineServices::systemLog() noexcept { return _services->log; }
+ReplayClock& OfflineServices::clock() noexcept { return _services->clock; }
+const PropertyListCoding& OfflineServices::propertyListCoding() const noexcept {
+  return *_services->coding;
 }
-InputStreams& OfflinePlatform::inputStreams() { return _services->others.inputStreams(); }
-Uuids& OfflinePlatform::uuids() { return _services->others.uuids(); }
-Preferences& OfflinePlatform::preferences() { return _services->others.preferences(); }
-DeviceRoot& OfflinePlatform::deviceRoot() { return _services->others.deviceRoot(); }
 
-Result<void> OfflinePlatform::finishLog() { return _services->log.finish(); }
+GeneratorServices OfflineServices::forGenerator() noexcept {
+  return {.systemLog = _services->log,
+          .consoleLog = _services->standardError,
+          .standardOutput = _services->standardError,
+          .clock = _services->clock,
+          .bundle = *_services->bundle,
+          .propertyListCoding = *_services->coding};
+}
+
+Result<void> OfflineServices::finishLog() { return _services->log.finish(); }
 
 }  // namespace kestro
