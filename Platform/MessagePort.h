@@ -95,6 +95,10 @@ class RemotePort {
   /// so a peer that closed it before the call is noticed by the call.
   [[nodiscard]] virtual bool isValid() const = 0;
 
+  /// How many messages with this id were posted or sent and have not been handed to the system
+  /// whole: they wait, or were dropped when the connection closed.
+  [[nodiscard]] virtual std::size_t unsentMessages(std::int32_t messageId) const = 0;
+
   /// The process at the other end: who listened to the port when this connection was made.
   [[nodiscard]] virtual ProcessNumber owner() const = 0;
 };

@@ -18,6 +18,9 @@ enum class TelephonyMessage : std::int32_t {
   CreateLogChannel = 2,
   /// One-way, to a registered notification port: kTelephonyNotification.
   Notification = 3,
+  /// One-way, to the client's local port: the source's time of the log data that follows, where
+  /// kTelephonyTimes has asked for it. Eight bytes (Platform/SourceTimes.h), no property list.
+  SourceTime = 4,
 };
 
 [[nodiscard]] constexpr std::int32_t messageId(TelephonyMessage message) noexcept {
@@ -28,12 +31,25 @@ enum class TelephonyMessage : std::int32_t {
 inline constexpr std::string_view kTelephonyNotificationPort = "NotificationPort";
 /// CreateLogChannel: the name of the client's port that log data goes to (text).
 inline constexpr std::string_view kTelephonyLocalPort = "LocalPort";
+/// And, when this channel takes the place of one that was lost, the name of that one's port (text).
+inline constexpr std::string_view kTelephonyPrevious = "Previous";
 /// Its reply: an error number (integer, 0 for none) and, without error, the channel's port (text).
 inline constexpr std::string_view kTelephonyError = "Error";
 inline constexpr std::string_view kTelephonyPort = "Port";
+/// The reply may also say how many messages the lost channel has missed (integer), and what the
+/// source is (Platform/LogSourceState.h): its kind and name (texts in a dictionary), whether it is
+/// simulated and whether it has ended (booleans).
+inline constexpr std::string_view kTelephonyLost = "Lost";
+inline constexpr std::string_view kTelephonySource = "Source";
+inline constexpr std::string_view kTelephonySourceKind = "Kind";
+inline constexpr std::string_view kTelephonySourceName = "Name";
+inline constexpr std::string_view kTelephonySimulated = "Simulated";
+inline constexpr std::string_view kTelephonyEnded = "Ended";
 /// Notification: what happened (text).
 inline constexpr std::string_view kTelephonyNotification = "Notification";
 inline constexpr std::string_view kTelephonyTechnologyChanged = "TechnologyChanged";
+/// With what the source is now, as in the reply to CreateLogChannel.
+inline constexpr std::string_view kTelephonySourceChanged = "SourceChanged";
 
 /// On a channel port: the request for the technology, and the reply's entry of the same name.
 inline constexpr std::string_view kTelephonyGetTechnology = "GetTechnology";
@@ -45,6 +61,8 @@ inline constexpr std::string_view kTelephonySetState = "SetState";
 inline constexpr std::string_view kTelephonyStreaming = "Streaming";
 inline constexpr std::string_view kTelephonySetOndrelLogCodes = "SetOndrelLogCodes";
 inline constexpr std::string_view kTelephonySetTqExtraCodes = "SetTqExtraCodes";
+/// In it: whether the source's times are wanted as well (boolean).
+inline constexpr std::string_view kTelephonyTimes = "Times";
 
 /// Why there is no log channel. The server answers with the positive numbers; the numbers -1 to -4
 /// are those of SendError, -5 a reply that does not say what it should.

@@ -3,11 +3,14 @@
 // the technology names that the server reports.
 #pragma once
 
+#include <cstdint>
 #include <functional>
 #include <memory>
 #include <optional>
 #include <string>
 #include <string_view>
+
+#include "Platform/LogSourceState.h"
 
 namespace kestro {
 
@@ -31,7 +34,12 @@ class TqServerConnection {
 /// The answer to a log-channel request: 0 and the name of the server's port, or an error number.
 struct LogChannelReply {
   long error = 0;  ///< of a LogChannelError, or of a SendError (Platform/TelephonyProtocol.h)
-  std::optional<std::string> portName;
+  std::optional<std::string> portName = std::nullopt;
+  LogSourceState source = {};  ///< what the server says of its source
+  /// How many messages were missed since the previous channel was lost; absent when none was named
+  /// or the server does not know. With a number the messages go on at once, as they were asked for
+  /// on that channel, so that none is missed that is not counted.
+  std::optional<std::uint64_t> lost = std::nullopt;
 };
 
 /// The telephony server's two operations. Main thread only.
@@ -54,6 +62,17 @@ class TelephonyService {
   // NOLINTNEXTLINE(bugprone-reserved-identifier,readability-identifier-naming)
   [[nodiscard]] virtual LogChannelReply _TqServerConnectionNetworkMonitorCreateLogChannel(
       TqServerConnection& connection, std::string_view localPortName) = 0;
+
+  /// The same, for a channel that takes the place of one that was lost: `previousPortName` is the
+  /// name of that one's port. The server remembers it for 60 s.
+  [[nodiscard]] virtual LogChannelReply createLogChannelAfter(
+      TqServerConnection& connection, std::string_view localPortName,
+      std::string_view previousPortName) = 0;
+
+  /// `handler` runs on the main thread, before the notification's own handler, when the server
+  /// notifies that its source has changed, for instance that it has ended. An empty one removes the
+  /// one before.
+  virtual void setSourceHandler(std::function<void(const LogSourceState&)> handler) = 0;
 
   /// Ends the registration for notifications, if there is one.
   virtual void cancelNotifications() = 0;

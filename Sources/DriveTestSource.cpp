@@ -42,12 +42,14 @@ Result<SourceStep> DriveTestSource::next() {
     const TimedRow timed = std::move(_rows.front());
     _rows.pop_front();
     _time = timed.time;
+    _moment = timed.moment;
     auto messages = _encoder->messages(timed.row);
     std::ranges::move(messages, std::back_inserter(_messages));
   }
   _message = std::move(_messages.front());
   _messages.pop_front();
-  return SourceEvent{.time = _time, .technology = _encoder->technology(), .message = _message};
+  return SourceEvent{
+      .time = _time, .technology = _encoder->technology(), .message = _message, .moment = _moment};
 }
 
 Result<void> DriveTestSource::readSecond() {
@@ -69,7 +71,8 @@ Result<void> DriveTestSource::readSecond() {
   const auto count = static_cast<std::int64_t>(rows.size());
   for (std::int64_t i = 0; i < count; ++i) {
     const auto share = std::chrono::microseconds(std::chrono::seconds(1)) * i / count;
-    _rows.push_back({begin + share, std::move(rows[static_cast<std::size_t>(i)])});
+    auto& row = rows[static_cast<std::size_t>(i)];
+    _rows.push_back({begin + share, row.time + share, std::move(row)});
   }
   return {};
 }

@@ -49,6 +49,7 @@ class DriveTestSource : public LogSource {
  private:
   struct TimedRow {
     std::chrono::microseconds time;
+    Moment moment;  ///< the log's own, whatever its zone, as if that were GMT
     DriveTestRow row;
   };
 
@@ -65,6 +66,7 @@ class DriveTestSource : public LogSource {
   std::optional<DriveTestRow> _rowOfNextSecond;
   std::deque<TimedRow> _rows;
   std::chrono::microseconds _time{0};
+  Moment _moment{};
   std::deque<Bytes> _messages;
   Bytes _message;
 };

@@ -9,6 +9,7 @@
 #include <variant>
 
 #include "Platform/Bytes.h"
+#include "Platform/Clock.h"
 #include "Platform/Result.h"
 
 namespace kestro {
@@ -23,6 +24,8 @@ struct SourceEvent {
   /// The message, in that technology's format. Valid until the source's next `next` or `restart`.
   /// Empty when the event only changes the technology.
   ByteView message;
+  /// When the source had the message, by its own clock; absent where it has none: that is now.
+  std::optional<Moment> moment = std::nullopt;
 };
 
 /// Nothing is there yet; the source's ready handler will say when to ask again.

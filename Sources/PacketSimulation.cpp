@@ -18,7 +18,10 @@ Result<SourceStep> PacketSimulation::next() {
   }
   _message = std::move(_packets.front());
   _packets.pop_front();
-  return SourceEvent{.time = *_time, .technology = technology(), .message = _message};
+  return SourceEvent{.time = *_time,
+                     .technology = technology(),
+                     .message = _message,
+                     .moment = kSimulationBegin + *_time};
 }
 
 void PacketSimulation::takeStep() {

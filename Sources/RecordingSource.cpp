@@ -31,7 +31,10 @@ Result<SourceStep> RecordingSource::next() {
     if (!message->has_value()) break;
     const auto time = _timeline.advanceTo((*message)->time);
     if ((*message)->isCut()) continue;
-    return SourceEvent{.time = time, .technology = _technology, .message = (*message)->bytes};
+    return SourceEvent{.time = time,
+                       .technology = _technology,
+                       .message = (*message)->bytes,
+                       .moment = (*message)->time};
   }
   if (_reader.cutMessageCount() > 0) {
     _report(fmt::format("{}: {} of {} messages had been cut when they were recorded; left out",

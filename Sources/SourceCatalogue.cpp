@@ -161,11 +161,11 @@ constexpr std::array kKinds = {
                "A made-up drive, the same in every run: cells, path loss, fading,\n"
                "handovers, data transfers. Technology: LTE (unless given), IFX,\n"
                "Ondrel_GSM, Ondrel_CDMA or UTRAN2.",
-               openSimulation},
+               true, openSimulation},
     SourceKind{"capture", isGiven, "capture:FILE",
                "A recorded capture, with the pauses that it was recorded with. The\n"
                "file names the technology.",
-               openCapture},
+               false, openCapture},
     SourceKind{"drive-test", isGiven, "drive-test:FILE.csv",
                "A drive-test log as phone apps write it, one row a second: columns\n"
                "Timestamp, NetworkMode, RSRP, and what else there is of RSRQ, SNR,\n"
@@ -178,12 +178,12 @@ constexpr std::array kKinds = {
                "states, SIM, contexts; auto follows the log from one to the other. A\n"
                "value that was not measured (\"-\") keeps the last one; before there\n"
                "is one, it is left out, with the packets that need it.",
-               openDriveTest},
+               true, openDriveTest},
     SourceKind{"stream", isGiven, "stream:PATH",
                "Messages from a file, a pipe or standard input (\"-\") as they arrive,\n"
                "each behind its length (32 bits, little-endian). --technology says\n"
                "what they are; IFX unless given. --speed does not apply.",
-               openStream},
+               false, openStream},
 };
 
 }  // namespace
@@ -220,6 +220,14 @@ Result<SourceRequest> parseSource(std::string_view text, std::string_view techno
     return failure(fmt::format("\"{}\" is no source; the form is {}", text, kind->form));
   }
   return SourceRequest{std::string(name), std::string(argument), technology};
+}
+
+LogSourceState stateOf(const SourceRequest& request) {
+  const auto* kind = std::ranges::find(kKinds, request.kind, &SourceKind::name);
+  LogSourceState state{.kind = request.kind};
+  if (kind != kKinds.end()) state.isSimulated = kind->isSimulated;
+  if (!request.argument.empty()) state.name = request.argument;
+  return state;
 }
 
 Result<std::unique_ptr<LogSource>> openSource(const SourceRequest& request, Platform& platform,

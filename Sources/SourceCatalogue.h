@@ -7,6 +7,7 @@
 #include <string>
 #include <string_view>
 
+#include "Platform/LogSourceState.h"
 #include "Platform/Platform.h"
 #include "Platform/Result.h"
 #include "Sources/LogSource.h"
@@ -31,6 +32,7 @@ struct SourceKind {
   bool (*accepts)(std::string_view argument);
   std::string_view form;         ///< as a person types it
   std::string_view description;  ///< for the help, in lines of at most 70 characters
+  bool isSimulated;              ///< no baseband has sent its messages
   Result<std::unique_ptr<LogSource>> (*open)(const SourceRequest& request, Platform& platform,
                                              const SourceReporter& report);
 };
@@ -53,6 +55,9 @@ struct SourceKind {
 /// Takes "KIND[:ARGUMENT]" apart; the error says that there is no such kind, or that its argument
 /// is missing or too much. `technology` as in SourceRequest.
 [[nodiscard]] Result<SourceRequest> parseSource(std::string_view text, std::string_view technology);
+
+/// What a server can tell of the source that was asked for.
+[[nodiscard]] LogSourceState stateOf(const SourceRequest& request);
 
 /// Opens the source. The error says why that is not possible. The source tells `report` what it
 /// leaves out; both references must outlive it.

@@ -34,9 +34,16 @@ Result<ChannelCommand> startCommand(const Dictionary& command) {
   if (command[kTelephonySetState].text() != kTelephonyStreaming) {
     return failure(fmt::format("{} is not \"{}\"", kTelephonySetState, kTelephonyStreaming));
   }
+  StartCommand start;
+  if (const Value& times = command[kTelephonyTimes]; !times.isNull()) {
+    if (times.type() != ValueType::Boolean) {
+      return failure(fmt::format("{} is no boolean", kTelephonyTimes));
+    }
+    start.wantsTimes = times.flag();
+  }
   if (!command.contains(kTelephonySetOndrelLogCodes) &&
       !command.contains(kTelephonySetTqExtraCodes)) {
-    return StartCommand{};
+    return start;
   }
   std::vector<LogCode> codes;
   if (auto added = addCodes(command, kTelephonySetOndrelLogCodes, 0, codes); !added) {
@@ -45,7 +52,8 @@ Result<ChannelCommand> startCommand(const Dictionary& command) {
   if (auto added = addCodes(command, kTelephonySetTqExtraCodes, kExtraCodes, codes); !added) {
     return tl::unexpected(added.error());
   }
-  return StartCommand{CodeFilter(std::move(codes))};
+  start.filter = CodeFilter(std::move(codes));
+  return start;
 }
 
 }  // namespace

@@ -16,7 +16,8 @@ struct GetTechnologyCommand {};
 
 /// Starts the streaming of the messages that the filter accepts.
 struct StartCommand {
-  CodeFilter filter;
+  CodeFilter filter = {};
+  bool wantsTimes = false;  ///< the source's time before each message
 };
 
 using ChannelCommand = std::variant<GetTechnologyCommand, StartCommand>;

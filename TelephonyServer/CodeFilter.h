@@ -16,6 +16,8 @@ class CodeFilter {
   /// Accepts the messages with one of these codes; extra codes have their offset.
   explicit CodeFilter(std::vector<LogCode> codes);
 
+  [[nodiscard]] bool acceptsEverything() const noexcept { return _acceptsEverything; }
+
   /// Whether the message is wanted. A message that is too short to have a code is wanted only if
   /// all messages are.
   [[nodiscard]] bool accepts(ByteView message) const noexcept;

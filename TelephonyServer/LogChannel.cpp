@@ -5,16 +5,19 @@
 #include <variant>
 
 #include "Platform/PropertyListCoding.h"
+#include "Platform/SourceTimes.h"
 #include "Platform/SystemLog.h"
 #include "Platform/TelephonyProtocol.h"
 #include "Platform/Uuids.h"
-#include "TelephonyServer/ChannelCommand.h"
 
 namespace kestro {
 
 LogChannel::LogChannel(Platform& platform, std::shared_ptr<RemotePort> client,
                        std::function<std::string_view()> technology)
-    : _platform(platform), _client(std::move(client)), _technology(std::move(technology)) {}
+    : _platform(platform),
+      _client(std::move(client)),
+      _clientProcess(_client->owner()),
+      _technology(std::move(technology)) {}
 
 bool LogChannel::open() {
   const auto uuid = _platform.uuids().create();
@@ -29,9 +32,11 @@ bool LogChannel::open() {
   return _port != nullptr;
 }
 
-bool LogChannel::deliver(ByteView message) {
-  if (!_isStreaming || !_filter.accepts(message)) return true;
-  switch (_client->post(messageId(TelephonyMessage::Channel), message)) {
+bool LogChannel::deliver(ByteView message, Moment time) {
+  if (!_command || !_command->filter.accepts(message)) return true;
+  const SendError error = post(message, time);
+  if (error != SendError::None) ++_refused;
+  switch (error) {
     case SendError::None:
       return true;
     case SendError::InvalidPort:
@@ -45,6 +50,23 @@ bool LogChannel::deliver(ByteView message) {
   }
 }
 
+SendError LogChannel::post(ByteView message, Moment time) {
+  if (_command->wantsTimes) {
+    const auto error =
+        _client->post(messageId(TelephonyMessage::SourceTime), sourceTimeBytes(time));
+    if (error != SendError::None) return error;
+  }
+  return _client->post(messageId(TelephonyMessage::Channel), message);
+}
+
+std::optional<LostChannel> LogChannel::close() {
+  _port.reset();
+  _client->invalidate();
+  if (!_command) return std::nullopt;
+  const auto unsent = _client->unsentMessages(messageId(TelephonyMessage::Channel));
+  return LostChannel{_portName, _clientProcess, *std::move(_command), _refused + unsent};
+}
+
 bool LogChannel::isOpen() const { return _port && _port->isValid() && _client->isValid(); }
 
 std::optional<Bytes> LogChannel::answer(std::int32_t id, ByteView message) {
@@ -56,8 +78,7 @@ std::optional<Bytes> LogChannel::answer(std::int32_t id, ByteView message) {
     return std::nullopt;
   }
   if (std::holds_alternative<GetTechnologyCommand>(*command)) return technologyReply();
-  _filter = std::move(std::get<StartCommand>(*command).filter);
-  _isStreaming = true;
+  start(std::move(std::get<StartCommand>(*command)));
   return std::nullopt;
 }
 

@@ -2,16 +2,20 @@
 // One client's log channel.
 #pragma once
 
+#include <cstdint>
 #include <functional>
 #include <memory>
 #include <optional>
 #include <string>
 #include <string_view>
+#include <utility>
 
 #include "Platform/Bytes.h"
+#include "Platform/Clock.h"
 #include "Platform/MessagePort.h"
 #include "Platform/Platform.h"
-#include "TelephonyServer/CodeFilter.h"
+#include "TelephonyServer/ChannelCommand.h"
+#include "TelephonyServer/LostChannels.h"
 
 namespace kestro {
 
@@ -35,10 +39,19 @@ class LogChannel {
   /// The name of the channel's port.
   [[nodiscard]] const std::string& portName() const noexcept { return _portName; }
 
-  /// Sends a log message to the client, if streaming has started and the client asked for its code.
-  /// Never waits. False when the client's connection refused it: the channel is of no use any more,
-  /// as a log line says.
-  [[nodiscard]] bool deliver(ByteView message);
+  /// The process whose channel it is.
+  [[nodiscard]] ProcessNumber client() const noexcept { return _clientProcess; }
+
+  /// Starts streaming as by that command, until the client sends one.
+  void start(StartCommand command) { _command = std::move(command); }
+
+  /// Sends a log message to the client, if streaming has started and the client asked for its code,
+  /// after the source's time if it asked for that. Never waits. False when the client's connection
+  /// refused it: the channel is of no use any more, as a log line says.
+  [[nodiscard]] bool deliver(ByteView message, Moment time);
+
+  /// Closes the channel. What there is to remember of it; absent when it never streamed.
+  [[nodiscard]] std::optional<LostChannel> close();
 
   /// Whether client and channel are still connected; looks at both connections. A channel that is
   /// not will never be again.
@@ -47,14 +60,16 @@ class LogChannel {
  private:
   [[nodiscard]] std::optional<Bytes> answer(std::int32_t messageId, ByteView message);
   [[nodiscard]] std::optional<Bytes> technologyReply() const;
+  [[nodiscard]] SendError post(ByteView message, Moment time);
 
   Platform& _platform;
   std::shared_ptr<RemotePort> _client;
+  ProcessNumber _clientProcess;
   std::function<std::string_view()> _technology;
   std::string _portName;
   std::shared_ptr<LocalPort> _port;
-  bool _isStreaming = false;
-  CodeFilter _filter;
+  std::optional<StartCommand> _command;  ///< absent before streaming starts
+  std::uint64_t _refused = 0;            ///< messages that the client's connection did not take
 };
 
 }  // namespace kestro

@@ -102,7 +102,7 @@ void Playback::handOver() {
   }
   if (event.message.empty()) return;
   ++_messages;
-  _listener.messageDue(event.message);
+  _listener.messageDue(event.message, event.moment.value_or(_clock.now()));
 }
 
 void Playback::finishPass(std::string_view error) {
@@ -112,15 +112,19 @@ void Playback::finishPass(std::string_view error) {
     wakeAfter(kLoopPause);
     return;
   }
-  _isStopped = true;
   _report(fmt::format("the source has ended after {} messages; clients stay connected", _messages));
+  stop();
+}
+
+void Playback::stop() {
+  _isStopped = true;
+  _listener.sourceEnded();
 }
 
 void Playback::restart() {
   if (const auto restarted = _source->restart(); !restarted) {
     _report(restarted.error().message);
-    _isStopped = true;
-    return;
+    return stop();
   }
   _position = Microseconds(0);
   _eventsOfPass = 0;

@@ -26,8 +26,12 @@ class PlaybackListener {
   /// for changes only: the listener knows the technology with which the source begins.
   virtual void technologyChanged(std::string_view technology) = 0;
 
-  /// One message, at its time. Valid during the call.
-  virtual void messageDue(ByteView message) = 0;
+  /// One message, when it is due; valid during the call. `time` is when the source had it, by the
+  /// source's own clock; for sources without one it is now.
+  virtual void messageDue(ByteView message, Moment time) = 0;
+
+  /// The source has ended for good: no more messages come.
+  virtual void sourceEnded() = 0;
 };
 
 struct PlaybackOptions {
@@ -66,6 +70,7 @@ class Playback {
   [[nodiscard]] bool fetch();
   void handOver();
   void finishPass(std::string_view error);
+  void stop();
   void restart();
   void wakeAfter(std::chrono::nanoseconds delay);
   void wakeWhenDue();

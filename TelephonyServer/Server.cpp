@@ -20,6 +20,13 @@ Dictionary channelReply(LogChannelError error) {
   return {{kTelephonyError, Value::integer(static_cast<std::int64_t>(error))}};
 }
 
+/// The port name under `key`; absent when there is none.
+std::optional<std::string> portNameIn(const Dictionary& body, std::string_view key) {
+  const auto name = body[key].text();
+  if (!isPortName(name)) return std::nullopt;
+  return std::string(name);
+}
+
 }  // namespace
 
 Result<std::unique_ptr<Server>> Server::open(Platform& platform, std::string_view name,
@@ -45,22 +52,42 @@ bool Server::openPort() {
       _name,
       [this](std::int32_t messageId, ByteView message) { return answer(messageId, message); });
   if (!_port) return false;
-  _timer = _platform.mainQueue().scheduleRepeating(kLookInterval, [this] { forgetWhoIsGone(); });
+  _timer = _platform.mainQueue().scheduleRepeating(kLookInterval, [this] {
+    forgetWhoIsGone();
+    _lostChannels.secondPassed();
+  });
   return true;
 }
 
 void Server::technologyChanged(std::string_view technology) {
   _technology = technology;
-  _channels.clear();
-  const auto notification = _platform.propertyListCoding().xml(
-      Dictionary{{kTelephonyNotification, kTelephonyTechnologyChanged}});
+  closeChannels([](LogChannel&) { return true; });
+  _lostChannels.technologyChanged();
+  notify({{kTelephonyNotification, kTelephonyTechnologyChanged}});
+}
+
+void Server::setSource(LogSourceState source) {
+  const auto hasEnded = _source.hasEnded;
+  _source = std::move(source);
+  if (!_source.hasEnded) _source.hasEnded = hasEnded;
+}
+
+void Server::sourceEnded() {
+  _source.hasEnded = true;
+  Dictionary body{{kTelephonyNotification, kTelephonySourceChanged}};
+  addSourceState(_source, body);
+  notify(body);
+}
+
+void Server::notify(const Dictionary& body) {
+  const auto notification = _platform.propertyListCoding().xml(body);
   if (!notification) return;
   for (const auto& [name, client] : _registrations) {
     static_cast<void>(client->post(messageId(TelephonyMessage::Notification), *notification));
   }
 }
 
-void Server::messageDue(ByteView message) {
+void Server::messageDue(ByteView message, Moment time) {
   if (message.size() > kMaximumStreamedMessage) {
     _platform.systemLog().log(LogPriority::Warning,
                               "A message of {} bytes is left out: no more than {} can wait for a "
@@ -68,11 +95,20 @@ void Server::messageDue(ByteView message) {
                               message.size(), kMaximumStreamedMessage);
     return;
   }
-  std::erase_if(_channels, [&](const auto& channel) { return !channel->deliver(message); });
+  _lostChannels.messageDue(message);
+  closeChannels([&](LogChannel& channel) { return !channel.deliver(message, time); });
+}
+
+void Server::closeChannels(const std::function<bool(LogChannel&)>& isOver) {
+  std::erase_if(_channels, [&](const auto& channel) {
+    if (!isOver(*channel)) return false;
+    if (auto lost = channel->close()) _lostChannels.remember(*std::move(lost));
+    return true;
+  });
 }
 
 void Server::forgetWhoIsGone() {
-  std::erase_if(_channels, [](const auto& channel) { return !channel->isOpen(); });
+  closeChannels([](const LogChannel& channel) { return !channel.isOpen(); });
   std::erase_if(_registrations, [](const auto& entry) { return !entry.second->isValid(); });
 }
 
@@ -90,7 +126,7 @@ void Server::registerClient(ByteView message) {
     _platform.systemLog().log(LogPriority::Warning, "A registration is dropped: {}", why);
   };
   forgetWhoIsGone();
-  const auto name = portNameIn(message, kTelephonyNotificationPort);
+  const auto name = portNameIn(dictionaryIn(message), kTelephonyNotificationPort);
   if (!name) return refuse("it names no port");
   if (_registrations.contains(*name)) return;
   if (_registrations.size() >= kMaximumRegistrations) return refuse("there are too many");
@@ -100,17 +136,39 @@ void Server::registerClient(ByteView message) {
 }
 
 Bytes Server::createLogChannel(ByteView message) {
-  Dictionary reply = channelReply(LogChannelError::BadRequest);
   forgetWhoIsGone();
-  if (const auto localPort = portNameIn(message, kTelephonyLocalPort)) {
-    const auto channel = openChannel(*localPort);
-    reply = channelReply(channel ? LogChannelError::None : channel.error());
-    if (channel) reply.set(kTelephonyPort, (*channel)->portName());
-  }
+  const Dictionary request = dictionaryIn(message);
+  const auto localPort = portNameIn(request, kTelephonyLocalPort);
+  const Dictionary reply =
+      localPort ? channelReplyTo(request, *localPort) : channelReply(LogChannelError::BadRequest);
   return _platform.propertyListCoding().xml(reply).value_or(Bytes{});
 }
 
-tl::expected<const LogChannel*, LogChannelError> Server::openChannel(const std::string& localPort) {
+Dictionary Server::channelReplyTo(const Dictionary& request, const std::string& localPort) {
+  const auto channel = openChannel(localPort);
+  if (!channel) return channelReply(channel.error());
+  Dictionary reply = channelReply(LogChannelError::None);
+  reply.set(kTelephonyPort, (*channel)->portName());
+  addSourceState(_source, reply);
+  if (const auto previous = portNameIn(request, kTelephonyPrevious)) {
+    const auto lost = follow(**channel, *previous);
+    if (lost) reply.set(kTelephonyLost, Value::integer(static_cast<std::int64_t>(*lost)));
+  }
+  return reply;
+}
+
+std::optional<std::uint64_t> Server::follow(LogChannel& channel, std::string_view previous) {
+  // What the client has given up may look open from here.
+  closeChannels([&](const LogChannel& other) {
+    return &other != &channel && other.portName() == previous && other.client() == channel.client();
+  });
+  auto lost = _lostChannels.take(previous, channel.client());
+  if (!lost) return std::nullopt;
+  channel.start(std::move(lost->command));
+  return lost->missed;
+}
+
+tl::expected<LogChannel*, LogChannelError> Server::openChannel(const std::string& localPort) {
   const auto refuse = [&](LogChannelError error, std::string_view why) {
     _platform.systemLog().log(LogPriority::Warning, "No log channel for {}: {}", localPort, why);
     return tl::unexpected(error);
@@ -147,13 +205,9 @@ bool Server::isOwnPort(std::string_view name) const {
          });
 }
 
-std::optional<std::string> Server::portNameIn(ByteView message, std::string_view key) const {
+Dictionary Server::dictionaryIn(ByteView message) const {
   const auto parsed = _platform.propertyListCoding().parse(message);
-  if (!parsed) return std::nullopt;
-  const auto dictionary = parsed->dictionary();
-  const auto name = dictionary[key].text();
-  if (!isPortName(name)) return std::nullopt;
-  return std::string(name);
+  return parsed ? parsed->dictionary() : Dictionary();
 }
 
 }  // namespace kestro

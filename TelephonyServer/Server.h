@@ -13,12 +13,15 @@
 #include <vector>
 
 #include "Platform/Bytes.h"
+#include "Platform/Clock.h"
+#include "Platform/LogSourceState.h"
 #include "Platform/MainQueue.h"
 #include "Platform/MessagePort.h"
 #include "Platform/Platform.h"
 #include "Platform/Result.h"
 #include "Platform/TelephonyProtocol.h"
 #include "TelephonyServer/LogChannel.h"
+#include "TelephonyServer/LostChannels.h"
 #include "TelephonyServer/Playback.h"
 
 namespace kestro {
@@ -48,7 +51,13 @@ class Server : public PlaybackListener {
 
   /// Invalidates all channels, then notifies the registered clients.
   void technologyChanged(std::string_view technology) override;
-  void messageDue(ByteView message) override;
+  void messageDue(ByteView message, Moment time) override;
+  /// Tells the registered clients.
+  void sourceEnded() override;
+
+  /// What clients are told of the source; nothing, save that it has not ended, until this is
+  /// called.
+  void setSource(LogSourceState source);
 
   [[nodiscard]] std::size_t channelCount() const noexcept { return _channels.size(); }
   [[nodiscard]] std::size_t registrationCount() const noexcept { return _registrations.size(); }
@@ -59,15 +68,23 @@ class Server : public PlaybackListener {
   [[nodiscard]] std::optional<Bytes> answer(std::int32_t messageId, ByteView message);
   void registerClient(ByteView message);
   [[nodiscard]] Bytes createLogChannel(ByteView message);
+  /// The reply to a request for a channel to the client's port of that name.
+  [[nodiscard]] Dictionary channelReplyTo(const Dictionary& request, const std::string& localPort);
   /// A channel to the client's port of that name, open and kept; the error is the reply's.
-  [[nodiscard]] tl::expected<const LogChannel*, LogChannelError> openChannel(
+  [[nodiscard]] tl::expected<LogChannel*, LogChannelError> openChannel(
       const std::string& localPort);
+  /// Lets `channel` go on where the client's channel `previous` ended. How many messages that one
+  /// has missed, if that is known.
+  [[nodiscard]] std::optional<std::uint64_t> follow(LogChannel& channel, std::string_view previous);
+  /// Closes and remembers the channels for which that holds.
+  void closeChannels(const std::function<bool(LogChannel&)>& isOver);
+  void notify(const Dictionary& body);
   /// Connects to a port that the client has named; the error says why that is not done.
   [[nodiscard]] Result<std::shared_ptr<RemotePort>> connectTo(const std::string& port) const;
   /// Whether the name is the server's own, or one of its channels'.
   [[nodiscard]] bool isOwnPort(std::string_view name) const;
-  /// The port name under `key` in a dictionary; absent when there is none.
-  [[nodiscard]] std::optional<std::string> portNameIn(ByteView message, std::string_view key) const;
+  /// The dictionary that a message is; an empty one when it is none.
+  [[nodiscard]] Dictionary dictionaryIn(ByteView message) const;
   void forgetWhoIsGone();
 
   Platform& _platform;
@@ -76,6 +93,8 @@ class Server : public PlaybackListener {
   std::shared_ptr<LocalPort> _port;
   std::unique_ptr<Timer> _timer;
   std::vector<std::unique_ptr<LogChannel>> _channels;
+  LostChannels _lostChannels;
+  LogSourceState _source{.hasEnded = false};
   std::map<std::string, std::shared_ptr<RemotePort>, std::less<>> _registrations;
 };
 

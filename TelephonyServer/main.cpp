@@ -36,6 +36,7 @@ int serve(LinuxPlatform& platform, const ServerOptions& options) {
     platform.quit(fail(platform, "the server's port was removed"));
   });
   if (!server) return fail(platform, server.error().message);
+  (*server)->setSource(stateOf(options.source));
   Playback playback(std::move(*source), options.playback, platform.mainQueue(), platform.clock(),
                     **server, report);
   platform.setTerminationHandler([&platform] { platform.quit(0); });

@@ -83,10 +83,17 @@ void PortConnection::close() {
   _readNotifier.reset();
   _writeNotifier.reset();
   _socket.reset();
+  _dropped = _queue.waitingMessages();
   _queue = PortSendQueue();
   countQueue();
   countUnfinished();
   onClosed();
+}
+
+std::size_t PortConnection::unsent(std::int32_t messageId) const {
+  const auto waiting = isOpen() ? _queue.waitingMessages() : _dropped;
+  const auto found = waiting.find(messageId);
+  return found == waiting.end() ? 0 : found->second;
 }
 
 void PortConnection::note(std::string_view what) {

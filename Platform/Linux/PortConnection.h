@@ -4,6 +4,7 @@
 
 #include <QSocketNotifier>
 #include <chrono>
+#include <map>
 #include <memory>
 #include <string>
 #include <string_view>
@@ -87,6 +88,10 @@ class PortConnection : public std::enable_shared_from_this<PortConnection> {
   [[nodiscard]] PortSendQueue& queue() noexcept { return _queue; }
   [[nodiscard]] int socket() const noexcept { return _socket.get(); }
 
+  /// How many messages with this id the system has not taken whole: they wait, or were dropped when
+  /// the socket was closed.
+  [[nodiscard]] std::size_t unsent(std::int32_t messageId) const;
+
   /// Keeps the count of what waits on all connections true. For those who change the queue.
   void countQueue();
 
@@ -130,6 +135,7 @@ class PortConnection : public std::enable_shared_from_this<PortConnection> {
   std::shared_ptr<PortContext> _context;
   PortFrameReader _reader;
   PortSendQueue _queue;
+  std::map<std::int32_t, std::size_t> _dropped;  ///< messages that waited at the end, by their ids
   bool _isUnfinished = false;     ///< whether the context counts bytes of an unfinished frame
   std::size_t _countedBytes = 0;  ///< this queue's part of what waits on all connections
   std::unique_ptr<QSocketNotifier> _readNotifier;

@@ -11,6 +11,11 @@ namespace {
 /// What an idle queue may keep allocated.
 constexpr std::size_t kKeptCapacity = std::size_t{256} * 1024;
 
+std::size_t frameSize(ByteView bytes, std::size_t at) {
+  return PortFrameHeader::kSize +
+         loadLittleEndian<std::uint32_t>(bytes, at + PortFrameHeader::kLengthOffset);
+}
+
 }  // namespace
 
 PortSendQueue::Position PortSendQueue::append(PortFrameHeader header, ByteView body) {
@@ -43,10 +48,27 @@ PortSendQueue::FlushStatus PortSendQueue::flush(int socket) {
   return FlushStatus::Empty;
 }
 
+std::map<std::int32_t, std::size_t> PortSendQueue::waitingMessages() const {
+  std::map<std::int32_t, std::size_t> counts;
+  for (std::size_t at = firstUnwritten(); at < _bytes.size(); at += frameSize(_bytes, at)) {
+    if (_bytes[at + PortFrameHeader::kKindOffset] != std::uint8_t(PortFrameKind::Message)) continue;
+    const auto id = loadLittleEndian<std::uint32_t>(_bytes, at + PortFrameHeader::kMessageIdOffset);
+    ++counts[static_cast<std::int32_t>(id)];
+  }
+  return counts;
+}
+
+std::size_t PortSendQueue::firstUnwritten() const {
+  std::size_t at = 0;
+  while (at < _bytes.size() && at + frameSize(_bytes, at) <= _written) at += frameSize(_bytes, at);
+  return at;
+}
+
 void PortSendQueue::forgetWritten() {
-  _bytes.erase(_bytes.begin(), _bytes.begin() + static_cast<std::ptrdiff_t>(_written));
-  _start += _written;
-  _written = 0;
+  const std::size_t count = firstUnwritten();
+  _bytes.erase(_bytes.begin(), _bytes.begin() + static_cast<std::ptrdiff_t>(count));
+  _start += count;
+  _written -= count;
 }
 
 void PortSendQueue::giveBackMemory() {

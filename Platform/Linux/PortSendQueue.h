@@ -4,6 +4,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <map>
 
 #include "Platform/Bytes.h"
 #include "Platform/Linux/PortFrame.h"
@@ -28,16 +29,21 @@ class PortSendQueue {
   /// Writes to a non-blocking socket until nothing is left or the system takes no more.
   [[nodiscard]] FlushStatus flush(int socket);
 
+  /// How many messages (no requests, no replies) have not been written whole, by their ids.
+  [[nodiscard]] std::map<std::int32_t, std::size_t> waitingMessages() const;
+
   [[nodiscard]] std::size_t size() const noexcept { return _bytes.size() - _written; }
   [[nodiscard]] bool empty() const noexcept { return size() == 0; }
 
  private:
+  /// Where in `_bytes` the first frame stands that has not been written whole.
+  [[nodiscard]] std::size_t firstUnwritten() const;
   void forgetWritten();
   void giveBackMemory();
 
   Bytes _bytes;
   std::size_t _written = 0;  ///< how many of `_bytes` are written already
-  Position _start = 0;       ///< of `_bytes` in the stream
+  Position _start = 0;       ///< of `_bytes` in the stream; a frame begins there
 };
 
 }  // namespace kestro

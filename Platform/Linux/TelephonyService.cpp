@@ -37,25 +37,40 @@ class PortTelephonyService final : public TelephonyService {
   [[nodiscard]] std::unique_ptr<TqServerConnection> _TqServerConnectionCreate(
       std::function<void()> notificationHandler) override;
   [[nodiscard]] LogChannelReply _TqServerConnectionNetworkMonitorCreateLogChannel(
-      TqServerConnection& connection, std::string_view localPortName) override;
+      TqServerConnection& connection, std::string_view localPortName) override {
+    return createLogChannel(connection, {{kTelephonyLocalPort, localPortName}});
+  }
+  [[nodiscard]] LogChannelReply createLogChannelAfter(TqServerConnection& connection,
+                                                      std::string_view localPortName,
+                                                      std::string_view previousPortName) override {
+    return createLogChannel(
+        connection, {{kTelephonyLocalPort, localPortName}, {kTelephonyPrevious, previousPortName}});
+  }
+  void setSourceHandler(std::function<void(const LogSourceState&)> handler) override {
+    _sourceHandler = std::move(handler);
+  }
   void cancelNotifications() override { _notificationPort.reset(); }
 
  private:
   [[nodiscard]] std::shared_ptr<LocalPort> createNotificationPort(
       const std::string& name, std::function<void()> notificationHandler);
+  [[nodiscard]] LogChannelReply createLogChannel(TqServerConnection& connection,
+                                                 const Dictionary& request);
   [[nodiscard]] LogChannelReply readReply(ByteView data) const;
+  void readNotification(ByteView message) const;
 
   MessagePorts& _ports;
   Uuids& _uuids;
   const PropertyListCoding& _coding;
   SystemLog& _log;
   std::string _serverName;
+  std::function<void(const LogSourceState&)> _sourceHandler;
   std::shared_ptr<LocalPort> _notificationPort;  ///< the registration: it lasts as long as the port
 };
 
-LogChannelReply failedReply(LogChannelError error) { return {static_cast<long>(error), {}}; }
+LogChannelReply failedReply(LogChannelError error) { return {.error = static_cast<long>(error)}; }
 
-LogChannelReply failedReply(SendError error) { return {static_cast<long>(error), {}}; }
+LogChannelReply failedReply(SendError error) { return {.error = static_cast<long>(error)}; }
 
 std::unique_ptr<TqServerConnection> PortTelephonyService::_TqServerConnectionCreate(
     std::function<void()> notificationHandler) {
@@ -81,17 +96,28 @@ std::shared_ptr<LocalPort> PortTelephonyService::createNotificationPort(
     const std::string& name, std::function<void()> notificationHandler) {
   const auto handler =
       std::make_shared<const std::function<void()>>(std::move(notificationHandler));
-  return _ports.createLocalPort(name, [handler](std::int32_t id, ByteView) -> std::optional<Bytes> {
-    // A copy of its own: the handler may end the registration, and this function with it.
+  const auto receive = [this, handler](std::int32_t id, ByteView message) -> std::optional<Bytes> {
+    // A copy of its own: a handler may end the registration, and this function with it.
     const auto notify = handler;  // NOLINT(performance-unnecessary-copy-initialization)
-    if (id == messageId(TelephonyMessage::Notification) && *notify) (*notify)();
+    if (id != messageId(TelephonyMessage::Notification)) return std::nullopt;
+    readNotification(message);
+    if (*notify) (*notify)();
     return std::nullopt;
-  });
+  };
+  return _ports.createLocalPort(name, receive);
 }
 
-LogChannelReply PortTelephonyService::_TqServerConnectionNetworkMonitorCreateLogChannel(
-    TqServerConnection& connection, std::string_view localPortName) {
-  const auto message = _coding.xml(Dictionary{{kTelephonyLocalPort, localPortName}});
+void PortTelephonyService::readNotification(ByteView message) const {
+  const auto handler = _sourceHandler;
+  if (!handler) return;
+  const auto body = _coding.parse(message);
+  if (!body || body->dictionary()[kTelephonyNotification].text() != kTelephonySourceChanged) return;
+  handler(sourceStateIn(body->dictionary()));
+}
+
+LogChannelReply PortTelephonyService::createLogChannel(TqServerConnection& connection,
+                                                       const Dictionary& request) {
+  const auto message = _coding.xml(request);
   if (!message) return failedReply(LogChannelError::BadRequest);
   const RemotePort::Reply reply = static_cast<PortServerConnection&>(connection)
                                       .server()
@@ -109,8 +135,14 @@ LogChannelReply PortTelephonyService::readReply(ByteView data) const {
   const Value& error = entries[kTelephonyError];
   const Value& port = entries[kTelephonyPort];
   if (!error.isInteger()) return failedReply(LogChannelError::UnusableReply);
-  return {static_cast<long>(error.integerBits()),
-          port.isText() ? std::optional<std::string>(port.text()) : std::nullopt};
+  LogChannelReply result{.error = static_cast<long>(error.integerBits()),
+                         .source = sourceStateIn(entries)};
+  if (port.isText()) result.portName = std::string(port.text());
+  const Value& lost = entries[kTelephonyLost];
+  if (lost.isInteger() && (lost.isAboveInt64() || lost.integerBits() >= 0)) {
+    result.lost = static_cast<std::uint64_t>(lost.integerBits());
+  }
+  return result;
 }
 
 }  // namespace

@@ -27,6 +27,9 @@ class UnixRemotePort final : public RemotePort, public PortConnection {
                               std::chrono::nanoseconds receiveTimeout) override;
   void invalidate() override { close(); }
   [[nodiscard]] bool isValid() const override;
+  [[nodiscard]] std::size_t unsentMessages(std::int32_t messageId) const override {
+    return unsent(messageId);
+  }
   [[nodiscard]] ProcessNumber owner() const override { return _owner; }
 
  private:

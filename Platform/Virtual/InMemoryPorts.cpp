@@ -121,6 +121,7 @@ class InMemoryPorts::Remote : public RemotePort {
   void invalidate() override { _receiver.reset(); }
 
   [[nodiscard]] bool isValid() const override { return valid() != nullptr; }
+  [[nodiscard]] std::size_t unsentMessages(std::int32_t) const override { return 0; }
   [[nodiscard]] ProcessNumber owner() const override { return _owner; }
 
  private:

@@ -71,6 +71,13 @@ LogChannelReply VirtualTelephonyService::_TqServerConnectionNetworkMonitorCreate
   return _channelHandler ? _channelHandler(localPortName) : LogChannelReply{};
 }
 
+LogChannelReply VirtualTelephonyService::createLogChannelAfter(TqServerConnection& connection,
+                                                               std::string_view localPortName,
+                                                               std::string_view previousPortName) {
+  _previousPorts.emplace_back(previousPortName);
+  return _TqServerConnectionNetworkMonitorCreateLogChannel(connection, localPortName);
+}
+
 class VirtualInputStreams::Stream : public InputStream {
  public:
   explicit Stream(std::shared_ptr<Handlers> handlers) : _handlers(std::move(handlers)) {}

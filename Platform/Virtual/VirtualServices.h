@@ -137,6 +137,12 @@ class VirtualTelephonyService : public TelephonyService {
   // NOLINTNEXTLINE(bugprone-reserved-identifier,readability-identifier-naming)
   [[nodiscard]] LogChannelReply _TqServerConnectionNetworkMonitorCreateLogChannel(
       TqServerConnection& connection, std::string_view localPortName) override;
+  [[nodiscard]] LogChannelReply createLogChannelAfter(TqServerConnection& connection,
+                                                      std::string_view localPortName,
+                                                      std::string_view previousPortName) override;
+  void setSourceHandler(std::function<void(const LogSourceState&)> handler) override {
+    _sourceHandler = std::move(handler);
+  }
   void cancelNotifications() override { _notificationHandler = {}; }
 
   void setReachable(bool reachable) noexcept { _reachable = reachable; }
@@ -148,12 +154,23 @@ class VirtualTelephonyService : public TelephonyService {
   void notify() const {
     if (const auto handler = _notificationHandler) handler();
   }
+  /// Notifies whoever is registered that the source has changed.
+  void notifySource(const LogSourceState& state) const {
+    if (const auto handler = _sourceHandler; handler && _notificationHandler) handler(state);
+    notify();
+  }
+  /// The previous channels' ports that channels were asked for after, in order.
+  [[nodiscard]] const std::vector<std::string>& previousPorts() const noexcept {
+    return _previousPorts;
+  }
   [[nodiscard]] bool hasRegistration() const noexcept { return bool(_notificationHandler); }
 
  private:
   bool _reachable = true;
   std::function<void()> _notificationHandler;
   std::function<LogChannelReply(std::string_view)> _channelHandler;
+  std::function<void(const LogSourceState&)> _sourceHandler;
+  std::vector<std::string> _previousPorts;
 };
 
 /// Streams that a program feeds by hand.

@@ -8,6 +8,7 @@
 #include <string>
 
 #include "Platform/TelephonyService.h"
+#include "Sources/PacketSimulation.h"
 
 namespace kestro {
 namespace {
@@ -206,7 +207,10 @@ Result<SourceStep> IFXSimulation::next() {
   auto bytes = ifxMessageOf(_phone).bytes(_coding);
   if (!bytes) return failure("simulation: a message cannot be serialised");
   _message = std::move(*bytes);
-  return SourceEvent{.time = _time, .technology = technology(), .message = _message};
+  return SourceEvent{.time = _time,
+                     .technology = technology(),
+                     .message = _message,
+                     .moment = kSimulationBegin + _time};
 }
 
 Result<void> IFXSimulation::restart() {

@@ -3,18 +3,45 @@
 
 The programs are found through $KESTRO_CLI and $KESTRO_TELEPHONYD."""
 
+import contextlib
+import itertools
 import json
 import os
 import pathlib
 import socket
+import struct
 import subprocess
 import sys
 import tempfile
+import threading
 import time
 import unittest
 
 PEER = [sys.executable, "-B", str(pathlib.Path(__file__).with_name("peer.py"))]
+EXTENDED_PEER = [sys.executable, "-B", str(pathlib.Path(__file__).with_name("extended_peer.py"))]
 PATIENCE = 30
+
+
+def feed(stream):
+    """Writes numbered messages as a framed stream until nobody reads them, 20 MB/s at most."""
+    with contextlib.suppress(OSError, ValueError), stream:
+        for serial in itertools.count(1):
+            body = (
+                b'<plist version="1.0"><dict><key>Serial</key><integer>%d</integer>'
+                b"<key>Filling</key><string>%s</string></dict></plist>"
+            ) % (serial, b"." * 20_000)
+            stream.write(struct.pack("<I", len(body)) + body)
+            stream.flush()
+            time.sleep(0.001)
+
+
+def capture(messages):
+    """A capture of IFX messages, each with its microseconds."""
+    parts = [struct.pack("<IHHQII", 0xA1B2C3D4, 2, 4, 0, 262144, 147)]
+    for microseconds, body in messages:
+        seconds, fraction = divmod(microseconds, 1_000_000)
+        parts.append(struct.pack("<IIII", seconds, fraction, len(body), len(body)) + body)
+    return b"".join(parts)
 
 
 class Interoperability(unittest.TestCase):
@@ -24,9 +51,9 @@ class Interoperability(unittest.TestCase):
         self.ports = pathlib.Path(folder.name)
         self.environment = {**os.environ, "KESTRO_PORT_DIR": folder.name}
 
-    def start_server(self, command):
+    def start_server(self, command, **options):
         """Starts a program that owns the port TelephonyServer until the test ends."""
-        process = subprocess.Popen(command, env=self.environment)
+        process = subprocess.Popen(command, env=self.environment, **options)
         self.addCleanup(process.wait)
         self.addCleanup(process.kill)
         deadline = time.monotonic() + PATIENCE
@@ -34,6 +61,7 @@ class Interoperability(unittest.TestCase):
             self.assertIsNone(process.poll(), "the server has ended")
             self.assertLess(time.monotonic(), deadline, "the server does not open its port")
             time.sleep(0.01)
+        return process
 
     def listens(self, name):
         with socket.socket(socket.AF_UNIX) as probe:
@@ -65,6 +93,33 @@ class Interoperability(unittest.TestCase):
         )
         lines = self.output([*PEER, "client", "3"])
         self.assertEqual(lines, ["2", "IFX", "0 dict", "0 dict", "0 dict"])
+
+    def test_an_extended_peer_learns_what_it_has_lost(self):
+        server = self.start_server(
+            [os.environ["KESTRO_TELEPHONYD"], "--source=stream:-"], stdin=subprocess.PIPE
+        )
+        threading.Thread(target=feed, args=[server.stdin], daemon=True).start()
+        lines = self.output([*EXTENDED_PEER, "lose"])
+        # One gap, of as many messages as were told; not told twice.
+        self.assertEqual(lines, ["1 0 True", "False"])
+
+    def test_an_extended_peer_learns_the_source_its_times_and_its_end(self):
+        begin = 1_330_862_709_000_042
+        path = self.ports / "drive.pcap~"
+        path.write_bytes(capture([(begin, b"first"), (begin + 1_000_000, b"last")]))
+        self.start_server(
+            [os.environ["KESTRO_TELEPHONYD"], f"--source=capture:{path}", "--speed=0.25"]
+        )
+        lines = self.output([*EXTENDED_PEER, "follow"])
+        self.assertEqual(
+            lines,
+            [
+                f"capture {path} False False",
+                f"{begin + 1_000_000} last",
+                "SourceChanged capture True",
+                "True",
+            ],
+        )
 
 
 if __name__ == "__main__":

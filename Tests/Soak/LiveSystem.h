@@ -38,10 +38,10 @@ class CountingListener : public PlaybackListener {
   void technologyChanged(std::string_view technology) override {
     _server.technologyChanged(technology);
   }
-  void messageDue(ByteView message) override {
+  void messageDue(ByteView message, Moment time) override {
     ++_counts.sent;
     if (_filter.accepts(message)) ++_counts.wanted;
-    _server.messageDue(message);
+    _server.messageDue(message, time);
   }
 
  private:

@@ -75,6 +75,16 @@ TEST_F(DriveTestSourceTest, KeepsThePausesOfTheLog) {
   EXPECT_THAT(milliseconds(readToEnd(*source)), ElementsAre(0, 4000, 49000));
 }
 
+TEST_F(DriveTestSourceTest, TellsTheLogsOwnTimes) {
+  const auto source = open({{5, "-1"}, {5, "-2"}, {6, "-3"}});
+  const auto events = readToEnd(*source);
+  ASSERT_EQ(events.size(), 3U);
+  const Moment begin(seconds(1'574'350'685));  // 2019-11-21 15:38:05
+  EXPECT_EQ(events[0].moment, begin);
+  EXPECT_EQ(events[1].moment, begin + std::chrono::milliseconds(500));
+  EXPECT_EQ(events[2].moment, begin + seconds(1));
+}
+
 TEST_F(DriveTestSourceTest, ARowsMessagesShareItsTime) {
   const auto source = open({{10, "1"}, {10, "-2"}});
   EXPECT_THAT(milliseconds(readToEnd(*source)), ElementsAre(0, 0, 500));

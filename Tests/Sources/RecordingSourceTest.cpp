@@ -43,6 +43,8 @@ TEST_F(RecordingSourceTest, YieldsTheMessagesAtTheirTimesSinceTheFirst) {
   EXPECT_EQ(events[0].message, (Bytes{'a', 'b', 'c'}));
   EXPECT_EQ(events[1].time, microseconds(1'500'000));
   EXPECT_EQ(events[1].message, (Bytes{'d', 'e'}));
+  EXPECT_EQ(events[0].moment, Moment(microseconds(1'330'862'709'000'250)));
+  EXPECT_EQ(events[1].moment, Moment(microseconds(1'330'862'710'500'250)));
   EXPECT_THAT(_lines, IsEmpty());
 }
 

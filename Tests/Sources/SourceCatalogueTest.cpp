@@ -10,6 +10,7 @@
 #include "Platform/Virtual/VirtualPlatform.h"
 #include "Sources/SourceCatalogue.h"
 #include "Tests/Recordings/PcapBytes.h"
+#include "Tests/Sources/SourceReading.h"
 #include "Tests/Support/TemporaryDirectory.h"
 
 namespace kestro {
@@ -60,6 +61,28 @@ TEST_F(SourceCatalogueTest, OpensEveryKind) {
   EXPECT_EQ((*open("capture:" + capture))->technology(), "UTRAN2");
   EXPECT_EQ((*open("drive-test:" + log))->technology(), "IFX");
   EXPECT_EQ((*open("stream:pipe"))->technology(), "IFX");
+}
+
+TEST_F(SourceCatalogueTest, TellsWhatASourceIs) {
+  const auto told = [](std::string_view text) { return stateOf(*parseSource(text, "")); };
+  EXPECT_EQ(told("simulation"), (LogSourceState{.kind = "simulation", .isSimulated = true}));
+  EXPECT_EQ(told("capture:/a.pcap"),
+            (LogSourceState{.kind = "capture", .name = "/a.pcap", .isSimulated = false}));
+  EXPECT_EQ(told("drive-test:a.csv"),
+            (LogSourceState{.kind = "drive-test", .name = "a.csv", .isSimulated = true}));
+  EXPECT_EQ(told("stream:-"),
+            (LogSourceState{.kind = "stream", .name = "-", .isSimulated = false}));
+}
+
+TEST_F(SourceCatalogueTest, SimulationsSayWhenTheirDriveIs) {
+  for (const auto* text : {"simulation:IFX", "simulation:LTE"}) {
+    const auto source = open(text);
+    ASSERT_TRUE(source.has_value());
+    for (int i = 0; i < 100; ++i) {
+      const auto event = readEvent(**source);
+      EXPECT_EQ(event.moment, Moment(std::chrono::seconds(1'330'862'400)) + *event.time) << text;
+    }
+  }
 }
 
 TEST_F(SourceCatalogueTest, TheTechnologyAskedForWins) {

@@ -19,6 +19,7 @@ struct ReadEvent {
   std::optional<std::chrono::microseconds> time;
   std::string technology;
   Bytes message;
+  std::optional<Moment> moment = std::nullopt;
 };
 
 /// The source's next event, which there must be.
@@ -34,7 +35,7 @@ inline ReadEvent readEvent(LogSource& source) {
     return {};
   }
   return {event->time, std::string(event->technology),
-          Bytes(event->message.begin(), event->message.end())};
+          Bytes(event->message.begin(), event->message.end()), event->moment};
 }
 
 /// All events up to the source's regular end.
@@ -52,7 +53,7 @@ inline std::vector<ReadEvent> readToEnd(LogSource& source) {
       return events;
     }
     events.push_back({event->time, std::string(event->technology),
-                      Bytes(event->message.begin(), event->message.end())});
+                      Bytes(event->message.begin(), event->message.end()), event->moment});
   }
 }
 

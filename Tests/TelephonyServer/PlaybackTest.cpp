@@ -28,6 +28,7 @@ struct Scripted {
   std::string message;
   std::string_view technology = "IFX";
   std::string error = {};
+  std::optional<Moment> moment = std::nullopt;
 };
 
 class ScriptedSource : public LogSource {
@@ -41,7 +42,10 @@ class ScriptedSource : public LogSource {
     const Scripted& step = _script[_position++];
     if (!step.error.empty()) return failure(step.error);
     _message.assign(step.message.begin(), step.message.end());
-    return SourceEvent{.time = step.time, .technology = step.technology, .message = _message};
+    return SourceEvent{.time = step.time,
+                       .technology = step.technology,
+                       .message = _message,
+                       .moment = step.moment};
   }
   [[nodiscard]] Result<void> restart() override {
     ++restarts;
@@ -81,7 +85,11 @@ class PlaybackTest : public ::testing::Test, public PlaybackListener {
   }
 
   void technologyChanged(std::string_view technology) override { note(std::string(technology)); }
-  void messageDue(ByteView message) override { note(std::string(message.begin(), message.end())); }
+  void messageDue(ByteView message, Moment time) override {
+    note(std::string(message.begin(), message.end()));
+    _times.push_back(time);
+  }
+  void sourceEnded() override { ++_ends; }
   void note(const std::string& what) {
     _heard.push_back(std::to_string(_queue.elapsed() / milliseconds(1)) + " " + what);
   }
@@ -92,6 +100,8 @@ class PlaybackTest : public ::testing::Test, public PlaybackListener {
   ScriptedSource* _source = nullptr;
   std::unique_ptr<Playback> _playback;
   std::vector<std::string> _heard;
+  std::vector<Moment> _times;
+  int _ends = 0;
   std::vector<std::string> _lines;
 };
 
@@ -104,6 +114,31 @@ TEST_F(PlaybackTest, HandsOverEachMessageWhenItIsDue) {
   EXPECT_THAT(take(), ElementsAre("250 b"));
   _queue.advance(seconds(5));
   EXPECT_THAT(take(), ElementsAre("3000 c"));
+}
+
+TEST_F(PlaybackTest, TellsWhenTheSourceHadEachMessageAndElseTheTimeItIs) {
+  const Moment recorded(seconds(1'330'862'709));
+  _clock.setNow(Moment(seconds(1'400'000'000)));
+  play({{.time = milliseconds(0), .message = "a", .moment = recorded},
+        {.time = milliseconds(250), .message = "b"}});
+  _queue.advance(seconds(1));
+  EXPECT_THAT(_times, ElementsAre(recorded, Moment(milliseconds(1'400'000'000'250))));
+}
+
+TEST_F(PlaybackTest, TellsOnceThatTheSourceHasEnded) {
+  play({{milliseconds(0), "a"}});
+  EXPECT_EQ(_ends, 0);
+  _queue.advance(seconds(5));
+  EXPECT_EQ(_ends, 1);
+}
+
+TEST_F(PlaybackTest, ASourceThatBeginsAgainHasNotEndedUnlessThatFails) {
+  play({{milliseconds(0), "a"}}, {.loop = true});
+  _queue.advance(milliseconds(500));
+  EXPECT_EQ(_ends, 0);
+  _source->restartError = "no more";
+  _queue.advance(seconds(5));
+  EXPECT_EQ(_ends, 1);
 }
 
 TEST_F(PlaybackTest, AHigherSpeedShortensThePauses) {

@@ -83,13 +83,31 @@ class ServerTest : public ::testing::Test {
     EXPECT_EQ(channel->send(0, xml(body), seconds(1)), SendError::None);
     run();
   }
+  /// A client whose channel is lost, since it does not read: of seven messages, of 1 MiB each, it
+  /// misses the last three. The channel's port.
+  std::string loseChannel(const std::string& client, const Dictionary& start) {
+    openClientPort(client);
+    const std::string port(requestChannel(client)["Port"].text());
+    command(connect(port), start);
+    _platform.messagePorts().setStalled(client, true);
+    for (int i = 0; i < 7; ++i) stream(std::string(1024 * 1024, 'x'));
+    EXPECT_EQ(_server->channelCount(), 0U);
+    _platform.messagePorts().setStalled(client, false);
+    run();
+    EXPECT_EQ(_received[client].size(), 4U);
+    _received[client].clear();
+    return port;
+  }
+  Dictionary requestChannelAfter(const std::string& client, const std::string& previous) {
+    return request(xml({{"LocalPort", client}, {"Previous", previous}}));
+  }
   void registerPort(const std::string& name) {
     EXPECT_EQ(connect("TelephonyServer")->send(1, xml({{"NotificationPort", name}}), seconds(1)),
               SendError::None);
     run();
   }
-  void stream(std::string_view message) {
-    _server->messageDue(bytesOf(message));
+  void stream(std::string_view message, Moment time = {}) {
+    _server->messageDue(bytesOf(message), time);
     run();
   }
   void run() { _platform.mainQueue().runReady(); }
@@ -265,6 +283,7 @@ TEST_F(ServerTest, MalformedCommandsAreDroppedWithALine) {
       xml({{"SetState", Value::integer(1)}}),
       xml({{"SetState", "Streaming"}, {"SetOndrelLogCodes", "17"}}),
       xml({{"SetState", "Streaming"}, {"SetOndrelLogCodes", Array{"17"}}}),
+      xml({{"SetState", "Streaming"}, {"Times", Value::integer(1)}}),
       xml({{"SetState", "Streaming"}, {"SetTqExtraCodes", Array{Value::integer(-1)}}}),
       xml({{"SetState", "Streaming"}, {"SetTqExtraCodes", Array{Value::integer(65536)}}})};
   for (std::size_t i = 0; i < bodies.size(); ++i) {
@@ -323,7 +342,7 @@ TEST_F(ServerTest, ASlowClientLosesItsChannelAndStallsNobody) {
 TEST_F(ServerTest, AMessageThatNoQueueHoldsIsLeftOutForAll) {
   const auto channel = openStream("A");
   logLines();
-  _server->messageDue(Bytes(Server::kMaximumStreamedMessage + 1));
+  _server->messageDue(Bytes(Server::kMaximumStreamedMessage + 1), {});
   run();
   EXPECT_THAT(_received["A"], IsEmpty());
   EXPECT_TRUE(channel->isValid());
@@ -410,6 +429,132 @@ TEST_F(ServerTest, ItsOwnPortsAndOthersAreNotRegistered) {
                           "000000000001 is the server's own",
                           "A registration is dropped: the port Others is not of the process that "
                           "asks"));
+}
+
+// What old clients do not ask for.
+
+TEST_F(ServerTest, TellsItsSourceWithTheChannel) {
+  openClientPort("A");
+  EXPECT_EQ(Value(requestChannel("A")), Value(Dictionary{{"Error", Value::integer(0)},
+                                                         {"Port", kFirstChannel},
+                                                         {"Ended", Value::boolean(false)}}));
+  _server->setSource({.kind = "capture", .name = "/a.pcap", .isSimulated = false});
+  EXPECT_EQ(Value(requestChannel("A")),
+            Value(Dictionary{{"Error", Value::integer(0)},
+                             {"Port", "LogChannel.00000000-0000-0000-0000-000000000002"},
+                             {"Source", Dictionary{{"Kind", "capture"}, {"Name", "/a.pcap"}}},
+                             {"Simulated", Value::boolean(false)},
+                             {"Ended", Value::boolean(false)}}));
+}
+
+TEST_F(ServerTest, NotifiesOfTheEndOfItsSourceAndTellsItLater) {
+  openClientPort("N");
+  registerPort("N");
+  const auto channel = openChannel("A");
+  _server->setSource({.kind = "simulation", .isSimulated = true});
+  _server->sourceEnded();
+  run();
+  const Dictionary expected{{"Notification", "SourceChanged"},
+                            {"Source", Dictionary{{"Kind", "simulation"}}},
+                            {"Simulated", Value::boolean(true)},
+                            {"Ended", Value::boolean(true)}};
+  ASSERT_EQ(_received["N"].size(), 1U);
+  ASSERT_TRUE(_received["N"][0].starts_with("3:"));
+  EXPECT_EQ(Value(parsed(bytesOf(_received["N"][0].substr(2)))), Value(expected));
+  EXPECT_TRUE(channel->isValid());
+  EXPECT_EQ(requestChannel("A")["Ended"], Value::boolean(true));
+}
+
+TEST_F(ServerTest, SendsTheSourcesTimesBeforeTheMessagesToWhoAsks) {
+  const auto a = openStream("A");
+  const auto b = openChannel("B");
+  command(b, {{"SetState", "Streaming"},
+              {"Times", Value::boolean(true)},
+              {"SetOndrelLogCodes", Array{Value::integer(0x4241)}}});
+  stream("\x01..AB", Moment(std::chrono::microseconds(0x0807060504030201)));
+  stream("\x01..XY", Moment(std::chrono::microseconds(1)));
+  EXPECT_THAT(_received["A"], ElementsAre("0:\x01..AB", "0:\x01..XY"));
+  EXPECT_THAT(_received["B"], ElementsAre("4:\x01\x02\x03\x04\x05\x06\x07\x08", "0:\x01..AB"));
+  command(b, {{"SetState", "Streaming"}});
+  _received["B"].clear();
+  stream("\x01..AB");
+  EXPECT_THAT(_received["B"], ElementsAre("0:\x01..AB"));
+}
+
+TEST_F(ServerTest, TellsWhatALostChannelHasMissedAndGoesOnWithoutAGap) {
+  const auto previous = loseChannel("A", {{"SetState", "Streaming"}});
+  stream("missed");
+  const auto reply = requestChannelAfter("A", previous);
+  EXPECT_EQ(reply["Error"], Value::integer(0));
+  EXPECT_EQ(reply["Lost"], Value::integer(4));
+  stream("next");  // before the client has asked for anything on its new channel
+  const auto channel = connect(reply["Port"].text());
+  command(channel, {{"SetState", "Streaming"}});
+  stream("last");
+  EXPECT_THAT(_received["A"], ElementsAre("0:next", "0:last"));
+}
+
+TEST_F(ServerTest, ALostChannelMissesWhatItHadAskedFor) {
+  const auto previous =
+      loseChannel("A", {{"SetState", "Streaming"},
+                        {"SetOndrelLogCodes", Array{Value::integer('x' << 8 | 'x')}},
+                        {"SetTqExtraCodes", Array{}}});
+  stream("\x01..xy");
+  stream("\x01..xx");
+  EXPECT_EQ(requestChannelAfter("A", previous)["Lost"], Value::integer(4));
+  stream("\x01..xy");
+  stream("\x01..xx");
+  EXPECT_THAT(_received["A"], ElementsAre("0:\x01..xx"));
+}
+
+TEST_F(ServerTest, ALostChannelIsForgottenAfterAMinute) {
+  const auto previous = loseChannel("A", {{"SetState", "Streaming"}});
+  _platform.mainQueue().advance(seconds(61));
+  const auto reply = requestChannelAfter("A", previous);
+  EXPECT_EQ(reply["Error"], Value::integer(0));
+  EXPECT_TRUE(reply["Lost"].isNull());
+  stream("unasked");
+  EXPECT_THAT(_received["A"], IsEmpty());
+}
+
+TEST_F(ServerTest, ALostChannelIsItsClientsOnly) {
+  const auto previous = loseChannel("A", {{"SetState", "Streaming"}});
+  const auto other = _platform.messagePorts().portsOf(7);
+  const auto port = other->createLocalPort("Other", {});
+  const auto body = xml({{"LocalPort", "Other"}, {"Previous", previous}});
+  EXPECT_TRUE(request(*other, body)["Lost"].isNull());
+  EXPECT_EQ(requestChannelAfter("A", previous)["Lost"], Value::integer(3));
+}
+
+TEST_F(ServerTest, AChannelThatItsClientHasGivenUpIsLostAndMissesNothingYet) {
+  openClientPort("A");
+  const std::string previous(requestChannel("A")["Port"].text());
+  command(connect(previous), {{"SetState", "Streaming"}});
+  EXPECT_EQ(requestChannelAfter("A", previous)["Lost"], Value::integer(0));
+  EXPECT_EQ(_server->channelCount(), 1U);
+  stream("once");
+  EXPECT_THAT(_received["A"], ElementsAre("0:once"));
+}
+
+TEST_F(ServerTest, WhatAChannelThatNeverStreamedMissesIsNotKnown) {
+  openClientPort("A");
+  const std::string previous(requestChannel("A")["Port"].text());
+  EXPECT_TRUE(requestChannelAfter("A", previous)["Lost"].isNull());
+  EXPECT_TRUE(requestChannelAfter("A", "Unheard")["Lost"].isNull());
+  EXPECT_TRUE(request(xml({{"LocalPort", "A"}, {"Previous", Value::integer(1)}}))["Lost"].isNull());
+}
+
+TEST_F(ServerTest, AChangeOfTechnologyCountsForWhoAskedForEverything) {
+  openClientPort("A");
+  const std::string all(requestChannel("A")["Port"].text());
+  command(connect(all), {{"SetState", "Streaming"}});
+  openClientPort("B");
+  const std::string codes(requestChannel("B")["Port"].text());
+  command(connect(codes), {{"SetState", "Streaming"}, {"SetOndrelLogCodes", Array{}}});
+  _server->technologyChanged("LTE");
+  stream("new");
+  EXPECT_EQ(requestChannelAfter("A", all)["Lost"], Value::integer(1));
+  EXPECT_TRUE(requestChannelAfter("B", codes)["Lost"].isNull());
 }
 
 TEST_F(ServerTest, ThereAreNoMoreThan512Registrations) {

@@ -69,6 +69,23 @@ TEST_F(PortSendQueueTest, AFrameBegunCannotBeTakenBack) {
   EXPECT_EQ(queue.size(), before);
 }
 
+TEST_F(PortSendQueueTest, CountsTheMessagesThatAreNotWrittenWhole) {
+  EXPECT_TRUE(queue.waitingMessages().empty());
+  append("written");
+  append(kLongBody);
+  append("after");
+  queue.append({.kind = PortFrameKind::Message, .messageId = -4}, bytesOf("other"));
+  queue.append({.kind = PortFrameKind::Request, .messageId = 1, .sequence = 1}, {});
+  EXPECT_EQ(queue.waitingMessages(), (std::map<std::int32_t, std::size_t>{{1, 3}, {-4, 1}}));
+  ASSERT_EQ(flush(), FlushStatus::Blocked);
+  EXPECT_EQ(queue.waitingMessages(), (std::map<std::int32_t, std::size_t>{{1, 2}, {-4, 1}}));
+  for (int i = 0; flush() == FlushStatus::Blocked; ++i) {
+    if (i == 0) append("last");
+    static_cast<void>(peer->receiveAvailable());
+  }
+  EXPECT_TRUE(queue.waitingMessages().empty());
+}
+
 TEST_F(PortSendQueueTest, APeerThatIsGoneBreaksItWithoutASignal) {
   append("lost");
   peer->close();

@@ -55,6 +55,7 @@ class NotingPorts : public MessagePorts {
     }
     void invalidate() override {}
     [[nodiscard]] bool isValid() const override { return true; }
+    [[nodiscard]] std::size_t unsentMessages(std::int32_t) const override { return 0; }
     [[nodiscard]] ProcessNumber owner() const override { return kUnknownProcess; }
 
    private:
@@ -97,6 +98,13 @@ class TelephonyServiceTest : public ::testing::Test {
     const auto remote = ports.createRemotePort(port);
     ASSERT_TRUE(remote);
     EXPECT_EQ(remote->post(id, bytesOf("whatever")), SendError::None);
+    queue.runReady();
+  }
+
+  void notify(const Dictionary& body) {
+    const auto remote = ports.createRemotePort(kFirstPort);
+    ASSERT_TRUE(remote);
+    EXPECT_EQ(remote->post(3, *coding->xml(body)), SendError::None);
     queue.runReady();
   }
 
@@ -240,6 +248,80 @@ TEST_F(TelephonyServiceTest, AChannelWithoutAPortNameIsPassedOn) {
   const auto channel = requestChannel();
   EXPECT_EQ(channel.error, 0);
   EXPECT_EQ(channel.portName, std::nullopt);
+}
+
+TEST_F(TelephonyServiceTest, AsksForAChannelAfterALostOne) {
+  startServer();
+  reply = coding->xml(
+      Dictionary{{"Error", Value::integer(0)}, {"Port", "B"}, {"Lost", Value::integer(823'387)}});
+  const auto connection = connect();
+  const auto channel = service->createLogChannelAfter(*connection, "KestroApp.2", "LogChannel.1");
+  EXPECT_EQ(channel.portName, "B");
+  EXPECT_EQ(channel.lost, 823'387U);
+  EXPECT_EQ(received.back().id, 2);
+  EXPECT_EQ(received.back().body,
+            Value(Dictionary{{"LocalPort", "KestroApp.2"}, {"Previous", "LogChannel.1"}}));
+}
+
+TEST_F(TelephonyServiceTest, TheReplyTellsTheSource) {
+  startServer();
+  reply = coding->xml(Dictionary{{"Error", Value::integer(0)},
+                                 {"Port", "B"},
+                                 {"Source", Dictionary{{"Kind", "capture"}, {"Name", "a.pcap"}}},
+                                 {"Simulated", Value::boolean(false)},
+                                 {"Ended", Value::boolean(true)}});
+  EXPECT_EQ(requestChannel().source,
+            (LogSourceState{
+                .kind = "capture", .name = "a.pcap", .isSimulated = false, .hasEnded = true}));
+}
+
+TEST_F(TelephonyServiceTest, AServerThatTellsNothingMoreIsUnderstood) {
+  startServer();
+  reply = coding->xml(Dictionary{{"Error", Value::integer(0)}, {"Port", "B"}});
+  const auto connection = connect();
+  const auto channel = service->createLogChannelAfter(*connection, "KestroApp.2", "LogChannel.1");
+  EXPECT_EQ(channel.error, 0);
+  EXPECT_EQ(channel.source, LogSourceState());
+  EXPECT_EQ(channel.lost, std::nullopt);
+}
+
+TEST_F(TelephonyServiceTest, WhatIsToldInAnotherFormIsNotTold) {
+  startServer();
+  reply = coding->xml(Dictionary{{"Error", Value::integer(0)},
+                                 {"Port", "B"},
+                                 {"Source", "capture"},
+                                 {"Simulated", "true"},
+                                 {"Ended", Value::integer(1)},
+                                 {"Lost", Value::integer(-1)}});
+  const auto channel = requestChannel();
+  EXPECT_EQ(channel.portName, "B");
+  EXPECT_EQ(channel.source, LogSourceState());
+  EXPECT_EQ(channel.lost, std::nullopt);
+}
+
+TEST_F(TelephonyServiceTest, AChangeOfTheSourceIsToldBeforeTheNotification) {
+  startServer();
+  const auto connection = connect();
+  std::vector<LogSourceState> states;
+  service->setSourceHandler([&](const LogSourceState& state) {
+    EXPECT_EQ(notifications, 0);
+    states.push_back(state);
+  });
+  notify({{"Notification", "SourceChanged"}, {"Ended", Value::boolean(true)}});
+  EXPECT_THAT(states, ElementsAre(LogSourceState{.hasEnded = true}));
+  EXPECT_EQ(notifications, 1);
+}
+
+TEST_F(TelephonyServiceTest, OtherNotificationsTellNothingOfTheSource) {
+  startServer();
+  const auto connection = connect();
+  service->setSourceHandler([](const LogSourceState&) { ADD_FAILURE(); });
+  notify({{"Notification", "TechnologyChanged"}, {"Ended", Value::boolean(true)}});
+  sendTo(kFirstPort, 3);  // no property list
+  EXPECT_EQ(notifications, 2);
+  service->setSourceHandler({});
+  notify({{"Notification", "SourceChanged"}});
+  EXPECT_EQ(notifications, 3);
 }
 
 TEST_F(TelephonyServiceTest, RunningOutOfTimeIsAnError) {

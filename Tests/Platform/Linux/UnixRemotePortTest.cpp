@@ -368,6 +368,21 @@ TEST_F(UnixRemotePortTest, MoreThanTheQueueHoldsClosesTheConnectionWithALine) {
                           "4194320 bytes wait, at most 4194304 may"));
 }
 
+TEST_F(UnixRemotePortTest, CountsTheMessagesThatDoNotLeave) {
+  connectToPeer();
+  EXPECT_EQ(remote->post(0, bytesOf("leaves")), SendError::None);
+  EXPECT_EQ(remote->unsentMessages(0), 1U);
+  turnUntilIdle();
+  EXPECT_EQ(remote->unsentMessages(0), 0U);
+  fillConnection();
+  for (int i = 0; i < 3; ++i) EXPECT_EQ(remote->post(0, Bytes(kMebibyte)), SendError::None);
+  EXPECT_EQ(remote->post(4, {}), SendError::None);
+  EXPECT_EQ(remote->post(0, Bytes(kMebibyte)), SendError::Transport);
+  EXPECT_EQ(remote->unsentMessages(0), 3U);
+  EXPECT_EQ(remote->unsentMessages(4), 1U);
+  EXPECT_EQ(remote->unsentMessages(1), 0U);
+}
+
 TEST_F(UnixRemotePortTest, WhenMuchWaitsForManyEachMayHoldUpLess) {
   std::vector<RawListener> listeners;
   std::vector<std::shared_ptr<RemotePort>> slow;
