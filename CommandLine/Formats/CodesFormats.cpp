@@ -83,6 +83,9 @@ void appendCode(std::string& output, const ListedCode& code) {
   auto end = std::back_inserter(output);
   fmt::format_to(end, "  {:<8}  {}", logCodeText(code.code), nameOf(code));
   if (code.minimumLength > 0) fmt::format_to(end, ", from {} bytes", code.minimumLength);
+  for (const std::string& text : requirementTexts(code.entries.front().requirements)) {
+    fmt::format_to(end, ", {}", text);
+  }
   output += '\n';
   for (const CatalogueEntry& entry : code.entries) {
     fmt::format_to(end, "    {}\n", entry.section);
@@ -150,6 +153,13 @@ void writeCode(JsonWriter& writer, const ListedCode& code) {
   writeText(writer, "name", code.name);
   writer.key("minimumLength");
   writer.number(code.minimumLength);
+  const std::vector<std::string> requirements = requirementTexts(code.entries.front().requirements);
+  if (!requirements.empty()) {
+    writer.key("requirements");
+    writer.beginArray();
+    for (const std::string& text : requirements) writer.text(text);
+    writer.endArray();
+  }
   writer.key("sections");
   writer.beginArray();
   for (const CatalogueEntry& entry : code.entries) writeEntry(writer, entry);

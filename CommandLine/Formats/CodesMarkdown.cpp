@@ -22,7 +22,8 @@ recording, byte by byte, is told by `kestro-cli explain`.
   time (8), little-endian. Offsets count from the packet's first byte. A message may carry a prefix
   of 2 bytes, the first of them 0x81, in front of its packet; it is no part of the packet.
 - "From 33 bytes" is the least length of a packet that is decoded. Shorter ones change nothing,
-  unless a section says what it takes from a shorter packet. A byte past the end reads as 0.
+  unless a section says what it takes from a shorter packet. What follows ("exactly that long") a
+  packet must have, too. A byte past the end reads as 0.
 - `u16 at 19, bits 0-8` are the 9 least significant bits of the unsigned 16-bit integer in the bytes
   19 and 20. Integers are little-endian unless said otherwise, `s` stands for signed ones (two's
   complement). In tables of records `+4` counts from the record's first byte.
@@ -120,7 +121,13 @@ void appendEntry(std::string& output, const CatalogueEntry& entry) {
 void appendCodeChapter(std::string& output, const ListedCode& code) {
   auto end = std::back_inserter(output);
   fmt::format_to(end, "\n#### {} {}\n", logCodeText(code.code), titleOf(code));
-  if (code.minimumLength != 0) fmt::format_to(end, "\nFrom {} bytes.\n", code.minimumLength);
+  if (code.minimumLength != 0) {
+    fmt::format_to(end, "\nFrom {} bytes", code.minimumLength);
+    for (const std::string& text : requirementTexts(code.entries.front().requirements)) {
+      fmt::format_to(end, ", {}", text);
+    }
+    output += ".\n";
+  }
   for (const CatalogueEntry& entry : code.entries) appendEntry(output, entry);
 }
 

@@ -5,6 +5,7 @@
 #include <fmt/ranges.h>
 
 #include <algorithm>
+#include <utility>
 #include <vector>
 
 namespace kestro {
@@ -79,6 +80,26 @@ std::string conditionText(const Condition& condition, bool inRecord) {
   return fmt::format("({}) is {} to {}", place, condition.lowest, condition.highest);
 }
 
+std::string requirementText(const Requirement& requirement) {
+  switch (requirement.kind) {
+    case Requirement::Kind::MinimumLength:
+      return "";
+    case Requirement::Kind::ExactLength:
+      return "exactly that long";
+    case Requirement::Kind::HoldsRecords:
+      return "long enough for all its records";
+    case Requirement::Kind::EndsWithRecords:
+      return "ending with the last of its records";
+    case Requirement::Kind::Number:
+      return "only where " + conditionText(requirement.condition, false);
+    case Requirement::Kind::SubPackets:
+      return fmt::format("with {} {}",
+                         requirement.subPackets.size() == 1 ? "sub-packet" : "sub-packets",
+                         fmt::join(requirement.subPackets, " and "));
+  }
+  return "";
+}
+
 bool hasName(const TextRule& rule, std::int64_t value) {
   return std::ranges::find(rule.names, value, &NamedValue::value) != rule.names.end();
 }
@@ -137,6 +158,15 @@ std::string placeText(const Place& place, bool inRecord) {
   if (place.bitCount == 8 * place.width) return text;
   if (place.bitCount == 1) return text + fmt::format(", bit {}", place.firstBit);
   return text + fmt::format(", bits {}-{}", place.firstBit, place.firstBit + place.bitCount - 1);
+}
+
+std::vector<std::string> requirementTexts(std::span<const Requirement> requirements) {
+  std::vector<std::string> texts;
+  for (const Requirement& requirement : requirements) {
+    std::string text = requirementText(requirement);
+    if (!text.empty()) texts.push_back(std::move(text));
+  }
+  return texts;
 }
 
 std::string ruleText(const TextRule& rule) {

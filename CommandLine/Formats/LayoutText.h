@@ -2,7 +2,9 @@
 // A packet's layout in words, for the list of log codes.
 #pragma once
 
+#include <span>
 #include <string>
+#include <vector>
 
 #include "LogGenerator/Packets/Catalogue.h"
 
@@ -14,6 +16,10 @@ namespace kestro {
 /// Where a place lies: "u16 at 19, bits 0-8". An offset that counts from a record's beginning has a
 /// plus sign when `inRecord`: "s8 at +4".
 [[nodiscard]] std::string placeText(const Place& place, bool inRecord);
+
+/// What a packet must have besides the least length: "exactly that long", "only where (u8 at 13) is
+/// 2 to 255".
+[[nodiscard]] std::vector<std::string> requirementTexts(std::span<const Requirement> requirements);
 
 /// How a raw value x is shown: "0.25x - 140 as %4.2f dBm; 64: Not Present".
 [[nodiscard]] std::string ruleText(const TextRule& rule);

@@ -64,7 +64,7 @@ std::vector<CatalogueKey> keysOf(const PacketReading& reading, std::string_view 
 class CodeEntries {
  public:
   explicit CodeEntries(const C2KParser& parser, const TemplatePlaces& places)
-      : _reading(parser.reading()) {
+      : _reading(parser.reading()), _requirements(parser.rules().requirements) {
     for (const std::string_view name : parser.lookupNames()) {
       const std::span<const DisplayPlace> shownAt = places.of(name);
       for (const DisplayPlace& place : shownAt) {
@@ -84,6 +84,7 @@ class CodeEntries {
       entry = _entries.insert(entry, {.code = _reading.packet.code,
                                       .packetName = _reading.packet.name,
                                       .minimumLength = _reading.packet.minimumLength,
+                                      .requirements = _requirements,
                                       .section = section});
     }
     std::ranges::copy(keysOf(_reading, lookupName, key), std::back_inserter(entry->keys));
@@ -91,6 +92,7 @@ class CodeEntries {
   }
 
   const PacketReading& _reading;
+  std::span<const Requirement> _requirements;
   std::vector<CatalogueEntry> _entries;
 };
 

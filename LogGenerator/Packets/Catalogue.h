@@ -7,6 +7,7 @@
 #include <string_view>
 #include <vector>
 
+#include "LogGenerator/Packets/Requirement.h"
 #include "LogGenerator/Packets/Section.h"
 
 namespace kestro {
@@ -30,6 +31,8 @@ struct CatalogueEntry {
   std::string_view packetName{};  ///< empty when the section takes nothing from the packet
   /// In bytes. A shorter packet writes `shorterKeys` and nothing else. 0 when any length will do.
   std::size_t minimumLength = 0;
+  /// What a packet must have, where that is more than the least length; constants.
+  std::span<const Requirement> requirements{};
   std::string_view section{};
   SectionKind kind = SectionKind::Dictionary;
   std::vector<CatalogueKey> keys{};         ///< in the layout's order, each once

@@ -67,6 +67,20 @@ TEST(CodesTable, HasCodeNameLengthSectionsAndKeys) {
             "    Other\n");
 }
 
+TEST(CodesFormats, SayWhatAPacketMustHaveBesidesItsLength) {
+  static constexpr Requirement kRequirements[] = {
+      kMinimumLength, {Requirement::Kind::HoldsRecords, ""}, {Requirement::Kind::ExactLength, ""}};
+  std::vector<TechnologyCodes> technologies = sample();
+  technologies[1].families[0].codes[0].entries[0].requirements = kRequirements;
+  const std::string said = "long enough for all its records, exactly that long";
+  EXPECT_THAT(text("table", technologies), HasSubstr("Cells, from 16 bytes, " + said + "\n"));
+  EXPECT_THAT(text("markdown", technologies), HasSubstr("\nFrom 16 bytes, " + said + ".\n"));
+  const auto codes = nlohmann::json::parse(text("json", technologies))[1]["codes"];
+  EXPECT_EQ(codes[0]["requirements"],
+            nlohmann::json({"long enough for all its records", "exactly that long"}));
+  EXPECT_FALSE(codes[1].contains("requirements"));
+}
+
 constexpr Field kOddFields[] = {{"Old Channel", removed()}, {"State", u8(14), decimal()}};
 constexpr Field kShorterFields[] = {{"State", u8(14), named({}, "Unknown")}};
 

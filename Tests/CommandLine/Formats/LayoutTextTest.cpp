@@ -1,10 +1,13 @@
 // SPDX-License-Identifier: MIT
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "CommandLine/Formats/LayoutText.h"
 
 namespace kestro {
 namespace {
+
+using ::testing::ElementsAre;
 
 TEST(LogCodeText, HasFourHexadecimalDigitsAtLeast) {
   EXPECT_EQ(logCodeText(0xB17F), "0xB17F");
@@ -138,6 +141,23 @@ TEST(TableText, SaysWhereTheTwinsLie) {
   EXPECT_EQ(tableText(table),
             "one for each cell; count: u8 at 15; from byte 16, 9 bytes each; "
             "twins from byte 16 + 9 x (u8 at 15), 44 bytes each");
+}
+
+TEST(RequirementTexts, SayWhatIsMoreThanTheLeastLength) {
+  constexpr std::uint8_t kIds[] = {1, 2};
+  const Requirement requirements[] = {
+      kMinimumLength,
+      {Requirement::Kind::ExactLength, ""},
+      {Requirement::Kind::HoldsRecords, ""},
+      {Requirement::Kind::EndsWithRecords, ""},
+      {.kind = Requirement::Kind::Number, .line = "", .condition = between(u8(13), 2, 255)},
+      {.kind = Requirement::Kind::SubPackets, .line = "", .subPackets = kIds},
+      {.kind = Requirement::Kind::SubPackets, .line = "", .subPackets = std::span(kIds).first(1)}};
+  EXPECT_THAT(
+      requirementTexts(requirements),
+      ElementsAre("exactly that long", "long enough for all its records",
+                  "ending with the last of its records", "only where (u8 at 13) is 2 to 255",
+                  "with sub-packets 1 and 2", "with sub-packet 1"));
 }
 
 TEST(PartText, NamesTheCells) {
