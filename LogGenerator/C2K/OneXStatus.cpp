@@ -26,19 +26,17 @@ constexpr NamedValue kStateNames[] = {
 constexpr Place kOneXState = u8(4).ofTwin();
 constexpr Condition kInTraffic = equals(kOneXState, 8);
 
-constexpr TextRule receivePower() { return scaled(0.334, -63.248, "%+.2f dBm"); }
+constexpr TextRule receivePower() { return scaled("%+.2f dBm", -63.248, 0.334); }
 
 constexpr Field kOneXFields[] = {
     {"k1xDeviceState", kOneXState, namedElse(kStateNames, "[Bad Value %d]")},
     {"k1xRx0BandClass", u8(4), bandClass()},
     {"k1xRx0ChanNum", u16(6), decimal()},
     {"k1xRxAGC0", s8(10), receivePower()},
-    Field("k1xRx1BandClass", u8(5), bandClass()).when(kInTraffic).elseText(kNotAvailable),
-    Field("k1xRx1ChanNum", u16(8), decimal()).when(kInTraffic).elseText(kNotAvailable),
-    Field("k1xRxAGC1", s8(11), receivePower()).when(kInTraffic).elseText(kNotAvailable),
-    Field("k1xTxAGC", s16(12), scaled(0.1, 0, "%+.2f dBm"))
-        .when(kInTraffic)
-        .elseText(kNotAvailable),
+    {"k1xRx1BandClass", u8(5), bandClass(), when(kInTraffic).elseText(kNotAvailable)},
+    {"k1xRx1ChanNum", u16(8), decimal(), when(kInTraffic).elseText(kNotAvailable)},
+    {"k1xRxAGC1", s8(11), receivePower(), when(kInTraffic).elseText(kNotAvailable)},
+    {"k1xTxAGC", s16(12), scaled("%+.2f dBm", 0, 0.1), when(kInTraffic).elseText(kNotAvailable)},
 };
 static_assert(isLayout(kOneXFields));
 

@@ -85,7 +85,7 @@ constexpr Field kRankedUMTSCell[] = {
     {"Scrambling Code", u16(2), decimal()},
     {"RSCP", s8(4), decimal("%d dB", -21)},
     {"Rank Cell RSCP", s16(5), decimal("%d dB")},
-    {"Energy Per Chip", s8(7), scaled(0.5, 0, "%f dB")},
+    {"Energy Per Chip", s8(7), scaled("%f dB", 0, 0.5)},
     {"Ranking Value", s16(8), decimal()},
 };
 static_assert(isLayout(kRankedUMTSCell));

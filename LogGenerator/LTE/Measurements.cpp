@@ -13,10 +13,10 @@ constexpr std::string_view kNotPresent = "Not Present";
 constexpr NamedValue kTrueFalse[] = {{0, "False"}, {1, "True"}};
 
 // Levels come in steps of 1/4 or 1/2 dB, qualities in steps of 1/8 or 1/4 dB.
-constexpr TextRule quarterDbm() { return scaled(0.25, -140, "%4.2f dBm"); }
-constexpr TextRule halfDbm() { return scaled(0.5, -140, "%4.2f dBm"); }
-constexpr TextRule eighthDb() { return scaled(0.125, -20, "%4.2f dB"); }
-constexpr TextRule quarterDb() { return scaled(0.25, -30, "%4.2f dB"); }
+constexpr TextRule quarterDbm() { return scaled("%4.2f dBm", -140, 0.25); }
+constexpr TextRule halfDbm() { return scaled("%4.2f dBm", -140, 0.5); }
+constexpr TextRule eighthDb() { return scaled("%4.2f dB", -20, 0.125); }
+constexpr TextRule quarterDb() { return scaled("%4.2f dB", -30, 0.25); }
 
 // --- 0xB179: intra-frequency measurement: a header, the measured neighbours, the detected cells --
 

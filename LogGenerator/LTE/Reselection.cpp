@@ -24,16 +24,16 @@ constexpr Condition kIsCDMA = between(kTechnology, 3, 4);
 constexpr Field kCandidate[] = {
     {"Candidate Priority", u16(0), decimal()},
     {"Candidate RAT Type", kTechnology, named(kCandidateTechnologies, "??")},
-    Field{"E ARFCN", u16(4), decimal()}.when(kIsLTE),
-    Field{"Cell ID", u16(6).bits(7, 15), decimal()}.when(kIsLTE),
-    Field{"U ARFCN", u16(4), decimal()}.when(kIsUTRAN),
-    Field{"PSC", u16(6), decimal()}.when(kIsUTRAN),
-    Field{"ARFCN", u16(4), decimal()}.when(kIsGeran),
-    Field{"Band", u8(6), decimal()}.when(kIsGeran),
-    Field{"BSIC ID", u8(7), decimal()}.when(kIsGeran),
-    Field{"Band", u8(4), decimal()}.when(kIsCDMA),
-    Field{"Channel", u16(8), decimal()}.when(kIsCDMA),
-    Field{"Pilot", u16(10), decimal()}.when(kIsCDMA),
+    {"E ARFCN", u16(4), decimal(), when(kIsLTE)},
+    {"Cell ID", u16(6).bits(7, 15), decimal(), when(kIsLTE)},
+    {"U ARFCN", u16(4), decimal(), when(kIsUTRAN)},
+    {"PSC", u16(6), decimal(), when(kIsUTRAN)},
+    {"ARFCN", u16(4), decimal(), when(kIsGeran)},
+    {"Band", u8(6), decimal(), when(kIsGeran)},
+    {"BSIC ID", u8(7), decimal(), when(kIsGeran)},
+    {"Band", u8(4), decimal(), when(kIsCDMA)},
+    {"Channel", u16(8), decimal(), when(kIsCDMA)},
+    {"Pilot", u16(10), decimal(), when(kIsCDMA)},
 };
 static_assert(isLayout(kCandidate));
 

@@ -2,6 +2,7 @@
 // A packet's layout as data: where a value is read, how it is shown, and under which key.
 #pragma once
 
+#include <algorithm>
 #include <array>
 #include <cstddef>
 #include <cstdint>
@@ -83,6 +84,17 @@ struct Place {
 struct NamedValue {
   std::int64_t value;
   std::string_view text;
+
+  bool operator==(const NamedValue&) const = default;
+};
+
+/// The rows of a table of such values, borrowed. Two are equal when their rows are.
+struct NamedValues : std::span<const NamedValue> {
+  using std::span<const NamedValue>::span;
+
+  friend constexpr bool operator==(const NamedValues& left, const NamedValues& right) {
+    return std::ranges::equal(left, right);
+  }
 };
 
 /// Writes the text of a value computed from several raw values, in the order of the field's places.
@@ -110,13 +122,15 @@ struct TextRule {
   std::int32_t addend = 0;
   double scale = 1;
   double offset = 0;
-  std::span<const NamedValue> names{};
+  NamedValues names{};
   std::string_view otherName{};  ///< for values outside `names`; empty: `format` shows them
   ComputedText computed = nullptr;
   ComputedNumber number = nullptr;
   bool hasAbsentValue = false;
   std::int64_t absentValue = 0;
   std::string_view absentText{};
+
+  bool operator==(const TextRule&) const = default;
 
   /// Shows what `function` makes of all the field's places, as if it were the raw value.
   [[nodiscard]] constexpr TextRule of(ComputedNumber function) const {
@@ -148,17 +162,17 @@ struct TextRule {
 }
 
 /// The real number scale × raw + offset.
-[[nodiscard]] constexpr TextRule scaled(double scale, double offset, NumberFormat format) {
+[[nodiscard]] constexpr TextRule scaled(NumberFormat format, double offset, double scale) {
   return {.kind = TextRule::Kind::Scaled, .format = format, .scale = scale, .offset = offset};
 }
 
 /// The text that a table gives to the value, `other` for values that it does not list.
-[[nodiscard]] constexpr TextRule named(std::span<const NamedValue> names, std::string_view other) {
+[[nodiscard]] constexpr TextRule named(NamedValues names, std::string_view other) {
   return {.kind = TextRule::Kind::Named, .names = names, .otherName = other};
 }
 
 /// Like `named`, showing values that the table does not list through a format.
-[[nodiscard]] constexpr TextRule namedElse(std::span<const NamedValue> names, NumberFormat other) {
+[[nodiscard]] constexpr TextRule namedElse(NamedValues names, NumberFormat other) {
   return {.kind = TextRule::Kind::Named, .format = other, .names = names};
 }
 
@@ -194,7 +208,20 @@ struct Condition {
   return {place, value, value};
 }
 
-/// One value of a packet: its key, where it is read and how it is shown.
+/// In which packets a field is shown, and what stands in its place in the others.
+struct When {
+  Condition condition{};
+  std::string_view otherwise{};  ///< empty: the key is left out
+
+  /// Shown as `text` where the condition fails.
+  [[nodiscard]] constexpr When elseText(std::string_view text) const { return {condition, text}; }
+};
+
+/// Shown only where the condition holds.
+[[nodiscard]] constexpr When when(Condition condition) { return {condition}; }
+
+/// One value of a packet: its key, where it is read, how it is shown, and perhaps when:
+/// `{"Band", u8(6), decimal(), when(kIsGeran)}`.
 struct Field {
   static constexpr std::size_t kMaximumPlaces = 6;
 
@@ -205,31 +232,27 @@ struct Field {
   Condition condition{};
   std::string_view otherwise{};  ///< the text when the condition fails; empty: the key is left out
 
-  constexpr Field(std::string_view fieldKey, Place place, TextRule rule)
-      : key(fieldKey), places{place}, text(rule) {}
+  constexpr Field(std::string_view fieldKey, Place place, TextRule rule, When shown = {})
+      : key(fieldKey),
+        places{place},
+        text(rule),
+        condition(shown.condition),
+        otherwise(shown.otherwise) {}
   /// A value computed from several places.
   template <std::size_t Count>
-  constexpr Field(std::string_view fieldKey, const Place (&fieldPlaces)[Count], TextRule rule)
-      : key(fieldKey), placeCount(Count), text(rule) {
+  constexpr Field(std::string_view fieldKey, const Place (&fieldPlaces)[Count], TextRule rule,
+                  When shown = {})
+      : key(fieldKey),
+        placeCount(Count),
+        text(rule),
+        condition(shown.condition),
+        otherwise(shown.otherwise) {
     static_assert(Count <= kMaximumPlaces);
     for (std::size_t i = 0; i < Count; ++i) places[i] = fieldPlaces[i];
   }
   /// A key that leaves the section, or that the decoder writes.
   constexpr Field(std::string_view fieldKey, TextRule rule)
       : key(fieldKey), placeCount(0), text(rule) {}
-
-  /// Shown only where the condition holds.
-  [[nodiscard]] constexpr Field when(Condition fieldCondition) const {
-    Field field = *this;
-    field.condition = fieldCondition;
-    return field;
-  }
-  /// Shown as `text` where the condition fails.
-  [[nodiscard]] constexpr Field elseText(std::string_view textOtherwise) const {
-    Field field = *this;
-    field.otherwise = textOtherwise;
-    return field;
-  }
 
   [[nodiscard]] constexpr std::span<const Place> allPlaces() const {
     return {places.data(), placeCount};

@@ -11,16 +11,6 @@
 namespace kestro {
 namespace {
 
-bool isSame(const TextRule& left, const TextRule& right) {
-  return left.kind == right.kind && left.format == right.format &&
-         left.multiplier == right.multiplier && left.addend == right.addend &&
-         left.scale == right.scale && left.offset == right.offset &&
-         left.names.data() == right.names.data() && left.names.size() == right.names.size() &&
-         left.otherName == right.otherName && left.hasAbsentValue == right.hasAbsentValue &&
-         left.absentValue == right.absentValue && left.absentText == right.absentText &&
-         left.computed == right.computed;
-}
-
 bool isSingleValued(TextRule::Kind kind) {
   return kind == TextRule::Kind::Integer || kind == TextRule::Kind::Scaled ||
          kind == TextRule::Kind::Named || kind == TextRule::Kind::Computed;
@@ -46,10 +36,17 @@ void writeName(const TextRule& rule, std::int64_t raw, TextBuffer& text) {
   }
 }
 
-struct KnownCache {
+/// What the texts of a cache depend on.
+struct CacheKey {
   TextRule rule;
   unsigned bitCount;
   bool isSigned;
+
+  bool operator==(const CacheKey&) const = default;
+};
+
+struct KnownCache {
+  CacheKey key;
   TextCache cache;
 };
 
@@ -138,15 +135,12 @@ const Value& TextCache::make(std::uint32_t bits) {
 TextCache* TextCache::forField(const Field& field) {
   const std::optional<Place> place = keptPlace(field);
   if (!place) return nullptr;
-  TextRule rule = field.text;
-  rule.number = nullptr;
+  CacheKey key{.rule = field.text, .bitCount = place->bitCount, .isSigned = place->isSigned};
+  key.rule.number = nullptr;
   static std::deque<KnownCache> caches;
-  const auto known = std::ranges::find_if(caches, [&](const KnownCache& candidate) {
-    return candidate.bitCount == place->bitCount && candidate.isSigned == place->isSigned &&
-           isSame(candidate.rule, rule);
-  });
+  const auto known = std::ranges::find(caches, key, &KnownCache::key);
   if (known != caches.end()) return &known->cache;
-  caches.push_back({rule, place->bitCount, place->isSigned, TextCache(rule, *place)});
+  caches.push_back({key, TextCache(key.rule, *place)});
   return &caches.back().cache;
 }
 

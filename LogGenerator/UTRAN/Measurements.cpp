@@ -14,8 +14,8 @@ constexpr Place kSet = u8(3).bits(5, 6);
 constexpr Field kNeighbor[] = {
     {"UARFCN", u16(0).bits(0, 13), decimal()},
     {"Cell ID", u16(1).bits(6, 12), decimal()},
-    {"Filter RSCP", u16(2).bits(5, 12), scaled(0.00390625, 0, "%f")},
-    Field("Status", kSet, named(kSetNames, "")).when(between(kSet, 0, 2)),
+    {"Filter RSCP", u16(2).bits(5, 12), scaled("%f", 0, 0.00390625)},
+    {"Status", kSet, named(kSetNames, ""), when(between(kSet, 0, 2))},
     {"inJDCS", u8(3).bit(7), named(kJDCSNames, "TRUE")},
 };
 static_assert(isLayout(kNeighbor));

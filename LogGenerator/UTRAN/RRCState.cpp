@@ -27,7 +27,7 @@ constexpr std::int64_t kValid = 1;
 
 constexpr Field kRRCState[] = {
     {"Mode Valid", kIsValid, hidden()},
-    Field(kStateKey, kMode, kModeRule).when(equals(kIsValid, kValid)).elseText(kUnknownMode),
+    {kStateKey, kMode, kModeRule, when(equals(kIsValid, kValid)).elseText(kUnknownMode)},
 };
 static_assert(isLayout(kRRCState));
 

@@ -36,9 +36,9 @@ TEST(RuleText, IsAFormatAfterAFormula) {
   EXPECT_EQ(ruleText(decimal("%d dBm", -140, 2)), "2x - 140 as %d dBm");
   EXPECT_EQ(ruleText(decimal("%d dB", 0, 2)), "2x as %d dB");
   EXPECT_EQ(ruleText(decimal("%d", 6)), "x + 6 as %d");
-  EXPECT_EQ(ruleText(scaled(0.25, -140, "%4.2f dBm")), "0.25x - 140 as %4.2f dBm");
-  EXPECT_EQ(ruleText(scaled(0.334, -63.248, "%+.2f dBm")), "0.334x - 63.248 as %+.2f dBm");
-  EXPECT_EQ(ruleText(scaled(0.5, 0, "%f dB")), "0.5x as %f dB");
+  EXPECT_EQ(ruleText(scaled("%4.2f dBm", -140, 0.25)), "0.25x - 140 as %4.2f dBm");
+  EXPECT_EQ(ruleText(scaled("%+.2f dBm", -63.248, 0.334)), "0.334x - 63.248 as %+.2f dBm");
+  EXPECT_EQ(ruleText(scaled("%f dB", 0, 0.5)), "0.5x as %f dB");
   EXPECT_EQ(ruleText(decimal("0x%06x")), "0x%06x");
 }
 
@@ -65,8 +65,8 @@ TEST(RuleText, SaysWhatNoFormulaCan) {
 }
 
 constexpr Field kLevels[] = {
-    Field("Level", u8(2), decimal("%d dBm")).when(equals(u8(1).bits(0, 3), 1)).elseText("N/A"),
-    Field("Level", u8(2), decimal("%d dB")).when(between(u8(1).bits(0, 3), 2, 4)),
+    {"Level", u8(2), decimal("%d dBm"), when(equals(u8(1).bits(0, 3), 1)).elseText("N/A")},
+    {"Level", u8(2), decimal("%d dB"), when(between(u8(1).bits(0, 3), 2, 4))},
     {"Sum", {u8(5), u8(6)}, decimal().of(sum)},
 };
 constexpr RecordTable kTable = {
@@ -94,16 +94,15 @@ std::string shownTextOf(const Field& field) {
 TEST(KeyText, HasNoElseWhereEveryValueHasAName) {
   EXPECT_EQ(shownTextOf({"S", kTwoBits, named(kFourNames, "X")}), "0: A; 1: B; 2: C; 3: D");
   EXPECT_EQ(shownTextOf({"S", u8(3).bit(7), named(kTwoNames, "X")}), "0: A; 1: B");
-  EXPECT_EQ(shownTextOf(Field("S", kTwoBits, named(kThreeNames, "")).when(between(kTwoBits, 0, 2))),
+  EXPECT_EQ(shownTextOf({"S", kTwoBits, named(kThreeNames, ""), when(between(kTwoBits, 0, 2))}),
             "0: A; 1: B; 2: C when (u8 at 3, bits 5-6) is 0 to 2");
 }
 
 TEST(KeyText, HasAnElseWhereAValueHasNoName) {
   EXPECT_EQ(shownTextOf({"S", kTwoBits, named(kThreeNames, "X")}), "0: A; 1: B; 2: C; else X");
-  EXPECT_EQ(
-      shownTextOf(Field("S", kTwoBits, named(kThreeNames, "X")).when(between(kTwoBits, 1, 3))),
-      "0: A; 1: B; 2: C; else X when (u8 at 3, bits 5-6) is 1 to 3");
-  EXPECT_EQ(shownTextOf(Field("S", kTwoBits, named(kThreeNames, "X")).when(between(u8(9), 0, 2))),
+  EXPECT_EQ(shownTextOf({"S", kTwoBits, named(kThreeNames, "X"), when(between(kTwoBits, 1, 3))}),
+            "0: A; 1: B; 2: C; else X when (u8 at 3, bits 5-6) is 1 to 3");
+  EXPECT_EQ(shownTextOf({"S", kTwoBits, named(kThreeNames, "X"), when(between(u8(9), 0, 2))}),
             "0: A; 1: B; 2: C; else X when (u8 at 9) is 0 to 2");
   EXPECT_EQ(shownTextOf({"S", s8(3).bit(0), named(kTwoNames, "X")}), "0: A; 1: B; else X");
 }

@@ -74,7 +74,7 @@ TEST_F(FillTest, RemovesKeysWhereTheLayoutSaysSo) {
 }
 
 TEST_F(FillTest, LeavesKeysOfFieldsWhoseConditionFails) {
-  constexpr Field kConditional[] = {Field{"A", u8(1), decimal()}.when(between(u8(0), 2, 3))};
+  constexpr Field kConditional[] = {{"A", u8(1), decimal(), when(between(u8(0), 2, 3))}};
   fill(kConditional, {2, 7});
   fill(kConditional, {4, 8});
   EXPECT_THAT(entriesOf(section), ElementsAre(Pair("A", "7")));
@@ -82,7 +82,7 @@ TEST_F(FillTest, LeavesKeysOfFieldsWhoseConditionFails) {
 
 TEST_F(FillTest, MayShowATextWhereTheConditionFails) {
   constexpr Field kConditional[] = {
-      Field{"A", u8(1), decimal()}.when(equals(u8(0), 1)).elseText("none")};
+      {"A", u8(1), decimal(), when(equals(u8(0), 1)).elseText("none")}};
   fill(kConditional, {1, 7});
   EXPECT_THAT(entriesOf(section), ElementsAre(Pair("A", "7")));
   fill(kConditional, {0, 7});
@@ -108,8 +108,8 @@ constexpr Place kKind = u8(1);
 constexpr Field kRecord[] = {
     {"ID", u8(0), decimal()},
     {"Kind", kKind, decimal()},
-    Field{"Left", u8(2), decimal("L%d")}.when(equals(kKind, 1)),
-    Field{"Right", u8(2), decimal("R%d")}.when(equals(kKind, 2)),
+    {"Left", u8(2), decimal("L%d"), when(equals(kKind, 1))},
+    {"Right", u8(2), decimal("R%d"), when(equals(kKind, 2))},
 };
 static_assert(isLayout(kRecord));
 constexpr ListReading kList = {
@@ -257,7 +257,7 @@ TEST_F(FillTest, ShowsTheNumberThatSeveralPlacesMake) {
 
 TEST_F(FillTest, ObeysTheConditionOfANumberThatSeveralPlacesMake) {
   constexpr Field kProduct[] = {
-      Field{"A", {u8(0), u8(1)}, decimal().of(product)}.when(equals(u8(2), 1)).elseText("none")};
+      {"A", {u8(0), u8(1)}, decimal().of(product), when(equals(u8(2), 1)).elseText("none")}};
   fill(kProduct, {2, 3, 1});
   EXPECT_EQ(section["A"], Value("6"));
   fill(kProduct, {2, 3, 0});

@@ -14,7 +14,7 @@ using ::testing::ElementsAre;
 constexpr NamedValue kColours[] = {{0, "red"}, {3, "blue"}};
 
 constexpr Field kPacketFields[] = {
-    {"Level", u16(13).bits(0, 8), scaled(0.25, -140, "%4.2f dBm")},
+    {"Level", u16(13).bits(0, 8), scaled("%4.2f dBm", -140, 0.25)},
     {"Priority", u16(13).bits(9, 12), decimal()},
     {"Power", s8(15), decimal("%d dBm", -30).absentAt(64, "Not Present")},
     {"Colour", u8(16), named(kColours, "Unknown")},

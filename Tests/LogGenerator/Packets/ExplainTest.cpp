@@ -162,8 +162,8 @@ TEST(CatalogueTest, SaysWhereEachKeyComesFrom) {
 }
 
 constexpr Field kChoice[] = {
-    Field("Level", u8(14), decimal()).when(equals(u8(13), 0)),
-    Field("Level", s8(14), decimal()).when(equals(u8(13), 1)),
+    {"Level", u8(14), decimal(), when(equals(u8(13), 0))},
+    {"Level", s8(14), decimal(), when(equals(u8(13), 1))},
     {"Kind", u8(13).shared(), hidden()},
 };
 

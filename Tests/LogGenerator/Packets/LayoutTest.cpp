@@ -70,13 +70,14 @@ TEST(LayoutTest, AcceptsSharedBits) {
 
 TEST(LayoutTest, AcceptsBitsOfFieldsThatNeverMeet) {
   const Place kind = u8(0);
-  const Field first("A", u16(1), decimal());
-  const Field second("B", u8(2), decimal());
-  EXPECT_TRUE(isLayoutOf({first.when(equals(kind, 1)), second.when(equals(kind, 2))}));
-  EXPECT_TRUE(isLayoutOf({first.when(between(kind, 3, 4)), second.when(between(kind, 0, 2))}));
-  EXPECT_FALSE(isLayoutOf({first.when(between(kind, 0, 2)), second.when(between(kind, 2, 3))}));
-  EXPECT_FALSE(isLayoutOf({first.when(equals(kind, 1)), second.when(equals(u8(5), 2))}));
-  EXPECT_FALSE(isLayoutOf({first.when(equals(kind, 1)), second}));
+  const auto areALayout = [](When first, When second) {
+    return isLayoutOf({{"A", u16(1), decimal(), first}, {"B", u8(2), decimal(), second}});
+  };
+  EXPECT_TRUE(areALayout(when(equals(kind, 1)), when(equals(kind, 2))));
+  EXPECT_TRUE(areALayout(when(between(kind, 3, 4)), when(between(kind, 0, 2))));
+  EXPECT_FALSE(areALayout(when(between(kind, 0, 2)), when(between(kind, 2, 3))));
+  EXPECT_FALSE(areALayout(when(equals(kind, 1)), when(equals(u8(5), 2))));
+  EXPECT_FALSE(areALayout(when(equals(kind, 1)), {}));
 }
 
 TEST(LayoutTest, NeedsAKeyForEveryField) { EXPECT_FALSE(isLayoutOf({{"", u8(0), decimal()}})); }

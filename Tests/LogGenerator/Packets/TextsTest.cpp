@@ -1,6 +1,9 @@
 // SPDX-License-Identifier: MIT
 #include <gtest/gtest.h>
 
+#include <iterator>
+#include <set>
+#include <span>
 #include <string>
 
 #include "LogGenerator/Packets/Texts.h"
@@ -36,9 +39,9 @@ TEST(TextRuleTest, WidensUnsignedNumbersBeforeItCalculates) {
 }
 
 TEST(TextRuleTest, ScalesInDoublePrecision) {
-  EXPECT_EQ(textOf(scaled(0.25, -140, "%4.2f dBm"), 165), "-98.75 dBm");
-  EXPECT_EQ(textOf(scaled(0.125, -20, "%4.2f dB"), 3), "-19.62 dB");
-  EXPECT_EQ(textOf(scaled(0.5, 0, "%f dB"), -15), "-7.500000 dB");
+  EXPECT_EQ(textOf(scaled("%4.2f dBm", -140, 0.25), 165), "-98.75 dBm");
+  EXPECT_EQ(textOf(scaled("%4.2f dB", -20, 0.125), 3), "-19.62 dB");
+  EXPECT_EQ(textOf(scaled("%f dB", 0, 0.5), -15), "-7.500000 dB");
 }
 
 TEST(TextRuleTest, NamesListedValuesOnly) {
@@ -58,7 +61,7 @@ TEST(TextRuleTest, MayFormatValuesThatAreNotListed) {
 TEST(TextRuleTest, ShowsTheAbsentTextForTheRawValue) {
   EXPECT_EQ(textOf(decimal("%d dBm", -30).absentAt(64, "Not Present"), 64), "Not Present");
   EXPECT_EQ(textOf(decimal("%d dBm", -30).absentAt(64, "Not Present"), 94), "64 dBm");
-  EXPECT_EQ(textOf(scaled(0.5, 0, "%.1f").absentAt(0, ""), 0), "");
+  EXPECT_EQ(textOf(scaled("%.1f", 0, 0.5).absentAt(0, ""), 0), "");
   EXPECT_EQ(textOf(named(kNames, "?").absentAt(0, "none"), 0), "none");
 }
 
@@ -108,6 +111,42 @@ TEST(TextCacheTest, IsSharedByFieldsOfOneRuleAndWidth) {
   EXPECT_NE(TextCache::forField({"B", u16(4).bits(0, 7), decimal("%d dB", -7)}), cache);
   EXPECT_NE(TextCache::forField({"B", u16(4).bits(0, 8), decimal("%d dB", -8)}), cache);
   EXPECT_NE(TextCache::forField({"B", u16(4).bits(0, 8), decimal("%d dBm", -7)}), cache);
+}
+
+constexpr NamedValue kCacheNames[] = {{0, "Off"}, {1, "On"}};
+constexpr NamedValue kSameNames[] = {{0, "Off"}, {1, "On"}};
+constexpr NamedValue kOtherTexts[] = {{0, "Off"}, {1, "Up"}};
+constexpr NamedValue kOtherValues[] = {{0, "Off"}, {2, "On"}};
+
+void writeOne(std::span<const std::int64_t> /*raw*/, TextBuffer& text) { text.append("one"); }
+void writeTwo(std::span<const std::int64_t> /*raw*/, TextBuffer& text) { text.append("two"); }
+
+TEST(TextCacheTest, IsSharedByRulesThatAreEqualInEveryPartOnly) {
+  const auto cacheOf = [](const TextRule& rule) { return TextCache::forField({"A", u8(0), rule}); };
+  EXPECT_EQ(cacheOf(named(kCacheNames, "?")), cacheOf(named(kSameNames, "?")));
+  const TextRule rules[] = {
+      named(kCacheNames, "?"),
+      named(kCacheNames, "-"),
+      named(kOtherTexts, "?"),
+      named(kOtherValues, "?"),
+      named(std::span(kCacheNames).first<1>(), "?"),
+      namedElse(kCacheNames, "%d"),
+      namedElse(kCacheNames, "%u"),
+      decimal("%d w"),
+      decimal("%d w", 1),
+      decimal("%d w", 0, 2),
+      decimal("%d w").absentAt(0, ""),
+      decimal("%d w").absentAt(1, ""),
+      decimal("%d w").absentAt(1, "none"),
+      scaled("%f w", 0, 1),
+      scaled("%f w", 1, 1),
+      scaled("%f w", 0, 2),
+      computed(writeOne),
+      computed(writeTwo),
+  };
+  std::set<TextCache*> caches;
+  for (const TextRule& rule : rules) caches.insert(cacheOf(rule));
+  EXPECT_EQ(caches.size(), std::size(rules));
 }
 
 TEST(TextCacheTest, TellsSignedPlacesFromUnsignedOnes) {
