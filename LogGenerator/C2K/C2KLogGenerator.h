@@ -12,6 +12,7 @@
 #include "LogGenerator/C2K/C2KState.h"
 #include "LogGenerator/C2K/TemplatePlaces.h"
 #include "LogGenerator/Ondrel/OndrelLogGenerator.h"
+#include "LogGenerator/Packets/PlacedKey.h"
 
 namespace kestro {
 
@@ -55,8 +56,8 @@ class C2KLogGenerator : public OndrelLogGenerator {
   [[nodiscard]] const TemplatePlaces& places() const;
 
   std::vector<std::unique_ptr<C2KParser>> _parsers;  ///< in the order of the start command
-  StateKey _displayKey{kStateDisplay};
-  StateKey _lookupKey{kStateLookup};
+  PlacedKey _displayKey{kStateDisplay};
+  PlacedKey _lookupKey{kStateLookup};
   mutable std::optional<TemplatePlaces> _places;  ///< read from the resource when first needed
 };
 

@@ -10,6 +10,7 @@
 #include "LogGenerator/C2K/C2KParser.h"
 #include "LogGenerator/C2K/C2KState.h"
 #include "LogGenerator/LogGenerator.h"
+#include "LogGenerator/Packets/PlacedKey.h"
 
 namespace kestro {
 
@@ -61,9 +62,9 @@ class EVDOThroughput : public C2KParser {
   struct Keys {
     explicit Keys(std::string_view stateKey);
 
-    StateKey kept;
-    StateKey newest;
-    StateKey previous;
+    PlacedKey kept;
+    PlacedKey newest;
+    PlacedKey previous;
   };
   struct Sample {
     Value sequence;
@@ -78,7 +79,7 @@ class EVDOThroughput : public C2KParser {
   LookupName _rate;
   Keys _sequence;
   Keys _sent;
-  StateKey _extraInfo{kStateExtraInfo};
+  PlacedKey _extraInfo{kStateExtraInfo};
 };
 
 }  // namespace kestro

@@ -17,17 +17,12 @@ void LookupTable::addTarget(const Value& name, const Value& key, const Dictionar
 }
 
 void LookupTable::store(LookupName& name, const Value& value) const {
-  for (auto& target : targetsOf(name)) {
-    target.hint = target.display.set(target.key, value, target.hint);
-  }
+  for (auto& [display, key] : targetsOf(name)) key.set(display, value);
 }
 
 Value* LookupTable::onlyValue(LookupName& name) const {
   const auto targets = targetsOf(name);
-  if (targets.size() != 1) return nullptr;
-  auto& [display, key, hint] = targets[0];
-  const std::span<Value> values = display.valuesToRewrite();
-  return hint < values.size() && display.keyAt(hint) == key ? &values[hint] : nullptr;
+  return targets.size() == 1 ? targets[0].key.toRewrite(targets[0].display) : nullptr;
 }
 
 void LookupTable::findTargets(LookupName& name) const {
@@ -38,7 +33,7 @@ void LookupTable::findTargets(LookupName& name) const {
     const Dictionary display = target[kTargetDictionary].dictionary();
     const Value& key = target[kTargetKey];
     if (display.isNull() || !key.isText()) break;
-    name._targets.push_back({display, key});
+    name._targets.push_back({display, PlacedKey(key)});
   }
 }
 

@@ -2,11 +2,11 @@
 // Where in the display each value belongs.
 #pragma once
 
-#include <cstddef>
 #include <span>
 #include <string_view>
 #include <vector>
 
+#include "LogGenerator/Packets/PlacedKey.h"
 #include "Platform/PropertyList.h"
 
 namespace kestro {
@@ -20,8 +20,7 @@ class LookupName {
   friend class LookupTable;
   struct Target {
     Dictionary display;
-    Value key;
-    std::size_t hint = 0;  ///< where the key stood when it was last written
+    PlacedKey key;
   };
 
   Value _text;

@@ -16,7 +16,6 @@ bool isCommon(const Place& place) { return place.origin == Origin::Here && !plac
 
 BoundField::BoundField(const Field& field)
     : _field(&field),
-      _key(field.key),
       _cache(TextCache::forField(field)),
       _mask(maskOf(field.places[0])),
       _place(field.places[0]),
@@ -79,10 +78,10 @@ Value BoundField::wideText(std::uint32_t bits) const {
 
 BoundFields::BoundFields(std::span<const Field> fields) {
   for (const Field& field : fields) {
-    if (field.text.kind != TextRule::Kind::Hidden) _fields.emplace_back(field);
+    if (field.text.kind == TextRule::Kind::Hidden) continue;
+    _keys.emplace_back(field.key, _fields.size());
+    _fields.emplace_back(field);
   }
-  _hints.resize(_fields.size());
-  for (std::size_t i = 0; i < _hints.size(); ++i) _hints[i] = i;
 }
 
 void BoundFields::fill(Dictionary& dictionary, PacketView packet) {
@@ -90,12 +89,12 @@ void BoundFields::fill(Dictionary& dictionary, PacketView packet) {
   for (std::size_t i = 0; i < _fields.size(); ++i) {
     const BoundField& field = _fields[i];
     if (field.field().text.kind == TextRule::Kind::Removed) {
-      dictionary.remove(field.key());
+      dictionary.remove(_keys[i].key());
       continue;
     }
     Value shown;
     if (!field.write(shown, packet, {}, nullptr)) continue;
-    _hints[i] = dictionary.set(field.key(), shown, _hints[i]);
+    _keys[i].set(dictionary, shown);
   }
 }
 
@@ -142,7 +141,7 @@ const KeyList& BoundFields::keysOf(Presence present) {
   if (known != _keyLists.end()) return known->second;
   std::vector<Value> keys;
   for (std::size_t i = 0; i < _fields.size(); ++i) {
-    if ((present >> i & 1) != 0) keys.push_back(_fields[i].key());
+    if ((present >> i & 1) != 0) keys.push_back(_keys[i].key());
   }
   const KeyList& list =
       _keyLists.emplace(present, KeyList(std::span<const Value>(keys))).first->second;

@@ -10,6 +10,7 @@
 #include <span>
 #include <vector>
 
+#include "LogGenerator/Packets/PlacedKey.h"
 #include "LogGenerator/Packets/Section.h"
 #include "LogGenerator/Packets/Texts.h"
 #include "LogGenerator/Packets/Walk.h"
@@ -27,13 +28,12 @@ class FieldSupplier {
                                      const RecordPosition& position) const = 0;
 };
 
-/// A field made ready for use: its key as a value, its texts at hand. The layout must outlive it.
+/// A field made ready for use: its texts are at hand. The layout must outlive it.
 class BoundField {
  public:
   explicit BoundField(const Field& field);
 
   [[nodiscard]] const Field& field() const noexcept { return *_field; }
-  [[nodiscard]] const Value& key() const noexcept { return _key; }
   [[nodiscard]] bool isSupplied() const noexcept {
     return _field->text.kind == TextRule::Kind::Supplied;
   }
@@ -72,7 +72,6 @@ class BoundField {
   [[nodiscard]] Value wideText(std::uint32_t bits) const;
 
   const Field* _field;
-  Value _key;
   TextCache* _cache;
   std::uint32_t _mask;  ///< of the first place's bits, once they are shifted down
   Place _place;         ///< the first
@@ -116,8 +115,8 @@ class BoundFields {
   const KeyList& keysOf(Presence present);
 
   std::vector<BoundField> _fields;
-  std::vector<std::size_t> _hints;  ///< where each key stood when it was last written
-  std::vector<Value> _values;       ///< of the row that is being made
+  std::vector<PlacedKey> _keys;  ///< of the fields, in their order
+  std::vector<Value> _values;    ///< of the row that is being made
   std::map<Presence, KeyList> _keyLists;
   const KeyList* _allKeys = nullptr;  ///< the list of a row that shows every field
 };
