@@ -2,10 +2,8 @@
 // The one way in which decoders read a packet's bytes.
 #pragma once
 
-#include <bit>
 #include <cstddef>
 #include <cstdint>
-#include <cstring>
 
 #include "Platform/Bytes.h"
 
@@ -29,13 +27,11 @@ class PacketView {
 
   /// The four bytes from `offset` on, the first in the low bits.
   [[nodiscard]] std::uint32_t word(std::size_t offset) const noexcept {
-    static_assert(std::endian::native == std::endian::little);
-    std::uint32_t bytes;
-    if (offset < _bytes.size() && _bytes.size() - offset >= sizeof(bytes)) [[likely]] {
-      std::memcpy(&bytes, _bytes.data() + offset, sizeof(bytes));
-      return bytes;
-    }
-    return wordNearEnd(offset);
+    return loadLittleEndian<std::uint32_t>(_bytes, offset);
+  }
+  /// The four bytes from `offset` on, the first in the high bits.
+  [[nodiscard]] std::uint32_t bigEndianWord(std::size_t offset) const noexcept {
+    return loadBigEndian<std::uint32_t>(_bytes, offset);
   }
 
   [[nodiscard]] std::uint8_t u8(std::size_t offset) const noexcept {
@@ -47,15 +43,6 @@ class PacketView {
   [[nodiscard]] std::uint32_t u32(std::size_t offset) const noexcept { return read(offset, 4); }
 
  private:
-  [[nodiscard]] std::uint32_t wordNearEnd(std::size_t offset) const noexcept {
-    if (offset >= _bytes.size()) return 0;
-    const std::size_t left = _bytes.size() - offset;  // at most three
-    std::uint32_t bytes = _bytes[offset];
-    if (left > 1) bytes |= std::uint32_t{_bytes[offset + 1]} << 8;
-    if (left > 2) bytes |= std::uint32_t{_bytes[offset + 2]} << 16;
-    return bytes;
-  }
-
   ByteView _bytes;
 };
 

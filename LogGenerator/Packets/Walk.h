@@ -42,8 +42,10 @@ struct RecordPosition {
 /// The place's bits as they stand in the packet, without regard to their sign.
 [[nodiscard]] inline std::uint32_t readBits(const Place& place, PacketView packet,
                                             const RecordPosition& position) {
-  std::uint32_t word = packet.word(offsetOf(place, position));
-  if (place.isBigEndian) word = __builtin_bswap32(word) >> (8 * (4 - place.width));
+  const std::size_t offset = offsetOf(place, position);
+  const std::uint32_t word = place.isBigEndian
+                                 ? packet.bigEndianWord(offset) >> (8 * (4 - place.width))
+                                 : packet.word(offset);
   return word >> place.firstBit & maskOf(place);
 }
 

@@ -9,6 +9,7 @@
 #include <string_view>
 #include <utility>
 
+#include "Platform/Bytes.h"
 #include "Platform/Linux/PropertyListDates.h"
 #include "Platform/Linux/PropertyListScan.h"
 #include "Platform/Utf8.h"
@@ -84,10 +85,9 @@ class BinaryScan {
     return false;
   }
 
+  /// An integer of 1 to 8 bytes.
   [[nodiscard]] std::uint64_t number(std::size_t at, std::size_t width) const {
-    std::uint64_t result = 0;
-    for (const std::uint8_t byte : _bytes.subspan(at, width)) result = (result << 8) | byte;
-    return result;
+    return loadBigEndian<std::uint64_t>(_bytes, at) >> (8 * (8 - width));
   }
 
   bool readTrailer() {
