@@ -115,7 +115,7 @@ std::optional<Bytes> oneXStatus(const OneXReport& report, Moment time) {
   const RecordPosition radio = packet.begin(kOneXRadioId, kRadioSize);
   packet.writer()
       .fieldsAt(kOneXStatusFields, {.here = radio.here, .twin = state.here})
-      .text("k1xDeviceState", report.state)
+      .raw("k1xDeviceState", static_cast<std::int64_t>(report.state))
       .raw("k1xRx0BandClass", report.channel.bandClass)
       .raw("k1xRx0ChanNum", report.channel.number)
       .number("k1xRxAGC0", reportedPower(report.receivePower[0]))
@@ -141,7 +141,7 @@ std::optional<Bytes> oneXSystemParameters(const OneXSystem& system, Moment time)
   ReadingWriter packet(kOneXSystemParametersReading);
   packet.fields()
       .raw("Version", kVersion)
-      .text("k1xRoamingHome", system.roaming)
+      .raw("k1xRoamingHome", system.isRoaming ? 1 : 0)
       .raw("kSystemId", {kSystemType, std::int64_t{system.systemId}})
       .raw("kNetworkId", {kSystemType, std::int64_t{system.networkId}})
       .raw("kPacketZoneId", system.packetZoneId)
@@ -156,12 +156,12 @@ std::optional<Bytes> evdoStatus(const EVDOReport& report, Moment time) {
   ReadingWriter packet(kEVDOStatusReading);
   PacketWriter::Fields fields = packet.fields();
   fields.raw("kChannel", report.channel.number)
-      .text("k1xEVDODeviceState", report.deviceState)
+      .raw("k1xEVDODeviceState", static_cast<std::int64_t>(report.deviceState))
       .raw("kBandClass", report.channel.bandClass)
       .number("kRxAGC0", report.receivePower[0])
       .number("kRxAGC1", report.receivePower[1])
       .number("kTxAGC", report.transmitPower)
-      .text("kSessionState", report.sessionState)
+      .raw("kSessionState", static_cast<std::int64_t>(report.sessionState))
       .raw("kUATI24", report.address)
       .raw("kColorCode", report.colorCode);
   if (report.servingPilot) {

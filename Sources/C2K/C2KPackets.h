@@ -7,7 +7,6 @@
 #include <cstdint>
 #include <optional>
 #include <span>
-#include <string_view>
 
 #include "LogGenerator/C2K/EVDOThroughput.h"
 #include "Platform/Bytes.h"
@@ -28,8 +27,19 @@ struct C2KChannel {
 
 // --- 1x ------------------------------------------------------------------------------------------
 
+/// The states of 1x call processing that a phone reports, as the packet numbers them.
+enum class OneXState : std::uint8_t {
+  Initial = 2,  ///< after a call
+  Acquisition = 3,
+  Sync = 4,
+  Paging = 6,
+  Sleep = 7,  ///< between the slots in which the phone may be paged
+  Traffic = 8,
+  PowerUp = 11,
+};
+
 struct OneXReport {
-  std::string_view state;       ///< a name of the display
+  OneXState state = OneXState::PowerUp;
   C2KChannel channel;           ///< of both receivers
   double receivePower[2] = {};  ///< dBm; what lies outside -106.0 to -20.8 is reported as these
   double transmitPower = 0;     ///< dBm
@@ -48,15 +58,19 @@ struct OneXSystem {
   unsigned baseStationId = 0;
   unsigned packetZoneId = 0;
   unsigned protocolRevision = 6;
-  std::string_view roaming;  ///< a name of the display
+  bool isRoaming = false;
 };
 [[nodiscard]] std::optional<Bytes> oneXSystemParameters(const OneXSystem& system, Moment time);
 
 // --- EV-DO ---------------------------------------------------------------------------------------
 
+// As the packet numbers them.
+enum class EVDOState : std::uint8_t { Inactive, Acquisition, Sync, Idle, Access, Connected };
+enum class EVDOSession : std::uint8_t { Closed, Setup, Negotiation, Initiated, Open };
+
 struct EVDOReport {
-  std::string_view deviceState;   ///< a name of the display
-  std::string_view sessionState;  ///< a name of the display
+  EVDOState deviceState = EVDOState::Inactive;
+  EVDOSession sessionState = EVDOSession::Closed;
   C2KChannel channel;
   double receivePower[2] = {};  ///< dBm
   double transmitPower = 0;     ///< dBm

@@ -149,7 +149,7 @@ OneXReport C2KPhone::oneXReport(std::span<const C2KPilot> activeSet) const {
   const double received = _oneXCarrier.total();
   // Power control keeps the calls at the base station at one level.
   const double control = 2 * _load.at(_drive.seconds() * 8);
-  return {.state = oneXStateName(_oneX.state()),
+  return {.state = _oneX.state(),
           .channel = _oneXCarrier.channel(),
           .receivePower = {received, secondReceivePower(received)},
           .transmitPower = transmitPower(received) + control,
@@ -163,7 +163,7 @@ OneXSystem C2KPhone::system() const {
           .networkId = isRoaming ? 3U : 1U,
           .baseStationId = 3'000 + 10 * cell.site + cell.sector,
           .packetZoneId = 1 + cell.site / 4,
-          .roaming = isRoaming ? "ON [1]" : "OFF [0]"};
+          .isRoaming = isRoaming};
 }
 
 bool C2KPhone::receivesBadFrame() {
@@ -208,8 +208,8 @@ EVDOReport C2KPhone::evdoReport() const {
   const bool isOn = _evdo.state() != EVDOState::Inactive;
   const bool hasAddress = _evdo.session() != EVDOSession::Closed;
   const double received = isOn ? _evdoCarrier.total() : kNoise;
-  EVDOReport report{.deviceState = evdoStateName(_evdo.state()),
-                    .sessionState = evdoSessionName(_evdo.session()),
+  EVDOReport report{.deviceState = _evdo.state(),
+                    .sessionState = _evdo.session(),
                     .channel = _evdoCarrier.channel(),
                     .receivePower = {received, secondReceivePower(received)},
                     .transmitPower = transmitPower(received),

@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include "Sources/C2K/C2KStates.h"
 
-#include <array>
 #include <cmath>
 
 #include "Sources/World/Noise.h"
@@ -19,26 +18,6 @@ milliseconds between(double shortest, double longest, double fraction) noexcept 
 }  // namespace
 
 // --- 1x ------------------------------------------------------------------------------------------
-
-std::string_view oneXStateName(OneXState state) noexcept {
-  switch (state) {
-    case OneXState::PowerUp:
-      return "Powerup state [11]";
-    case OneXState::Initial:
-      return "Initial state for CDMA operation [2]";
-    case OneXState::Acquisition:
-      return "Acquisition [3]";
-    case OneXState::Sync:
-      return "Sync [4]";
-    case OneXState::Paging:
-      return "Paging [6]";
-    case OneXState::Sleep:
-      return "Slotted mode sleep state [7]";
-    case OneXState::Traffic:
-      break;
-  }
-  return "Traffic [8]";
-}
 
 void OneXCallProcessing::advance(milliseconds time) noexcept {
   if (isIdle()) _untilCall -= time;
@@ -84,18 +63,6 @@ milliseconds OneXCallProcessing::durationOf(OneXState state) const noexcept {
 }
 
 // --- EV-DO ---------------------------------------------------------------------------------------
-
-std::string_view evdoStateName(EVDOState state) noexcept {
-  constexpr std::array<std::string_view, 6> kNames = {
-      "Inactive [0]", "Acquisition [1]", "Sync [2]", "Idle [3]", "Access [4]", "Connected [5]"};
-  return kNames[static_cast<std::size_t>(state)];
-}
-
-std::string_view evdoSessionName(EVDOSession session) noexcept {
-  constexpr std::array<std::string_view, 5> kNames = {
-      "Closed [0]", "AMP setup [1]", "AT-initiated neg [2]", "Initiated neg [3]", "Open [4]"};
-  return kNames[static_cast<std::size_t>(session)];
-}
 
 void EVDOConnection::advance(milliseconds time, bool hasReceiver, Activity activity) noexcept {
   constexpr milliseconds kShortest{500};

@@ -5,24 +5,11 @@
 
 #include <chrono>
 #include <cstdint>
-#include <string_view>
 
+#include "Sources/C2K/C2KPackets.h"
 #include "Sources/World/SimulatedPhone.h"
 
 namespace kestro {
-
-enum class OneXState : std::uint8_t {
-  PowerUp,
-  Initial,  ///< after a call
-  Acquisition,
-  Sync,
-  Paging,
-  Sleep,  ///< between the slots in which the phone may be paged
-  Traffic,
-};
-
-/// The state as the display names it.
-[[nodiscard]] std::string_view oneXStateName(OneXState state) noexcept;
 
 /// 1x call processing. Calls come and go by themselves.
 class OneXCallProcessing {
@@ -52,13 +39,6 @@ class OneXCallProcessing {
   std::chrono::milliseconds _left{500};
   std::chrono::milliseconds _untilCall{12'000};
 };
-
-enum class EVDOState : std::uint8_t { Inactive, Acquisition, Sync, Idle, Access, Connected };
-enum class EVDOSession : std::uint8_t { Closed, Setup, Negotiation, Initiated, Open };
-
-/// The states as the display names them.
-[[nodiscard]] std::string_view evdoStateName(EVDOState state) noexcept;
-[[nodiscard]] std::string_view evdoSessionName(EVDOSession session) noexcept;
 
 /// EV-DO: a session that is set up once, and connections for its data.
 class EVDOConnection {

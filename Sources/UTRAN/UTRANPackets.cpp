@@ -16,18 +16,6 @@ namespace {
 constexpr std::int64_t kGSM900 = 0;  // the band indicator of 900 and 1800 MHz
 constexpr double kHighestStep = 63;
 
-std::string_view setName(UTRANSet set) {
-  switch (set) {
-    case UTRANSet::Active:
-      return "ASET";
-    case UTRANSet::Monitored:
-      return "MSET";
-    case UTRANSet::Detected:
-      break;
-  }
-  return "DSET";
-}
-
 /// Whole dB above the weakest level that a phone reports. The display shows 256ths of it.
 std::int64_t rscpStep(double rscp) {
   constexpr double kWeakest = -116;
@@ -59,9 +47,9 @@ unsigned utranBlockErrorStep(double rate) noexcept {
 
 unsigned utranSirStep(double sir) noexcept { return stepFrom(-11, 0.5, sir); }
 
-std::optional<Bytes> utranRrcState(std::string_view mode, Moment time) {
+std::optional<Bytes> utranRrcState(UTRANMode mode, Moment time) {
   ReadingWriter packet(kRRCStateSection, kUTRANRRCStatePacket);
-  packet.fields().raw("Mode Valid", 1).text("State", mode);
+  packet.fields().raw("Mode Valid", 1).raw("State", static_cast<std::int64_t>(mode));
   return packet.finish(time);
 }
 
@@ -73,7 +61,7 @@ std::optional<Bytes> utranSystemInformation(const UTRANCell& cell, Moment time) 
       .raw("Downlink UARFCN", cell.uarfcn)
       .raw("Uplink UARFCN", cell.uarfcn)
       .raw("URA ID", cell.registrationArea)
-      .text("Allowed Access", "All Calls");
+      .raw("Allowed Access", 0);
   return packet.finish(time);
 }
 
@@ -86,8 +74,8 @@ std::optional<Bytes> utranNeighbours(std::span<const UTRANCellReport> cells, Mom
         .raw("UARFCN", cells[i].uarfcn)
         .raw("Cell ID", cells[i].parameterId)
         .raw("Filter RSCP", rscpStep(cells[i].rscp))
-        .text("Status", setName(cells[i].set))
-        .text("inJDCS", cells[i].isJointlyDetected ? "TRUE" : "FALSE");
+        .raw("Status", static_cast<std::int64_t>(cells[i].set))
+        .raw("inJDCS", cells[i].isJointlyDetected ? 1 : 0);
   }
   return packet.finish(time);
 }

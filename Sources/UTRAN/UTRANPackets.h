@@ -8,7 +8,6 @@
 #include <cstdint>
 #include <optional>
 #include <span>
-#include <string_view>
 
 #include "Platform/Bytes.h"
 #include "Platform/Clock.h"
@@ -24,7 +23,10 @@ struct UTRANCell {
   unsigned registrationArea = 0;  ///< URA
 };
 
-/// How much the phone has to do with a cell.
+/// The mode of the phone's radio-resource control, as the packet numbers it.
+enum class UTRANMode : std::uint8_t { Disconnected, Connecting, Fach, Dch, CellPch, UraPch };
+
+/// How much the phone has to do with a cell, as the packet numbers it.
 enum class UTRANSet : std::uint8_t {
   Active,     ///< connected to it, or camping on it
   Monitored,  ///< the network asked for its measurement
@@ -58,8 +60,7 @@ struct UTRANCodedChannel {
   std::array<double, 6> sir{};  ///< signal to interference, dB
 };
 
-/// `mode` is a name of the display.
-[[nodiscard]] std::optional<Bytes> utranRrcState(std::string_view mode, Moment time);
+[[nodiscard]] std::optional<Bytes> utranRrcState(UTRANMode mode, Moment time);
 [[nodiscard]] std::optional<Bytes> utranSystemInformation(const UTRANCell& cell, Moment time);
 [[nodiscard]] std::optional<Bytes> utranNeighbours(std::span<const UTRANCellReport> cells,
                                                    Moment time);

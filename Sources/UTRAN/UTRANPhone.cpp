@@ -52,24 +52,6 @@ double blockErrorRate(double sir) { return std::clamp(std::pow(10, -sir / 5), 1e
 
 }  // namespace
 
-std::string_view utranModeName(UTRANMode mode) noexcept {
-  switch (mode) {
-    case UTRANMode::Disconnected:
-      return "Disconnected";
-    case UTRANMode::Connecting:
-      return "Connecting";
-    case UTRANMode::Fach:
-      return "Cell Fach";
-    case UTRANMode::Dch:
-      return "Cell DCH";
-    case UTRANMode::CellPch:
-      return "Cell PCH";
-    case UTRANMode::UraPch:
-      break;
-  }
-  return "Cell URA PCH";
-}
-
 // --- UTRANConnection -----------------------------------------------------------------------------
 
 void UTRANConnection::advance(milliseconds time, Activity activity) noexcept {

@@ -6,7 +6,6 @@
 #include <chrono>
 #include <cstddef>
 #include <cstdint>
-#include <string_view>
 #include <vector>
 
 #include "Sources/UTRAN/UTRANPackets.h"
@@ -15,12 +14,6 @@
 #include "Sources/World/SimulatedPhone.h"
 
 namespace kestro {
-
-/// The mode of the phone's radio-resource control.
-enum class UTRANMode : std::uint8_t { Disconnected, Connecting, Fach, Dch, CellPch, UraPch };
-
-/// The mode as the display names it.
-[[nodiscard]] std::string_view utranModeName(UTRANMode mode) noexcept;
 
 /// The connection to the network: set up for a transfer, and given up step by step after it.
 class UTRANConnection {

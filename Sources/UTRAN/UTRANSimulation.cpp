@@ -54,7 +54,7 @@ std::string_view UTRANSimulation::technology() const {
 std::vector<Bytes> UTRANSimulation::step(std::chrono::milliseconds elapsed, Moment now) {
   if (elapsed.count() != 0) _phone.advance(elapsed);
   PacketList packets;
-  packets.add(utranRrcState(utranModeName(_phone.mode()), now));
+  packets.add(utranRrcState(_phone.mode(), now));
   packets.add(utranNeighbours(_phone.cells(), now));
   packets.add(utranChannels(_phone.transportChannels(), _phone.codedChannels(), now));
   addServingCell(packets, now);

@@ -18,7 +18,7 @@ using ::testing::ElementsAre;
 const std::vector<C2KPilot> kOnePilot = {{.pnOffset = 340, .energy = -10}};
 
 OneXReport traffic() {
-  return {.state = "Traffic [8]",
+  return {.state = OneXState::Traffic,
           .channel = {.bandClass = 1, .number = 283},
           .receivePower = {-63.248, -80},
           .transmitPower = -10.1,
@@ -77,17 +77,17 @@ TEST(OneXPacketsTest, TheSystemStandsWhereItIsRead) {
                                             .baseStationId = 3152,
                                             .packetZoneId = 4,
                                             .protocolRevision = 6,
-                                            .roaming = "Banner OFF [12]"},
+                                            .isRoaming = true},
                                            kSimulationBegin);
   EXPECT_THAT(bytesAt(packet, 13, 1), ElementsAre(2));
-  EXPECT_THAT(bytesAt(packet, 42, 12), ElementsAre(12, 0, 0, 0, 2, 0, 0, 0, 0x2B, 0x10, 3, 0));
+  EXPECT_THAT(bytesAt(packet, 42, 12), ElementsAre(1, 0, 0, 0, 2, 0, 0, 0, 0x2B, 0x10, 3, 0));
   EXPECT_THAT(bytesAt(packet, 131, 3), ElementsAre(4, 0, 6));
   EXPECT_THAT(bytesAt(packet, 184, 2), ElementsAre(0x50, 0x0C));
 }
 
 TEST(EVDOPacketsTest, TheStatusHasItsFixedLength) {
-  const auto packet = evdoStatus({.deviceState = "Connected [5]",
-                                  .sessionState = "Open [4]",
+  const auto packet = evdoStatus({.deviceState = EVDOState::Connected,
+                                  .sessionState = EVDOSession::Open,
                                   .channel = {.bandClass = 1, .number = 1175},
                                   .receivePower = {-75, -77.4},
                                   .transmitPower = -2,
@@ -102,9 +102,7 @@ TEST(EVDOPacketsTest, TheStatusHasItsFixedLength) {
 }
 
 TEST(EVDOPacketsTest, WithoutAPilotTheOffsetIsInvalid) {
-  const auto packet =
-      evdoStatus({.deviceState = "Inactive [0]", .sessionState = "Closed [0]", .channel = {}},
-                 kSimulationBegin);
+  const auto packet = evdoStatus({.channel = {}}, kSimulationBegin);
   EXPECT_THAT(bytesAt(packet, 18, 2), ElementsAre(0xFF, 0xFF));
 }
 
@@ -130,7 +128,7 @@ TEST(EVDOPacketsTest, AFingerWithoutAPilotIsUnused) {
 
 TEST(EVDOPacketsTest, MakeNoPacketOfWhatTheyCannotCarry) {
   OneXReport report = traffic();
-  report.state = "Somewhere";
+  report.channel.number = 0x1'0000;
   EXPECT_FALSE(oneXStatus(report, kSimulationBegin).has_value());
   report = traffic();
   const std::vector<C2KPilot> many(256);

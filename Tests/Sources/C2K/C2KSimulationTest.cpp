@@ -34,6 +34,33 @@ const Path kFingers = {"02;EV-DO", "05;Finger C/I"};
 const Path kForwardRate = {"02;EV-DO", "06;Data Rate", "01;Forward Link"};
 const Path kReverseRate = {"02;EV-DO", "06;Data Rate", "02;Reverse Link"};
 
+/// As the display has it.
+std::string_view nameOf(OneXState state) {
+  switch (state) {
+    case OneXState::PowerUp:
+      return "Powerup state [11]";
+    case OneXState::Initial:
+      return "Initial state for CDMA operation [2]";
+    case OneXState::Acquisition:
+      return "Acquisition [3]";
+    case OneXState::Sync:
+      return "Sync [4]";
+    case OneXState::Paging:
+      return "Paging [6]";
+    case OneXState::Sleep:
+      return "Slotted mode sleep state [7]";
+    case OneXState::Traffic:
+      break;
+  }
+  return "Traffic [8]";
+}
+
+std::string_view nameOf(EVDOState state) {
+  constexpr std::string_view kNames[] = {"Inactive [0]", "Acquisition [1]", "Sync [2]",
+                                         "Idle [3]",     "Access [4]",      "Connected [5]"};
+  return kNames[static_cast<std::size_t>(state)];
+}
+
 class C2KSimulationTest : public testing::SimulationFixture<C2KSimulation> {
  protected:
   C2KSimulationTest() : SimulationFixture(kTqLogChannelTechnology_Ondrel_CDMA) {}
@@ -114,8 +141,8 @@ TEST_F(C2KSimulationTest, SetsUpASession) {
 TEST_F(C2KSimulationTest, ShowsTheStatesOfThePhoneAndOneReceiverForBoth) {
   for (int i = 0; i < kStepsOfTwentyMinutes; ++i) {
     step();
-    ASSERT_EQ(text(kOneXState), oneXStateName(phone().oneX().state())) << "step " << i;
-    ASSERT_EQ(text(kEVDOState), evdoStateName(phone().evdo().state()));
+    ASSERT_EQ(text(kOneXState), nameOf(phone().oneX().state())) << "step " << i;
+    ASSERT_EQ(text(kEVDOState), nameOf(phone().evdo().state()));
     if (phone().oneX().isInTraffic()) {
       ASSERT_EQ(text(kEVDOState), "Inactive [0]");
       ASSERT_EQ(text(kEVDOActiveSet), "(none)");

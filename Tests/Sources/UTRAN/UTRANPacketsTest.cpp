@@ -81,11 +81,11 @@ TEST(UTRANPacketsTest, PutsTheServingCellWhereItIsRead) {
 }
 
 TEST(UTRANPacketsTest, PutsTheModeBehindItsValidity) {
-  EXPECT_THAT(bytesAt(utranRrcState("Cell URA PCH", kSimulationBegin), 13, 2), ElementsAre(1, 5));
+  EXPECT_THAT(bytesAt(utranRrcState(UTRANMode::UraPch, kSimulationBegin), 13, 2),
+              ElementsAre(1, 5));
 }
 
 TEST(UTRANPacketsTest, MakesNoPacketOfWhatItCannotCarry) {
-  EXPECT_FALSE(utranRrcState("Cell XYZ", kSimulationBegin).has_value());
   EXPECT_FALSE(utranNeighbours(std::vector<UTRANCellReport>(128), kSimulationBegin).has_value());
   EXPECT_FALSE(
       utranNeighbours({{UTRANCellReport{.uarfcn = 16'384}}}, kSimulationBegin).has_value());
