@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-// The one way in which decoders read a packet's bytes.
+// How decoders read a packet's bytes.
 #pragma once
 
 #include <cstddef>
