@@ -21,6 +21,7 @@
 #include "Platform/Bundle.h"
 #include "Platform/DemoServer.h"
 #include "Platform/Linux/LinuxPlatform.h"
+#include "Platform/TextSink.h"
 
 namespace kestro {
 namespace {
@@ -30,7 +31,9 @@ constexpr int kNothingDone = 1;
 /// What is said and saved at an unexpected end takes no longer.
 constexpr unsigned kLastWordsSeconds = 5;
 
-void complain(std::string_view message) { fmt::print(stderr, "kestro: {}\n", message); }
+void complain(std::string_view message) {
+  standardErrorSink().writeLine(fmt::format("kestro: {}", message));
+}
 
 bool hasDisplay() {
   for (const char* variable : {"DISPLAY", "WAYLAND_DISPLAY", "QT_QPA_PLATFORM"}) {

@@ -52,15 +52,9 @@ struct OfflineServices::Services {
     std::string _text;
   };
 
-  class StandardErrorSink : public TextSink {
-   public:
-    void writeLine(std::string_view line) override { fmt::print(stderr, "{}\n", line); }
-  };
-
   explicit Services(std::optional<Output> logFile) : log(std::move(logFile)) {}
 
   Log log;
-  StandardErrorSink standardError;
   std::unique_ptr<Clock> systemClock = createSystemClock();
   ReplayClock clock{*systemClock};
   std::unique_ptr<Bundle> bundle = createBundle();
@@ -79,8 +73,8 @@ const PropertyListCoding& OfflineServices::propertyListCoding() const noexcept {
 
 GeneratorServices OfflineServices::forGenerator() noexcept {
   return {.systemLog = _services->log,
-          .consoleLog = _services->standardError,
-          .standardOutput = _services->standardError,
+          .consoleLog = standardErrorSink(),
+          .standardOutput = standardErrorSink(),
           .clock = _services->clock,
           .bundle = *_services->bundle,
           .propertyListCoding = *_services->coding};

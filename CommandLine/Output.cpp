@@ -6,6 +6,9 @@
 #include <cerrno>
 #include <cstring>
 
+#include "Platform/Linux/LinuxPlatform.h"
+#include "Platform/TextSink.h"
+
 namespace kestro {
 
 void Output::Closer::operator()(std::FILE* file) const noexcept {
@@ -39,6 +42,8 @@ void Output::checkSystemError(bool succeeded) {
   _readerIsGone = errno == EPIPE;
 }
 
-void complain(std::string_view message) { fmt::print(stderr, "kestro-cli: {}\n", message); }
+void complain(std::string_view message) {
+  standardErrorSink().writeLine(fmt::format("kestro-cli: {}", message));
+}
 
 }  // namespace kestro

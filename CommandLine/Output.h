@@ -40,7 +40,8 @@ class Output {
   bool _readerIsGone = false;
 };
 
-/// Writes "kestro-cli: MESSAGE" as a line to standard error.
+/// Writes "kestro-cli: MESSAGE" as a line to standard error; it is dropped when that cannot be
+/// written.
 void complain(std::string_view message);
 
 }  // namespace kestro

@@ -7,6 +7,7 @@
 #include <filesystem>
 #include <utility>
 
+#include "Recordings/OutputPath.h"
 #include "Recordings/PcapFormat.h"
 
 namespace kestro {
@@ -18,22 +19,34 @@ std::string numberedPath(const std::string& first, std::size_t number) {
   return (path.parent_path() / name).string();
 }
 
+Result<PcapWriter> createWriter(const std::string& path, std::string_view technology,
+                                const std::vector<std::string>& inputs) {
+  if (auto checked = checkOutputIsNoInput(path, inputs); !checked) {
+    return tl::unexpected(checked.error());
+  }
+  return PcapWriter::create(path, technology);
+}
+
 }  // namespace
 
-Result<PcapRecording> PcapRecording::create(const std::string& path, std::string_view technology) {
-  auto writer = PcapWriter::create(path, technology);
+Result<PcapRecording> PcapRecording::create(const std::string& path, std::string_view technology,
+                                            std::vector<std::string> inputs) {
+  auto writer = createWriter(path, technology, inputs);
   if (!writer) return tl::unexpected(writer.error());
-  return PcapRecording(path, technology, std::move(*writer));
+  return PcapRecording(path, technology, std::move(*writer), std::move(inputs));
 }
 
 PcapRecording::PcapRecording(const std::string& path, std::string_view technology,
-                             PcapWriter writer)
-    : _files{path}, _technology(technology), _writer(std::move(writer)) {}
+                             PcapWriter writer, std::vector<std::string> inputs)
+    : _inputs(std::move(inputs)),
+      _files{path},
+      _technology(technology),
+      _writer(std::move(writer)) {}
 
 Result<void> PcapRecording::setTechnology(std::string_view technology) {
   if (technology == _technology) return {};
   const auto path = numberedPath(_files.front(), _files.size() + 1);
-  auto writer = PcapWriter::create(path, technology);
+  auto writer = createWriter(path, technology, _inputs);
   if (!writer) return tl::unexpected(writer.error());
   _writer = std::move(*writer);
   _technology = technology;

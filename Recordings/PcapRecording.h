@@ -19,10 +19,11 @@ namespace kestro {
 /// are replaced.
 class PcapRecording {
  public:
-  /// Creates the first file. The error says why that is not possible; a technology that has no link
-  /// type is refused.
+  /// Creates the first file. None of the files may be one of `inputs`. The error says why that is
+  /// not possible; a technology that has no link type is refused.
   [[nodiscard]] static Result<PcapRecording> create(const std::string& path,
-                                                    std::string_view technology);
+                                                    std::string_view technology,
+                                                    std::vector<std::string> inputs = {});
 
   /// Says which technology the following messages have. A change starts the next file; the error of
   /// creating it leaves the recording on the file before.
@@ -40,8 +41,10 @@ class PcapRecording {
   [[nodiscard]] const std::vector<std::string>& files() const noexcept { return _files; }
 
  private:
-  PcapRecording(const std::string& path, std::string_view technology, PcapWriter writer);
+  PcapRecording(const std::string& path, std::string_view technology, PcapWriter writer,
+                std::vector<std::string> inputs);
 
+  std::vector<std::string> _inputs;  ///< what must not be written to
   std::vector<std::string> _files;
   std::string _technology;
   PcapWriter _writer;

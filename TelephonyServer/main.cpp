@@ -61,5 +61,6 @@ int runServer(int argumentCount, const char* const* arguments) {
 }  // namespace kestro
 
 int main(int argumentCount, char** arguments) {
+  kestro::prepareStandardStreams();
   return kestro::runServer(argumentCount, arguments);
 }

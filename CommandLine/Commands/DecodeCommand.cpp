@@ -14,6 +14,7 @@
 #include "CommandLine/OfflineServices.h"
 #include "CommandLine/Output.h"
 #include "Model/Replay.h"
+#include "Recordings/OutputPath.h"
 #include "Recordings/PcapReader.h"
 
 namespace kestro {
@@ -96,6 +97,11 @@ int runDecode(const DecodeOptions& options) {
   }
   std::optional<Output> logFile;
   if (!options.logFile.empty()) {
+    const std::string inputs[] = {options.capture};
+    if (const auto checked = checkOutputIsNoInput(options.logFile, inputs); !checked) {
+      complain(checked.error().message);
+      return kExitNothingDone;
+    }
     auto created = Output::create(options.logFile);
     if (!created) {
       complain(created.error().message);

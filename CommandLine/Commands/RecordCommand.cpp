@@ -4,6 +4,7 @@
 #include <memory>
 #include <string>
 #include <utility>
+#include <vector>
 
 #include "CommandLine/Commands/Command.h"
 #include "CommandLine/Commands/LiveRun.h"
@@ -29,13 +30,20 @@ struct RecordOptions {
   double durationSeconds = 0;
 };
 
+/// The file that a demo plays, if it plays one: what stands behind KIND in KIND:FILE.
+std::vector<std::string> demoFiles(const std::string& source) {
+  const std::size_t colon = source.find(':');
+  if (colon == std::string::npos) return {};
+  return {source.substr(colon + 1)};
+}
+
 class RecordTask : public LiveTask {
  public:
   RecordTask(const RecordOptions& options, Platform& platform, Finish finish)
       : _options(options),
         _platform(platform),
         _finish(std::move(finish)),
-        _session(platform, options.path, complain,
+        _session(platform, options.path, demoFiles(options.live.demoSource), complain,
                  [this](const std::string& reason) { _finish(kExitNothingDone, reason); }) {}
 
   void start() override {

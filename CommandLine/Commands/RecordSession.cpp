@@ -16,10 +16,11 @@ constexpr const char* kConnectingRemark = "connecting...";
 
 }  // namespace
 
-RecordSession::RecordSession(Platform& platform, std::string path, Remark remark,
-                             std::function<void(const std::string& reason)> failed)
+RecordSession::RecordSession(Platform& platform, std::string path, std::vector<std::string> inputs,
+                             Remark remark, std::function<void(const std::string& reason)> failed)
     : _platform(platform),
       _path(std::move(path)),
+      _inputs(std::move(inputs)),
       _remark(std::move(remark)),
       _failed(std::move(failed)),
       _client(platform, *this, ChannelWatch::ByClient) {}
@@ -51,7 +52,7 @@ std::optional<Dictionary> RecordSession::startCommand() {
 
 Result<void> RecordSession::openFile(std::string_view technology) {
   if (_recording) return _recording->setTechnology(technology);
-  auto created = PcapRecording::create(_path, technology);
+  auto created = PcapRecording::create(_path, technology, _inputs);
   if (!created) return tl::unexpected(created.error());
   _recording = *std::move(created);
   return {};

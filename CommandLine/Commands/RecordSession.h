@@ -7,6 +7,7 @@
 #include <optional>
 #include <string>
 #include <string_view>
+#include <vector>
 
 #include "Model/LogChannelClient.h"
 #include "Platform/Platform.h"
@@ -21,10 +22,11 @@ class RecordSession : private LogChannelUser {
   /// A remark for the person who records: that it connects, records, or leaves a message out.
   using Remark = std::function<void(const std::string& text)>;
 
-  /// `path` is the first file's. `failed` is called once when the capture cannot be written; after
-  /// that nothing is recorded. `platform` must outlive the session.
-  RecordSession(Platform& platform, std::string path, Remark remark,
-                std::function<void(const std::string& reason)> failed);
+  /// `path` is the first file's; no file may be one of `inputs`. `failed` is called once when the
+  /// capture cannot be written; after that nothing is recorded. `platform` must outlive the
+  /// session.
+  RecordSession(Platform& platform, std::string path, std::vector<std::string> inputs,
+                Remark remark, std::function<void(const std::string& reason)> failed);
 
   void start();
   /// Records nothing from now on: what still comes while the program ends is in neither the file
@@ -45,6 +47,7 @@ class RecordSession : private LogChannelUser {
 
   Platform& _platform;
   std::string _path;
+  std::vector<std::string> _inputs;
   Remark _remark;
   std::function<void(const std::string& reason)> _failed;
   std::optional<PcapRecording> _recording;

@@ -4,7 +4,6 @@
 #include <fmt/format.h>
 
 #include <algorithm>
-#include <filesystem>
 #include <memory>
 #include <string>
 #include <utility>
@@ -22,6 +21,7 @@
 #include "Model/Replay.h"
 #include "Model/Snapshot.h"
 #include "Platform/Linux/LinuxPlatform.h"
+#include "Recordings/OutputPath.h"
 #include "Recordings/PcapReader.h"
 #include "Recordings/SnapshotFile.h"
 
@@ -68,9 +68,9 @@ int nothingDone(std::string_view why) {
 
 /// Writes a whole file, unless it is the very one that was read; the exit status.
 int writeFile(const SnapshotOptions& options, const Bytes& contents, ExitStatus status) {
-  std::error_code error;
-  if (std::filesystem::equivalent(options.input, options.output, error)) {
-    return nothingDone(fmt::format("{}: the output would replace the input", options.output));
+  const std::string inputs[] = {options.input};
+  if (const auto checked = checkOutputIsNoInput(options.output, inputs); !checked) {
+    return nothingDone(checked.error().message);
   }
   const auto written = replaceFile(
       options.output, {reinterpret_cast<const char*>(contents.data()), contents.size()});

@@ -59,6 +59,16 @@ class LinuxPlatform : public Platform {
 /// started.
 [[nodiscard]] Result<std::unique_ptr<DemoServer>> startDemoServer(const std::string& source);
 
+/// Opens those of the descriptors 0, 1 and 2 that are closed on the null device, so that no file
+/// that is opened later becomes one of them and gets lines that were not meant for it. Call it
+/// first in `main`. A file that reaches the process's size limit is then a full disk: the write
+/// fails, and no signal ends the process.
+void prepareStandardStreams() noexcept;
+
+/// Lines on standard error, for programs that need no event loop. A line that cannot be written is
+/// dropped, whatever the reason.
+[[nodiscard]] TextSink& standardErrorSink();
+
 class PropertyListCoding;
 class Clock;
 class Bundle;

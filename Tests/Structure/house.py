@@ -77,6 +77,7 @@ ROOMS = {
     "App/Program.cpp": Room(
         ("App", "App/Panes", "App/Toolkit", *_APP), HOSTED | {"qt"}, (LINUX_DOOR,)
     ),
+    "App/main.cpp": Room(("App",), HOSTED, (LINUX_DOOR,)),
     "App/Panes": Room(("App/Toolkit", *_APP), CORE | {"qt"}),
     "App/Toolkit": Room((), CORE | {"qt"}),
 }

@@ -25,7 +25,7 @@ class RecordSessionTest : public testing::LogChannelFixture {
 
   void start(const std::string& path) {
     session.emplace(
-        platform, path, [this](const std::string& text) { remarks.push_back(text); },
+        platform, path, inputs, [this](const std::string& text) { remarks.push_back(text); },
         [this](const std::string& reason) { failures.push_back(reason); });
     session->start();
   }
@@ -53,6 +53,7 @@ class RecordSessionTest : public testing::LogChannelFixture {
   }
 
   testing::TemporaryFile file{"drive.pcap"};
+  std::vector<std::string> inputs;
   std::vector<std::string> remarks;
   std::vector<std::string> failures;
   std::optional<RecordSession> session;
@@ -95,6 +96,16 @@ TEST_F(RecordSessionTest, AChangeOfTechnologyGoesOnInTheNextFile) {
             "2 messages, 2 bytes, 0 dropped, in " + file.path() + ", " + second);
   EXPECT_THAT(remarks,
               ElementsAre("recording IFX to " + file.path(), "recording LTE to " + second));
+}
+
+TEST_F(RecordSessionTest, NoLaterFileIsAnInput) {
+  const std::string second = file.directory() + "/drive-2.pcap";
+  std::ofstream(second) << "an input";
+  inputs = {second};
+  start(file.path());
+  changeTechnology("LTE");
+  EXPECT_THAT(failures, ElementsAre(second + ": the output would replace the input"));
+  EXPECT_EQ(std::filesystem::file_size(second), 8U);
 }
 
 TEST_F(RecordSessionTest, GoesOnAfterALostConnection) {

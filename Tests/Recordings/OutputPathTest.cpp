@@ -1,0 +1,55 @@
+// SPDX-License-Identifier: MIT
+#include <gtest/gtest.h>
+
+#include <filesystem>
+#include <fstream>
+#include <string>
+#include <vector>
+
+#include "Recordings/OutputPath.h"
+#include "Tests/Support/TemporaryDirectory.h"
+
+namespace kestro {
+namespace {
+
+namespace fs = std::filesystem;
+
+class OutputPathTest : public ::testing::Test {
+ protected:
+  OutputPathTest() { std::ofstream(path("a.pcap")) << "recording"; }
+
+  [[nodiscard]] std::string path(const std::string& name) const { return directory.pathOf(name); }
+  [[nodiscard]] bool isRefused(const std::string& output,
+                               const std::vector<std::string>& inputs) const {
+    return !checkOutputIsNoInput(output, inputs).has_value();
+  }
+
+  testing::TemporaryDirectory directory;
+};
+
+TEST_F(OutputPathTest, AnInputIsNoOutput) {
+  const std::vector<std::string> inputs = {path("b.pcap"), path("a.pcap")};
+  const auto checked = checkOutputIsNoInput(path("a.pcap"), inputs);
+  ASSERT_FALSE(checked);
+  EXPECT_EQ(checked.error().message, path("a.pcap") + ": the output would replace the input");
+}
+
+TEST_F(OutputPathTest, LinksAndOtherNamesDoNotHideAnInput) {
+  fs::create_symlink(path("a.pcap"), path("symbolic.pcap"));
+  fs::create_hard_link(path("a.pcap"), path("hard.pcap"));
+  EXPECT_TRUE(isRefused(path("symbolic.pcap"), {path("a.pcap")}));
+  EXPECT_TRUE(isRefused(path("hard.pcap"), {path("a.pcap")}));
+  EXPECT_TRUE(isRefused(path("./a.pcap"), {path("a.pcap")}));
+  EXPECT_TRUE(isRefused(path("a.pcap"), {path("symbolic.pcap")}));
+}
+
+TEST_F(OutputPathTest, OtherFilesAndNewOnesAreOutputs) {
+  std::ofstream(path("b.pcap")) << "recording";
+  EXPECT_FALSE(isRefused(path("b.pcap"), {path("a.pcap")}));
+  EXPECT_FALSE(isRefused(path("new.pcap"), {path("a.pcap"), path("new.pcap")}));
+}
+
+TEST_F(OutputPathTest, ADeviceMayBeBoth) { EXPECT_FALSE(isRefused("/dev/null", {"/dev/null"})); }
+
+}  // namespace
+}  // namespace kestro
