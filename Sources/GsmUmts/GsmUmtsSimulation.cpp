@@ -9,6 +9,7 @@
 #include "LogGenerator/Ondrel/SharedDecoders.h"
 #include "Platform/TelephonyService.h"
 #include "Sources/ExtraPackets.h"
+#include "Sources/World/CellNumbers.h"
 
 namespace kestro {
 namespace {
@@ -20,10 +21,6 @@ constexpr unsigned kContextSteps = 4;
 constexpr std::size_t kMostUMTSNeighbours = 6;
 constexpr unsigned kUarfcn = 10613;
 
-// How the simulated network numbers its cells.
-unsigned scramblingCode(const SimulatedCell& cell) { return 24 * cell.site + 8 * cell.sector + 5; }
-unsigned umtsCellId(const SimulatedCell& cell) { return 20'000 + 10 * cell.site + cell.sector; }
-unsigned gsmCellId(const SimulatedCell& cell) { return 40'000 + 10 * cell.site + cell.sector; }
 unsigned locationArea(const SimulatedCell& cell) {
   return cell.site < RingRoad::kSites / 2 ? 601 : 602;
 }

@@ -9,6 +9,7 @@
 
 #include "Platform/TelephonyService.h"
 #include "Sources/PacketSimulation.h"
+#include "Sources/World/CellNumbers.h"
 
 namespace kestro {
 namespace {
@@ -16,10 +17,7 @@ namespace {
 constexpr std::size_t kListedNeighbours = 6;
 constexpr double kWeakestDetected = -24;  // Ec/N0, dB
 
-// How the simulated network numbers its cells.
-unsigned scramblingCode(const SimulatedCell& cell) { return 24 * cell.site + 8 * cell.sector + 5; }
-unsigned umtsCellId(const SimulatedCell& cell) { return 20'000 + 10 * cell.site + cell.sector; }
-unsigned gsmCellId(const SimulatedCell& cell) { return 40'000 + 10 * cell.site + cell.sector; }
+// How the simulated network numbers its cells besides.
 unsigned arfcn(const SimulatedCell& cell) { return 42 + (5 * cell.site + 7 * cell.sector) % 24; }
 std::string baseStationCode(const SimulatedCell& cell) {
   return fmt::format("{}-{}", cell.site % 3 + 1, (cell.site + 3 * cell.sector) % 8);

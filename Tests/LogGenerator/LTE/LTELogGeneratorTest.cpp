@@ -18,17 +18,17 @@ using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 using ::testing::SizeIs;
 
-constexpr const char* kSections[] = {"Serving Cell Info",
-                                     "Connected mode LTE Intra-frequency Measurement",
-                                     "Measured Neighbor Cells",
-                                     "Detected Cells",
-                                     "Serving Cell Measurements",
-                                     "Neighbor Measurements",
-                                     "Neighbor Cells List",
-                                     "Reselection Candidates",
-                                     "Reselection Candidates List",
-                                     "SIM Info",
-                                     "PDP Context Info"};
+constexpr const char* kLTESections[] = {"Serving Cell Info",
+                                        "Connected mode LTE Intra-frequency Measurement",
+                                        "Measured Neighbor Cells",
+                                        "Detected Cells",
+                                        "Serving Cell Measurements",
+                                        "Neighbor Measurements",
+                                        "Neighbor Cells List",
+                                        "Reselection Candidates",
+                                        "Reselection Candidates List",
+                                        "SIM Info",
+                                        "PDP Context Info"};
 
 class LTETest : public ::testing::Test {
  protected:
@@ -42,17 +42,21 @@ class LTETest : public ::testing::Test {
 
 TEST_F(LTETest, TheIndexHasADecoderForEverySection) {
   const DecoderRow rows[] = {
-      {kSections[0], kDictionary, "LTE Serving Cell Info", kReported, {0xB0C2, 0xB0C1, 0xFF0001}},
-      {kSections[1], kDictionary, kSections[1], kReported, {0xB179}},
-      {kSections[2], kList, kSections[2], kReported, {0xB179}},
-      {kSections[3], kList, kSections[3], kReported, {0xB179}},
-      {kSections[4], kDictionary, kSections[4], kReported, {0xB17F}},
-      {kSections[5], kDictionary, kSections[5], kReported, {0xB180}},
-      {kSections[6], kList, kSections[6], kReported, {0xB180}},
-      {kSections[7], kDictionary, kSections[7], kReported, {0xB186}},
-      {kSections[8], kList, kSections[8], kReported, {0xB186}},
-      {kSections[9], kDictionary, "SimInfo", kSilent, {0xFF0000}},
-      {kSections[10], kList, "PDPContextList", kSilent, {0xFF0002}},
+      {kLTESections[0],
+       kDictionary,
+       "LTE Serving Cell Info",
+       kReported,
+       {0xB0C2, 0xB0C1, 0xFF0001}},
+      {kLTESections[1], kDictionary, kLTESections[1], kReported, {0xB179}},
+      {kLTESections[2], kList, kLTESections[2], kReported, {0xB179}},
+      {kLTESections[3], kList, kLTESections[3], kReported, {0xB179}},
+      {kLTESections[4], kDictionary, kLTESections[4], kReported, {0xB17F}},
+      {kLTESections[5], kDictionary, kLTESections[5], kReported, {0xB180}},
+      {kLTESections[6], kList, kLTESections[6], kReported, {0xB180}},
+      {kLTESections[7], kDictionary, kLTESections[7], kReported, {0xB186}},
+      {kLTESections[8], kList, kLTESections[8], kReported, {0xB186}},
+      {kLTESections[9], kDictionary, "SimInfo", kSilent, {0xFF0000}},
+      {kLTESections[10], kList, "PDPContextList", kSilent, {0xFF0002}},
   };
   const LTEClassIndex index(generatorServices(platform));
   expectDecoders(index, platform, rows);
@@ -114,33 +118,33 @@ TEST_F(LTELogGeneratorTest, AsksForItsCodes) {
 
 TEST_F(LTELogGeneratorTest, OnePacketUpdatesAllSectionsThatReadIt) {
   receive(packet(0xB179).u16(17, 1300).u8(27, 1).u8(28, 1).u16(29, 5).u16(35, 6));
-  EXPECT_EQ(section("01;Serving Cell", kSections[1]).dictionary()["E-ARFCN"], Value("1300"));
-  EXPECT_THAT(section("02;Neighbors", kSections[2]).array(), SizeIs(1));
-  EXPECT_THAT(section("02;Neighbors", kSections[3]).array(), SizeIs(1));
+  EXPECT_EQ(section("01;Serving Cell", kLTESections[1]).dictionary()["E-ARFCN"], Value("1300"));
+  EXPECT_THAT(section("02;Neighbors", kLTESections[2]).array(), SizeIs(1));
+  EXPECT_THAT(section("02;Neighbors", kLTESections[3]).array(), SizeIs(1));
 }
 
 TEST_F(LTELogGeneratorTest, AnIntraFrequencyPacketWithoutCellsEmptiesBothLists) {
   receive(packet(0xB179).u16(17, 1300).u8(27, 1).u8(28, 1).u16(29, 5).u16(35, 6));
   receive(packet(0xB179).u16(17, 6300).length(29));
-  EXPECT_EQ(section("01;Serving Cell", kSections[1]).dictionary()["E-ARFCN"], Value("6300"));
-  EXPECT_THAT(section("02;Neighbors", kSections[2]).array(), IsEmpty());
-  EXPECT_THAT(section("02;Neighbors", kSections[3]).array(), IsEmpty());
+  EXPECT_EQ(section("01;Serving Cell", kLTESections[1]).dictionary()["E-ARFCN"], Value("6300"));
+  EXPECT_THAT(section("02;Neighbors", kLTESections[2]).array(), IsEmpty());
+  EXPECT_THAT(section("02;Neighbors", kLTESections[3]).array(), IsEmpty());
 }
 
 TEST_F(LTELogGeneratorTest, NeighborAndReselectionPacketsUpdateTwoSectionsInOrder) {
   static_cast<void>(generator->generateLogUsingState(state));
   static_cast<void>(platform.systemLog().take());
   receive(packet(0xB180).u8(13, 2).u16(21, 301).length(41));
-  EXPECT_EQ(section("02;Neighbors", kSections[5]).dictionary()["Version"], Value("2"));
-  EXPECT_THAT(section("02;Neighbors", kSections[6]).array(), SizeIs(1));
+  EXPECT_EQ(section("02;Neighbors", kLTESections[5]).dictionary()["Version"], Value("2"));
+  EXPECT_THAT(section("02;Neighbors", kLTESections[6]).array(), SizeIs(1));
   const auto neighborLines = platform.systemLog().take();
   ASSERT_THAT(neighborLines, SizeIs(9));  // the list's own lines follow: a count, a cell, 5 levels
   EXPECT_EQ(neighborLines[0], warningLine("Neighbor Measurements"));
   EXPECT_EQ(neighborLines[1], warningLine("Neighbor Cells List"));
 
   receive(packet(0xB186).u8(13, 3).u16(19, 1).u16(21, 6).length(29));
-  EXPECT_EQ(section("03;Reselection", kSections[7]).dictionary()["Version"], Value("3"));
-  EXPECT_THAT(section("03;Reselection", kSections[8]).array(), SizeIs(1));
+  EXPECT_EQ(section("03;Reselection", kLTESections[7]).dictionary()["Version"], Value("3"));
+  EXPECT_THAT(section("03;Reselection", kLTESections[8]).array(), SizeIs(1));
   EXPECT_THAT(platform.systemLog().take(), ElementsAre(warningLine("Reselection Candidates"),
                                                        warningLine("Reselection Candidates List")));
 }
@@ -160,7 +164,7 @@ TEST_F(LTELogGeneratorTest, AnExtraPacketOfCodeTwoCarriesThePacketDataContexts) 
     message.push_back(static_cast<std::uint8_t>(byte));
   }
   generator->updateStateWithData(state, message);
-  EXPECT_EQ(section("05;Packet Data", kSections[10]), Value(Array{"up"}));
+  EXPECT_EQ(section("05;Packet Data", kLTESections[10]), Value(Array{"up"}));
 }
 
 // --- The template --------------------------------------------------------------------------------

@@ -11,13 +11,13 @@ using ::testing::IsEmpty;
 using ::testing::Pair;
 using ::testing::SizeIs;
 
-constexpr NamedValue kNames[] = {{1, "One"}};
+constexpr NamedValue kFieldNames[] = {{1, "One"}};
 
 constexpr Field kFields[] = {
     {"Hidden", u8(0), hidden()},
     {"Number", u8(1), decimal()},
     {"Wide", u32(2), decimal("%u")},
-    {"Name", u8(6), named(kNames, "Other")},
+    {"Name", u8(6), named(kFieldNames, "Other")},
 };
 
 // --- Filling a dictionary ------------------------------------------------------------------------

@@ -24,20 +24,20 @@ constexpr Field kPacketFields[] = {
 };
 static_assert(isLayout(kPacketFields));
 
-constexpr Field kRecordFields[] = {
+constexpr Field kEncodedFields[] = {
     {"Cell", u16(0), decimal()},
     {"Energy", u8(1).ofTwin(), decimal()},
 };
 
-constexpr RecordTable kTable = {.name = "cell",
-                                .count = u8(20).bits(2, 4),
-                                .countAddend = 1,
-                                .base = 21,
-                                .stride = 2,
-                                .fields = kRecordFields,
-                                .twinBase = 21,
-                                .twinPerCount = 3,
-                                .twinStride = 4};
+constexpr RecordTable kEncodedTable = {.name = "cell",
+                                       .count = u8(20).bits(2, 4),
+                                       .countAddend = 1,
+                                       .base = 21,
+                                       .stride = 2,
+                                       .fields = kEncodedFields,
+                                       .twinBase = 21,
+                                       .twinPerCount = 3,
+                                       .twinStride = 4};
 
 class EncodeTest : public ::testing::Test {
  protected:
@@ -61,7 +61,7 @@ TEST_F(EncodeTest, ATextHasNoNumber) {
 }
 
 TEST_F(EncodeTest, NoFewerRecordsThanTheCountSaysForItself) {
-  writer.setCount(kTable, 0);
+  writer.setCount(kEncodedTable, 0);
   EXPECT_FALSE(writer.finish(Moment()));
 }
 
@@ -108,8 +108,8 @@ TEST_F(EncodeTest, WritesBigEndianPlacesAndSeveralPlacesOfOneField) {
 }
 
 TEST_F(EncodeTest, PlacesRecordsAndTwinsByTheCount) {
-  writer.setCount(kTable, 2);  // stored as 1 in bits 2 to 4
-  writer.record(kTable, 1).raw("Cell", 0x0A0B).raw("Energy", 7);
+  writer.setCount(kEncodedTable, 2);  // stored as 1 in bits 2 to 4
+  writer.record(kEncodedTable, 1).raw("Cell", 0x0A0B).raw("Energy", 7);
   // record 1 at 21 + 2; its twin at 21 + 3 × 1 + 4 = 28, the energy in its second byte
   EXPECT_THAT(payload(), ElementsAre(0, 0, 0, 0, 0, 0, 0, 4, 0, 0, 0x0B, 0x0A, 0, 0, 0, 0, 7));
 }
@@ -140,14 +140,14 @@ TEST_F(EncodeTest, YieldsNothingForTheWrongNumberOfRawValues) {
 }
 
 TEST_F(EncodeTest, YieldsNothingForATooLargeCount) {
-  writer.setCount(kTable, 9);  // 3 bits hold 7, one is added
-  for (std::size_t i = 0; i < 9; ++i) writer.record(kTable, i).raw("Cell", 1);
+  writer.setCount(kEncodedTable, 9);  // 3 bits hold 7, one is added
+  for (std::size_t i = 0; i < 9; ++i) writer.record(kEncodedTable, i).raw("Cell", 1);
   EXPECT_FALSE(writer.finish(Moment()));
 }
 
 TEST_F(EncodeTest, RefusesARecordPastTheCount) {
-  writer.setCount(kTable, 2);
-  EXPECT_THROW(static_cast<void>(writer.record(kTable, 2)), ArrayOutOfBoundsException);
+  writer.setCount(kEncodedTable, 2);
+  EXPECT_THROW(static_cast<void>(writer.record(kEncodedTable, 2)), ArrayOutOfBoundsException);
 }
 
 }  // namespace

@@ -19,7 +19,7 @@ using ::testing::ElementsAre;
 using ::testing::EndsWith;
 using ::testing::IsEmpty;
 
-constexpr int kStepsOfTwentyMinutes = 2'400;
+constexpr int kC2KStepsOfTwentyMinutes = 2'400;
 
 // Where the display shows what.
 using Path = std::vector<std::string_view>;
@@ -86,7 +86,7 @@ class C2KSimulationTest : public testing::SimulationFixture<C2KSimulation> {
   }
   std::set<std::string> textsIn(const Path& path) {
     std::set<std::string> texts;
-    for (int i = 0; i < kStepsOfTwentyMinutes; ++i) {
+    for (int i = 0; i < kC2KStepsOfTwentyMinutes; ++i) {
       step();
       texts.insert(text(path));
     }
@@ -95,7 +95,7 @@ class C2KSimulationTest : public testing::SimulationFixture<C2KSimulation> {
   /// How many pilots a list has in the course of the drive.
   std::set<std::size_t> sizesOf(const Path& path) {
     std::set<std::size_t> sizes;
-    for (int i = 0; i < kStepsOfTwentyMinutes; ++i) {
+    for (int i = 0; i < kC2KStepsOfTwentyMinutes; ++i) {
       step();
       sizes.insert(pilots(path).size());
     }
@@ -139,7 +139,7 @@ TEST_F(C2KSimulationTest, SetsUpASession) {
 }
 
 TEST_F(C2KSimulationTest, ShowsTheStatesOfThePhoneAndOneReceiverForBoth) {
-  for (int i = 0; i < kStepsOfTwentyMinutes; ++i) {
+  for (int i = 0; i < kC2KStepsOfTwentyMinutes; ++i) {
     step();
     ASSERT_EQ(text(kOneXState), nameOf(phone().oneX().state())) << "step " << i;
     ASSERT_EQ(text(kEVDOState), nameOf(phone().evdo().state()));
@@ -153,7 +153,7 @@ TEST_F(C2KSimulationTest, ShowsTheStatesOfThePhoneAndOneReceiverForBoth) {
 }
 
 TEST_F(C2KSimulationTest, ShowsThePilotsOfOneXAsStrongAsTheyAre) {
-  for (int i = 0; i < kStepsOfTwentyMinutes; ++i) {
+  for (int i = 0; i < kC2KStepsOfTwentyMinutes; ++i) {
     step();
     const std::vector<C2KPilot> measured = phone().oneXPilots();
     const auto shown = pilots(kOneXActiveSet);
@@ -171,7 +171,7 @@ TEST_F(C2KSimulationTest, ShowsThePilotsOfOneXAsStrongAsTheyAre) {
 }
 
 TEST_F(C2KSimulationTest, ShowsThePilotsOfEVDOAsStrongAsTheyAre) {
-  for (int i = 0; i < kStepsOfTwentyMinutes; ++i) {
+  for (int i = 0; i < kC2KStepsOfTwentyMinutes; ++i) {
     step();
     const std::vector<C2KPilot> measured = phone().evdoPilots();
     const auto shown = pilots(kEVDOActiveSet);
@@ -198,7 +198,7 @@ TEST_F(C2KSimulationTest, ChangesItsServingPilotAndItsOperatorOnTheWay) {
   std::set<std::string> servingPilots;
   std::set<std::string> stations;
   std::set<std::string> systems;
-  for (int i = 0; i < 2 * kStepsOfTwentyMinutes; ++i) {
+  for (int i = 0; i < 2 * kC2KStepsOfTwentyMinutes; ++i) {
     step();
     servingPilots.insert(text(kServingPN));
     stations.insert(text({"01;1x", "02;System", "03;Base Station ID"}));
@@ -218,7 +218,7 @@ TEST_F(C2KSimulationTest, ShowsTheRatesOfThePhone) {
   double reverse = 0;
   double highest = 0;
   step();
-  for (int i = 1; i < kStepsOfTwentyMinutes; ++i) {
+  for (int i = 1; i < kC2KStepsOfTwentyMinutes; ++i) {
     step();
     forward += phone().forwardRate() / 2;
     reverse += phone().reverseRate() / 2;
@@ -237,7 +237,7 @@ TEST_F(C2KSimulationTest, ShowsTheRatesOfThePhone) {
 TEST_F(C2KSimulationTest, ShowsTheErrorRateOfACallAndThenThatItIsOld) {
   double highest = 0;
   bool wasInTraffic = false;
-  for (int i = 0; i < kStepsOfTwentyMinutes; ++i) {
+  for (int i = 0; i < kC2KStepsOfTwentyMinutes; ++i) {
     step();
     const std::string shown = text(kErrorRate);
     wasInTraffic = wasInTraffic || phone().oneX().isInTraffic();
