@@ -105,6 +105,7 @@ CLI::Option* declareOption(CLI::App& app, const OptionRow& row) {
 
 void declareOptions(CLI::App& app, const std::vector<OptionRow>& rows) {
   std::vector<CLI::Option*> options;
+  options.reserve(rows.size());
   for (const OptionRow& row : rows) options.push_back(declareOption(app, row));
   for (std::size_t i = 0; i < rows.size(); ++i) {  // once all that they can name are there
     if (!rows[i].excludes.empty()) options[i]->excludes(app.get_option(rows[i].excludes));

@@ -35,6 +35,7 @@ struct LiveOptions {
 template <class Names>
 [[nodiscard]] std::vector<HelpRow> choicesOf(const Names& names) {
   std::vector<HelpRow> choices;
+  choices.reserve(names.size());
   for (const auto& name : names) choices.push_back({std::string(name), ""});
   return choices;
 }

@@ -24,6 +24,7 @@ inline constexpr const char* kTimesAndNumbers =
 template <class Formats>
 [[nodiscard]] std::vector<HelpRow> formatRows(const Formats& formats) {
   std::vector<HelpRow> rows;
+  rows.reserve(formats.size());
   for (const auto& format : formats) {
     rows.push_back({std::string(format.name), std::string(format.help)});
   }
