@@ -5,6 +5,7 @@ option(KESTRO_BUILD_TESTS "Build the tests" ON)
 option(KESTRO_BUILD_BENCHMARKS "Build the benchmarks" ON)
 option(KESTRO_UNITY "Compile a library's sources several at a time" OFF)
 option(KESTRO_UNITY_TESTS "Compile a test program's sources several at a time" OFF)
+option(KESTRO_PRECOMPILE "Read the headers that nearly every source includes once (g++ only)" ON)
 option(KESTRO_LIBFUZZER "Instrument everything for libFuzzer (clang only)" OFF)
 set(KESTRO_SANITIZERS "" CACHE STRING "Sanitizers to build with, for instance address,undefined")
 
@@ -21,7 +22,10 @@ set(CMAKE_UNITY_BUILD_BATCH_SIZE 6)
 
 find_program(KESTRO_CCACHE ccache)
 if(KESTRO_CCACHE AND NOT CMAKE_CXX_COMPILER_LAUNCHER)
-  set(CMAKE_CXX_COMPILER_LAUNCHER ${KESTRO_CCACHE})
+  # Without this ccache caches nothing that takes a precompiled header.
+  find_program(KESTRO_ENV env REQUIRED)
+  set(CMAKE_CXX_COMPILER_LAUNCHER
+    ${KESTRO_ENV} CCACHE_SLOPPINESS=pch_defines,time_macros ${KESTRO_CCACHE})
 endif()
 
 add_library(KestroCompiler INTERFACE)
@@ -34,11 +38,15 @@ if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
   # look for real ones.
   target_compile_options(KestroCompiler INTERFACE
     -Wno-array-bounds -Wno-stringop-overflow -Wno-stringop-overread)
+  if(KESTRO_PRECOMPILE)
+    target_compile_options(KestroCompiler INTERFACE -fpch-preprocess)  # for ccache
+  endif()
 endif()
 if(NOT KESTRO_SANITIZERS)
   # Hardening: what a mistake in a parser could reach is checked, guarded or not writable.
   target_compile_options(KestroCompiler INTERFACE
-    -fstack-protector-strong -fstack-clash-protection -fcf-protection)
+    -fstack-protector-strong -fstack-clash-protection -fcf-protection
+    $<$<CONFIG:RelWithDebInfo>:-D_FORTIFY_SOURCE=2>)  # it takes optimised code
   target_link_options(KestroCompiler INTERFACE -Wl,-z,relro,-z,now,-z,noexecstack)
 endif()
 if(KESTRO_SANITIZERS)

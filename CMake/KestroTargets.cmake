@@ -2,11 +2,46 @@
 # How targets of ours are made: a folder's sources are found, not listed, so that a new file pair
 # needs no edit here.
 
+# What nearly every source includes, directly or not. It is precompiled, so that it is read once and
+# not by every source; each still includes what it uses (see Tests/Structure).
+set(standard_headers
+  <algorithm> <array> <chrono> <cstddef> <cstdint> <functional> <map> <memory> <optional> <span>
+  <string> <string_view> <unordered_map> <utility> <variant> <vector> <fmt/format.h> <fmt/ranges.h>)
+
+set(unoptimised -O0 -U_FORTIFY_SOURCE)
+
+# kestro_precompile(TARGET SHARED [HEADER...]): gives the target's sources the standard headers
+# precompiled: those of the target SHARED or, with headers of its own, its own.
+function(kestro_precompile name shared)
+  if(NOT TARGET ${shared})
+    return()
+  elseif(ARGN)
+    target_precompile_headers(${name} PRIVATE ${standard_headers} ${ARGN})
+  else()
+    target_precompile_headers(${name} REUSE_FROM ${shared})
+  endif()
+endfunction()
+
+# kestro_add_precompiled(NAME [HEADERS HEADER...] [LINK ...] [OPTIONS OPTION...]): precompiled
+# standard headers for targets that are compiled with the same options. clang cannot read g++'s.
+function(kestro_add_precompiled name)
+  cmake_parse_arguments(ARG "" "" "HEADERS;LINK;OPTIONS" ${ARGN})
+  if(NOT KESTRO_PRECOMPILE OR NOT CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
+    return()
+  endif()
+  file(CONFIGURE OUTPUT ${CMAKE_CURRENT_BINARY_DIR}/${name}.cpp CONTENT "")
+  add_library(${name} OBJECT ${CMAKE_CURRENT_BINARY_DIR}/${name}.cpp)
+  target_link_libraries(${name} PRIVATE KestroCompiler fmt::fmt ${ARG_LINK})
+  target_compile_options(${name} PRIVATE ${ARG_OPTIONS})
+  target_precompile_headers(${name} PRIVATE ${standard_headers} ${ARG_HEADERS})
+endfunction()
+
 # kestro_library(NAME [SOURCES_IN DIR...] [HEADERS FILE...] [LINK ...] [PRIVATE_LINK ...])
-# HEADERS are what others may include; every header of the folders unless given. With the tests
-# (those under sanitizers apart) it is seen that each of them can be compiled alone.
+# HEADERS are what others may include; every header of the folders unless given. Building KestroHeaders
+# shows that each of them can be compiled alone. PRECOMPILED are headers from outside that its sources
+# often include, where precompiling them pays.
 function(kestro_library name)
-  cmake_parse_arguments(ARG "" "" "SOURCES_IN;HEADERS;LINK;PRIVATE_LINK" ${ARGN})
+  cmake_parse_arguments(ARG "" "" "SOURCES_IN;HEADERS;LINK;PRIVATE_LINK;PRECOMPILED" ${ARGN})
   set(sources)
   set(headers ${ARG_HEADERS})
   foreach(directory IN LISTS ARG_SOURCES_IN)
@@ -25,41 +60,36 @@ function(kestro_library name)
     add_library(${name} STATIC ${sources})
     target_link_libraries(${name} PUBLIC KestroCompiler ${ARG_LINK} PRIVATE ${ARG_PRIVATE_LINK})
     set_target_properties(${name} PROPERTIES UNITY_BUILD ${KESTRO_UNITY})
-    if(NOT KESTRO_SANITIZERS)  # it takes optimised code
-      target_compile_options(${name} PRIVATE $<$<CONFIG:RelWithDebInfo>:-D_FORTIFY_SOURCE=2>)
-    endif()
+    kestro_precompile(${name} KestroPrecompiled ${ARG_PRECOMPILED})
   endif()
-  if(KESTRO_BUILD_TESTS AND NOT KESTRO_SANITIZERS)
+  if(KESTRO_BUILD_TESTS)
     kestro_check_headers(${name} ${headers})
   endif()
 endfunction()
 
-# kestro_check_headers(LIBRARY HEADER...): compiles headers alone, those without a source of their
-# own. The others are the first that their sources include (see Tests/Structure), and so need no more
-# than they include themselves.
+# kestro_check_headers(LIBRARY HEADER...): compiles headers alone, without precompiled ones, as a part
+# of the target KestroHeaders, which is built when asked for.
+add_custom_target(KestroHeaders)
 function(kestro_check_headers library)
   set(units)
   foreach(header IN LISTS ARGN)
-    cmake_path(REPLACE_EXTENSION header LAST_ONLY .cpp OUTPUT_VARIABLE source)
-    if(EXISTS ${source})
-      continue()
-    endif()
     cmake_path(RELATIVE_PATH header BASE_DIRECTORY ${PROJECT_SOURCE_DIR})
     set(unit ${CMAKE_CURRENT_BINARY_DIR}/Headers/${header}.cpp)
     file(CONFIGURE OUTPUT ${unit} CONTENT "#include \"@header@\"\n#include \"@header@\"\n" @ONLY)
     list(APPEND units ${unit})
   endforeach()
   if(units)
-    add_library(${library}Headers OBJECT ${units})
+    add_library(${library}Headers OBJECT EXCLUDE_FROM_ALL ${units})
+    add_dependencies(KestroHeaders ${library}Headers)
     target_link_libraries(${library}Headers PRIVATE ${library})
-    target_compile_options(${library}Headers PRIVATE -O0 -g0)
+    target_compile_options(${library}Headers PRIVATE ${unoptimised} -g0)
   endif()
 endfunction()
 
 # kestro_tests(NAME [SOURCES_IN DIR...] [LINK ...]): one test program, its tests registered by name
 # (under sanitizers a part of them at a time).
 function(kestro_tests name)
-  cmake_parse_arguments(ARG "" "" "SOURCES_IN;LINK" ${ARGN})
+  cmake_parse_arguments(ARG "" "" "SOURCES_IN;LINK;PRECOMPILED" ${ARGN})
   set(sources)
   foreach(directory IN LISTS ARG_SOURCES_IN)
     file(GLOB found CONFIGURE_DEPENDS ${directory}/*.cpp)
@@ -72,7 +102,8 @@ function(kestro_tests name)
   target_link_libraries(${name} PRIVATE KestroCompiler ${ARG_LINK} GTest::gmock)
   set_target_properties(${name} PROPERTIES UNITY_BUILD ${KESTRO_UNITY_TESTS})
   # What is tested is optimised; the tests themselves would only take twice as long to compile.
-  target_compile_options(${name} PRIVATE -O0)
+  target_compile_options(${name} PRIVATE ${unoptimised})
+  kestro_precompile(${name} KestroPrecompiledTests ${ARG_PRECOMPILED})
   if(KESTRO_SANITIZERS)
     kestro_add_shards(${name} 4)
   else()
