@@ -35,16 +35,18 @@ processors() {
   nproc 2>/dev/null || echo 2
 }
 
-listed_packages() {  # one a line; the list may hold comments
-  sed -e 's/#.*//' -e 's/[[:space:]]//g' -e '/^$/d' "$root/packages.txt"
+listed_packages() {  # listed_packages GROUP...: the packages of these groups, one a line
+  sed -e 's/#.*//' -e 's/[[:space:]]//g' -e '/^$/d' "$root/packages.txt" |
+    awk -v groups=" $* " '/^\[/ {listed = index(groups, " " substr($0, 2, length - 2) " "); next}
+                          listed'
 }
 
-missing_packages() {
+missing_packages() {  # missing_packages GROUP...
   local installed
   # shellcheck disable=SC2016  # the format is dpkg-query's to expand
   installed=$(dpkg-query --show --showformat='${db:Status-Status} ${Package}\n' |
     sed -n 's/^installed //p')
-  listed_packages | grep -vxF "$installed" || true
+  listed_packages "$@" | grep -vxF "$installed" || true
 }
 
 as_root() {
@@ -53,26 +55,27 @@ as_root() {
   elif command -v sudo >/dev/null; then
     if [[ -n ${CI:-} ]]; then sudo -n "$@"; else sudo "$@"; fi
   else
-    die "installing packages takes root or sudo; as root: apt-get install $(
-      missing_packages | tr '\n' ' ')"
+    # shellcheck disable=SC2154  # the caller's
+    die "installing packages takes root or sudo; as root: apt-get install ${missing[*]}"
   fi
 }
 
-# Touches the network only when a package is missing. KESTRO_SKIP_PACKAGES=1 leaves packages alone.
-install_packages() {
+# Installs the groups' packages. Touches the network only when one is missing.
+# KESTRO_SKIP_PACKAGES=1 leaves packages alone.
+install_packages() {  # install_packages GROUP...
   if [[ -n ${KESTRO_SKIP_PACKAGES:-} ]]; then
     return
   fi
   if ! command -v apt-get >/dev/null || ! command -v dpkg-query >/dev/null; then
     printf 'Building Kestro needs what these Debian packages hold:\n'
-    listed_packages | sed 's/^/  /'
+    listed_packages "$@" | sed 's/^/  /'
     die "no apt here: install them your way, then run again with KESTRO_SKIP_PACKAGES=1"
   fi
 
   local missing=() package
   while read -r package; do
     missing+=("$package")
-  done < <(missing_packages)
+  done < <(missing_packages "$@")
   if ((${#missing[@]} == 0)); then
     return
   fi
@@ -84,18 +87,28 @@ install_packages() {
 }
 
 # A build tree made for another place (a copied or moved folder) is made anew.
-configure() {  # configure PRESET
+configure() {  # configure PRESET [CMAKE ARGUMENT...]
   local cache="$root/build/$1/CMakeCache.txt"
   if [[ -f $cache ]] && ! grep -qxF "CMAKE_HOME_DIRECTORY:INTERNAL=$root" "$cache"; then
     rm -rf "$root/build/$1"
   fi
-  (cd "$root" && cmake --preset "$1" --log-level=NOTICE)
+  (cd "$root" && cmake --preset "$@" --log-level=NOTICE)
 }
 
-build() {  # build PRESET [TARGET...]
+# A tree for what takes only the packages to run. The programs are compiled in it as they are with
+# tests, so that nothing of them is built anew when those are configured in. A tree that has tests keeps them: configuring them away would
+# remove what was built of them.
+configure_programs() {  # configure_programs PRESET
+  if grep -qs '^KESTRO_BUILD_TESTS:.*=ON$' "$root/build/$1/CMakeCache.txt"; then
+    configure "$1"
+  else
+    configure "$1" -DKESTRO_BUILD_TESTS=OFF -DKESTRO_BUILD_BENCHMARKS=OFF
+  fi
+}
+
+build() {  # build PRESET [TARGET...]: in a configured tree
   local preset=$1
   shift
-  configure "$preset"
   (cd "$root" && cmake --build --preset "$preset" ${1:+--target "$@"})
 }
 
