@@ -27,8 +27,8 @@ CommandRow commandLineProgram(const Bundle& bundle) {
                                  {"1", "nothing could be done; one line says why"},
                                  {"2", "wrong usage"},
                                  {"3",
-                                  "done, but some messages could not be decoded; each is named on "
-                                  "standard error"}}},
+                                  "done, but some messages could not be decoded or were not "
+                                  "recorded; standard error says which, or how many"}}},
                        {.text = "`kestro-cli COMMAND --help` explains a command."}}};
 }
 

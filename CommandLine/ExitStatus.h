@@ -8,7 +8,7 @@ enum ExitStatus : int {
   kExitDone = 0,
   kExitNothingDone = 1,  ///< one line on standard error says why
   kExitWrongUsage = 2,
-  kExitPartlyDone = 3,  ///< some messages were not decoded; each has its line on standard error
+  kExitPartlyDone = 3,  ///< some messages were not decoded, or not recorded; standard error says so
 };
 
 }  // namespace kestro

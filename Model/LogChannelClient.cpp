@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "Model/LogChannelClient.h"
 
+#include <algorithm>
 #include <utility>
 
 #include "Platform/MessagePort.h"
@@ -14,10 +15,33 @@ LogChannelClient::LogChannelClient(Platform& platform, LogChannelUser& user, Cha
     : _platform(platform),
       _user(user),
       _watch(watch),
-      _ports(platform, {.received = [this](ByteView message) { _user.messageArrived(message); },
-                        .lost = [this] { restart(); },
-                        .notified = [this] { serverNotified(); }}),
+      _ports(platform, handlers()),
       _self(std::make_shared<LogChannelClient*>(this)) {}
+
+LogChannelHandlers LogChannelClient::handlers() {
+  LogChannelHandlers result{.received = [this](ByteView message) { _user.messageArrived(message); },
+                            .lost = [this] { restart(); },
+                            .notified = [this] { serverNotified(); }};
+  if (_watch == ChannelWatch::ByClient) {
+    result.followed = [this](std::optional<std::uint64_t> missed) { followed(missed); };
+  }
+  return result;
+}
+
+void LogChannelClient::check() {
+  if (_ports.check()) _seen = _platform.clock().now();
+}
+
+void LogChannelClient::followed(std::optional<std::uint64_t> missed) {
+  const Moment now = _platform.clock().now();
+  const auto gap = now - std::exchange(_seen, now).value_or(now);
+  _user.channelFollowed(std::max(gap, std::chrono::microseconds(0)), missed);
+}
+
+std::optional<std::chrono::microseconds> LogChannelClient::gap() const {
+  if (_isRunning || !_seen) return std::nullopt;
+  return std::max(_platform.clock().now() - *_seen, std::chrono::microseconds(0));
+}
 
 void LogChannelClient::start() {
   if (_isRunning) return;
@@ -53,6 +77,7 @@ bool LogChannelClient::tryStart() {
   requestTechnology();
   if (!sendStartCommand()) return false;
   _isRunning = true;
+  _seen = _platform.clock().now();
   if (_watch == ChannelWatch::ByClient) {
     _checkTimer =
         _platform.mainQueue().scheduleRepeating(kChannelCheckInterval, [this] { check(); });

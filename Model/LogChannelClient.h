@@ -3,12 +3,14 @@
 #pragma once
 
 #include <chrono>
+#include <cstdint>
 #include <memory>
 #include <optional>
 #include <string_view>
 
 #include "Model/LogChannelPorts.h"
 #include "Platform/Bytes.h"
+#include "Platform/Clock.h"
 #include "Platform/MainQueue.h"
 #include "Platform/Platform.h"
 #include "Platform/PropertyList.h"
@@ -49,6 +51,12 @@ class LogChannelUser {
   /// that is replaced at once has not gone.
   virtual void connectionChanged(bool /*isConnected*/) {}
 
+  /// A channel has taken the place of one that was lost, `gap` after that was last seen to be
+  /// there. So many messages were missed meanwhile; absent when the server does not know. Only with
+  /// `ChannelWatch::ByClient`.
+  virtual void channelFollowed(std::chrono::microseconds /*gap*/,
+                               std::optional<std::uint64_t> /*missed*/) {}
+
   /// The telephony server has something to tell; only with `ChannelWatch::ByUser`.
   virtual void serverNotified() {}
 
@@ -85,7 +93,11 @@ class LogChannelClient {
   /// Closes the ports. A retry that is queued connects again all the same.
   void close();
   /// Restarts when the telephony server has closed the channel.
-  void check() { _ports.check(); }
+  void check();
+
+  /// How long ago the channel was last seen that is lost; absent while there is one, and before
+  /// there was one. Only with `ChannelWatch::ByClient`.
+  [[nodiscard]] std::optional<std::chrono::microseconds> gap() const;
 
   /// The steps of `start`, for who takes them one by one. Opens the ports, see
   /// `LogChannelPorts::open`.
@@ -96,6 +108,8 @@ class LogChannelClient {
  private:
   void stopPorts();
   [[nodiscard]] bool tryStart();
+  [[nodiscard]] LogChannelHandlers handlers();
+  void followed(std::optional<std::uint64_t> missed);
   void readTechnology(ByteView reply);
   [[nodiscard]] bool sendStartCommand();
   void scheduleRetry();
@@ -111,6 +125,7 @@ class LogChannelClient {
   std::unique_ptr<Timer> _checkTimer;
   bool _isRunning = false;
   bool _toldConnected = false;
+  std::optional<Moment> _seen;  ///< when there was a channel for the last time
 };
 
 }  // namespace kestro

@@ -9,7 +9,6 @@
 
 #include "Platform/SystemLog.h"
 #include "Platform/TelephonyProtocol.h"
-#include "Platform/TelephonyService.h"
 #include "Platform/Uuids.h"
 
 namespace kestro {
@@ -59,8 +58,7 @@ bool LogChannelPorts::createRemotePort(std::string_view localPortName) {
     logError("Could not create TqServerConnection");
     return false;
   }
-  const LogChannelReply channel =
-      telephony._TqServerConnectionNetworkMonitorCreateLogChannel(*connection, localPortName);
+  const LogChannelReply channel = requestChannel(*connection, localPortName);
   if (channel.error != 0) {
     _platform.systemLog().log(
         LogPriority::Error, "_TqServerConnectionNetworkMonitorCreateLogChannel returns error: {}!",
@@ -71,9 +69,20 @@ bool LogChannelPorts::createRemotePort(std::string_view localPortName) {
     logError("Could not create a log channel (Tq returned null port)!");
     return false;
   }
+  const bool follows = !std::exchange(_channelPort, *channel.portName).empty();
+  if (follows && _handlers.followed) _handlers.followed(channel.lost);
   _sendPort = _platform.messagePorts().createRemotePort(*channel.portName);
   if (!_sendPort) logError("Could not create the remote port!");
   return _sendPort != nullptr;
+}
+
+LogChannelReply LogChannelPorts::requestChannel(TqServerConnection& connection,
+                                                std::string_view localPortName) {
+  TelephonyService& telephony = _platform.telephonyService();
+  if (_channelPort.empty() || !_handlers.followed) {
+    return telephony._TqServerConnectionNetworkMonitorCreateLogChannel(connection, localPortName);
+  }
+  return telephony.createLogChannelAfter(connection, localPortName, _channelPort);
 }
 
 void LogChannelPorts::close() {
@@ -84,11 +93,14 @@ void LogChannelPorts::close() {
   if (const auto port = std::exchange(_sendPort, nullptr)) port->invalidate();
 }
 
-void LogChannelPorts::check() {
-  if (!areOpen() || _sendPort->isValid()) return;
+bool LogChannelPorts::check() {
+  if (!areOpen()) return false;
+  if (_sendPort->isValid()) return true;
   // The handler may let go of the port that is being invalidated.
   const std::shared_ptr<LocalPort> port = _recvPort;
+  if (_handlers.followed) port->serveArrived();  // what came in time counts as received
   port->invalidate();
+  return false;
 }
 
 RemotePort::Reply LogChannelPorts::request(ByteView command) {

@@ -3,13 +3,17 @@
 #pragma once
 
 #include <chrono>
+#include <cstdint>
 #include <functional>
 #include <memory>
+#include <optional>
+#include <string>
 #include <string_view>
 
 #include "Platform/Bytes.h"
 #include "Platform/MessagePort.h"
 #include "Platform/Platform.h"
+#include "Platform/TelephonyService.h"
 
 namespace kestro {
 
@@ -24,6 +28,9 @@ struct LogChannelHandlers {
   std::function<void()> lost;
   /// The telephony server notifies.
   std::function<void()> notified;
+  /// The server has made a channel in place of the one before; how many messages that one has
+  /// missed, if the server knows. Without this handler it is not asked.
+  std::function<void(std::optional<std::uint64_t> missed)> followed = {};
 };
 
 /// Main thread only.
@@ -44,8 +51,9 @@ class LogChannelPorts {
 
   /// Whether both ports exist; it does not look whether they still work.
   [[nodiscard]] bool areOpen() const noexcept { return _recvPort && _sendPort; }
-  /// Loses the local port when the telephony server has closed the channel.
-  void check();
+  /// Loses the local port when the telephony server has closed the channel. Whether the channel is
+  /// there.
+  bool check();
 
   /// Sends a command to the channel, the remote port of which must exist, and waits for its reply.
   [[nodiscard]] RemotePort::Reply request(ByteView command);
@@ -55,12 +63,15 @@ class LogChannelPorts {
  private:
   void createLocalPort(std::string_view name);
   [[nodiscard]] bool createRemotePort(std::string_view localPortName);
+  [[nodiscard]] LogChannelReply requestChannel(TqServerConnection& connection,
+                                               std::string_view localPortName);
   void logError(std::string_view line);
 
   Platform& _platform;
   LogChannelHandlers _handlers;
   std::shared_ptr<LocalPort> _recvPort;
   std::shared_ptr<RemotePort> _sendPort;
+  std::string _channelPort;  ///< of the last channel that there was
 };
 
 }  // namespace kestro

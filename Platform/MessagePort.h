@@ -55,6 +55,10 @@ class LocalPort {
 
   [[nodiscard]] virtual bool isValid() const = 0;
 
+  /// Serves, before it returns, what has arrived by now. For who is about to close the port and
+  /// wants no message lost that came in time.
+  virtual void serveArrived() = 0;
+
   /// The process that sent what the handler is answering: who connected. Of use in the handler
   /// only; elsewhere kUnknownProcess.
   [[nodiscard]] virtual ProcessNumber sender() const = 0;

@@ -19,7 +19,8 @@ namespace {
 constexpr const char* kRecordText =
     R"(Nothing is decoded. The recording ends with Ctrl-C or after its duration, and goes on over lost
 connections; when the baseband changes its technology it goes on in FILE-2.pcap, FILE-3.pcap and
-so on. Existing files are replaced. Messages of more than 262,144 bytes are dropped and counted.)";
+so on. Existing files are replaced. Messages of more than 262,144 bytes are dropped and counted.
+When a lost connection has cost messages, the last line says how many, and the exit status is 3.)";
 
 constexpr const char* kRecordExamples = R"(  kestro-cli record -o drive.pcap
   kestro-cli record -o minute.pcap --duration=60 --demo)";
@@ -56,7 +57,10 @@ class RecordTask : public LiveTask {
 
   void stop() override {
     _session.stop();
-    if (const auto summary = _session.summary()) return _finish(kExitDone, "recorded " + *summary);
+    if (const auto summary = _session.summary()) {
+      const int status = _session.isIncomplete() ? kExitPartlyDone : kExitDone;
+      return _finish(status, "recorded " + *summary);
+    }
     _finish(kExitNothingDone, "nothing was recorded: no telephony server could be connected to");
   }
 

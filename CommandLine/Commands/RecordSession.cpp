@@ -30,12 +30,36 @@ void RecordSession::start() {
   if (!_client.isConnected()) _remark(kConnectingRemark);
 }
 
-void RecordSession::stop() { _isOver = true; }
+void RecordSession::stop() {
+  if (const auto gap = _client.gap()) channelFollowed(*gap, std::nullopt);
+  _isOver = true;
+}
 
 std::optional<std::string> RecordSession::summary() const {
   if (!_recording) return std::nullopt;
-  return fmt::format("{} messages, {} bytes, {} dropped, in {}", _recording->messageCount(),
-                     _byteCount, _recording->leftOutCount(), fmt::join(_recording->files(), ", "));
+  return fmt::format("{} messages, {} bytes, {} dropped, in {}{}", _recording->messageCount(),
+                     _byteCount, _recording->leftOutCount(), fmt::join(_recording->files(), ", "),
+                     lossesText());
+}
+
+std::string RecordSession::lossesText() const {
+  if (!isIncomplete()) return {};
+  std::string missed = fmt::format("{} messages", _losses.messages);
+  if (_losses.areMore) {
+    missed = _losses.messages == 0 ? "an unknown number of messages" : "at least " + missed;
+  }
+  return fmt::format("; lost the connection {} {}, for at most {:.1f} s, and {}", _losses.count,
+                     _losses.count == 1 ? "time" : "times",
+                     std::chrono::duration<double>(_losses.time).count(), missed);
+}
+
+void RecordSession::channelFollowed(std::chrono::microseconds gap,
+                                    std::optional<std::uint64_t> missed) {
+  if (_isOver || missed == 0U) return;
+  ++_losses.count;
+  _losses.time += gap;
+  _losses.messages += missed.value_or(0);
+  _losses.areMore |= !missed;
 }
 
 void RecordSession::technologyAnswered(std::string_view technology) {

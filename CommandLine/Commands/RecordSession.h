@@ -2,6 +2,7 @@
 // Recording what arrives on the log channel.
 #pragma once
 
+#include <chrono>
 #include <cstdint>
 #include <functional>
 #include <optional>
@@ -33,15 +34,29 @@ class RecordSession : private LogChannelUser {
   /// nor the summary.
   void stop();
 
-  /// "123 messages, 4567 bytes, 0 dropped, in drive.pcap"; absent when no file was begun.
+  /// "123 messages, 4567 bytes, 0 dropped, in drive.pcap", and how often the connection was lost,
+  /// for how long and how many messages, if it was; absent when no file was begun.
   [[nodiscard]] std::optional<std::string> summary() const;
+
+  /// Whether messages are missing, as far as is known.
+  [[nodiscard]] bool isIncomplete() const noexcept { return _losses.count > 0; }
 
  private:
   void technologyAnswered(std::string_view technology) override;
   [[nodiscard]] std::optional<Dictionary> startCommand() override;
   void messageArrived(ByteView message) override;
   void connectionChanged(bool isConnected) override;
+  void channelFollowed(std::chrono::microseconds gap, std::optional<std::uint64_t> missed) override;
 
+  /// Connections that were lost, with messages.
+  struct Losses {
+    unsigned count = 0;
+    std::chrono::microseconds time{0};
+    std::uint64_t messages = 0;
+    bool areMore = false;  ///< than those messages; nobody knows how many
+  };
+
+  [[nodiscard]] std::string lossesText() const;
   [[nodiscard]] Result<void> openFile(std::string_view technology);
   void fail(const std::string& reason);
 
@@ -52,6 +67,7 @@ class RecordSession : private LogChannelUser {
   std::function<void(const std::string& reason)> _failed;
   std::optional<PcapRecording> _recording;
   std::uint64_t _byteCount = 0;
+  Losses _losses;
   bool _isOver = false;  ///< stopped or failed: nothing is recorded any more
   LogChannelClient _client;
 };

@@ -9,6 +9,9 @@ namespace {
 /// How long one peer is served before others get their turn.
 constexpr std::chrono::milliseconds kTurn{10};
 
+/// How many turns are taken at once for what has arrived.
+constexpr int kArrivedTurns = 16;
+
 /// Nothing more is read from a peer while more than this waits for it to be read.
 constexpr std::size_t kReplyBacklog = std::size_t{1024} * 1024;
 
@@ -37,6 +40,14 @@ InboundConnection::InboundConnection(FileDescriptor socket, ProcessNumber peer,
 void InboundConnection::disown() {
   _closed = nullptr;
   close();
+}
+
+void InboundConnection::serveArrived() {
+  const auto self = shared_from_this();
+  for (int turn = 0; turn < kArrivedTurns && isOpen() && !_serving; ++turn) {
+    if (!reader().hasNext() && !hasUnreadBytes()) return;
+    onReadable();
+  }
 }
 
 void InboundConnection::onReadable() {

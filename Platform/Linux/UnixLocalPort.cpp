@@ -6,6 +6,7 @@
 #include <cerrno>
 #include <system_error>
 #include <utility>
+#include <vector>
 
 #include "Platform/Linux/PortPeer.h"
 
@@ -92,6 +93,14 @@ void UnixLocalPort::serve(FileDescriptor socket) {
       std::move(socket), peer->process, _name, _context, _receiver,
       [this](const InboundConnection& closed) { _connections.erase(&closed); });
   _connections.emplace(connection.get(), connection);
+}
+
+void UnixLocalPort::serveArrived() {
+  // Handlers may close connections, and the port.
+  std::vector<std::shared_ptr<InboundConnection>> connections;
+  connections.reserve(_connections.size());
+  for (const auto& [key, connection] : _connections) connections.push_back(connection);
+  for (const auto& connection : connections) connection->serveArrived();
 }
 
 void UnixLocalPort::checkName() {

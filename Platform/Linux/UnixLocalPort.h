@@ -25,6 +25,7 @@ class UnixLocalPort final : public LocalPort {
   void setInvalidationHandler(std::function<void()> handler) override;
   void invalidate() override;
   [[nodiscard]] bool isValid() const override { return _listener.has_value(); }
+  void serveArrived() override;
   [[nodiscard]] ProcessNumber sender() const override { return _receiver->sender; }
 
  private:

@@ -31,6 +31,10 @@ class InMemoryPorts::Local : public LocalPort, public std::enable_shared_from_th
   }
 
   [[nodiscard]] bool isValid() const override { return _valid; }
+  void serveArrived() override {
+    const auto self = shared_from_this();
+    while (_valid && !_stalled && !_waiting.empty()) deliverFirst();
+  }
   [[nodiscard]] bool isStalled() const noexcept { return _stalled; }
 
   [[nodiscard]] ProcessNumber sender() const override { return _sender; }

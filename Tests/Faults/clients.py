@@ -2,6 +2,7 @@
 """Clients die, stand still and come in crowds."""
 
 import resource
+import signal
 import time
 
 from promises import MEBIBYTE, Use, in_lanes, pause, require, spread, wait_until, waits_of_all
@@ -64,7 +65,25 @@ def stop_long(server, steady, client):
         lambda: steady.read() and client.read().stretches_of(life) == 2,
         "who was left behind connects again",
     )
+    check_loss(steady, client)
     return max(memory)
+
+
+def check_loss(steady, client):
+    """Ends a client that lost its channel once; it must tell how many messages that cost."""
+    client.signal(signal.SIGTERM)
+
+    def has_ended():
+        steady.read()
+        client.read()
+        return not client.is_running()
+
+    wait_until(has_ended, "a client ends as asked")
+    require(client.wait("a client ends") == 3, "a client that missed messages says so")
+    before, after = client.read().stretches
+    missed = after[1] - before[2] - 1
+    said = client.errors()
+    require(f", and {missed} messages" in said, f"what is missing is told ({missed}: {said})")
 
 
 KINDS = [kill, stop_shortly, stop_and_kill, stop_long] + [kill, stop_shortly] * 2 + [kill] * 2

@@ -65,12 +65,14 @@ def server_killed(options):
     def finish(clients):
         """Ends the clients; how many messages they recorded."""
         for client in clients:
-            require(client.end() == 0, "a client ends as asked")
+            status = client.end()
+            require(status == (0 if client is clients[2] else 3), f"a client ends as asked ({status})")
         for recorder in clients[:2]:
             count = recorder.read().count
             require(recorder.recording.unread_bytes == 0, "a recording ends with a whole message")
             said = recorder.errors()
             require(f"recorded {count} messages" in said, f"the count is true ({count}: {said})")
+            require("lost the connection" in said, "a recording tells of lost connections")
         return sum(recorder.recording.count for recorder in clients[:2])
 
     results = in_lanes(options.lanes, options.rounds, lane)

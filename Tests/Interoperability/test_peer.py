@@ -87,6 +87,17 @@ class Interoperability(unittest.TestCase):
         self.assertGreaterEqual(first, -90)
         self.assertGreater(second, first)
 
+    def test_the_peer_serves_record(self):
+        self.start_server([*PEER, "server"])
+        path = self.ports / "recording.pcap~"
+        finished = subprocess.run(
+            [os.environ["KESTRO_CLI"], "record", f"--output={path}", "--duration=2"],
+            env=self.environment, stderr=subprocess.PIPE, timeout=PATIENCE, check=False,
+        )
+        last = finished.stderr.decode().splitlines()[-1]
+        self.assertRegex(last, rf" recorded [1-9]\d* messages, \d+ bytes, 0 dropped, in {path}$")
+        self.assertEqual(finished.returncode, 0)
+
     def test_the_peer_watches_the_server(self):
         self.start_server(
             [os.environ["KESTRO_TELEPHONYD"], "--source=simulation", "--technology=IFX", "--speed=50"]

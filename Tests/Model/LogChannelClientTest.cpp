@@ -37,11 +37,17 @@ class RecordingUser : public LogChannelUser {
   void connectionChanged(bool isConnected) override {
     events.emplace_back(isConnected ? "connected" : "disconnected");
   }
+  void channelFollowed(std::chrono::microseconds gap,
+                       std::optional<std::uint64_t> missed) override {
+    gaps.push_back({gap, missed});
+  }
   void serverNotified() override { events.emplace_back("notified"); }
   [[nodiscard]] std::shared_ptr<const void> keptByRetry() override { return kept; }
 
   std::vector<std::string> take() { return std::exchange(events, {}); }
 
+  using Gap = std::pair<std::chrono::microseconds, std::optional<std::uint64_t>>;
+  std::vector<Gap> gaps;
   std::vector<std::string> events;
   std::optional<Dictionary> command = Dictionary{{"SetState", "Streaming"}};
   bool throwsAtMessages = false;
@@ -347,6 +353,52 @@ TEST_F(LogChannelClientTest, ARetryThatOutlivesItDoesNothing) {
   queue().advance(60s);
   EXPECT_THAT(user.take(), IsEmpty());
   EXPECT_THAT(channelRequests, IsEmpty());
+}
+
+// What is told of a channel that was lost.
+
+TEST_F(LogChannelClientTest, TellsWhatALostChannelHasMissedAndHowLongItWasGone) {
+  startClient();
+  queue().advance(5s);  // the last look was after 4 s, the next is after 6
+  channel.reset();
+  openChannel();
+  channelReply.lost = 7;
+  queue().advance(1s);
+  EXPECT_THAT(platform.telephonyService().previousPorts(), ElementsAre("Channel"));
+  EXPECT_THAT(user.gaps, ElementsAre(RecordingUser::Gap(2s, 7)));
+  EXPECT_EQ(client->gap(), std::nullopt);
+}
+
+TEST_F(LogChannelClientTest, TakesWhatHasArrivedBeforeItLetsGoOfALostChannel) {
+  startClient();
+  const auto port = platform.messagePorts().createRemotePort(channelRequests.back());
+  ASSERT_EQ(port->post(0, bytesOf("in time")), SendError::None);
+  channel.reset();
+  openChannel();
+  client->check();
+  EXPECT_THAT(user.take(),
+              ElementsAre("message in time", "stops", "technology IFX", "command?", "started"));
+}
+
+TEST_F(LogChannelClientTest, TellsTheGapWhileThereIsNoChannel) {
+  makeClient();
+  EXPECT_EQ(client->gap(), std::nullopt);
+  client->start();
+  EXPECT_EQ(client->gap(), std::nullopt);
+  platform.telephonyService().setReachable(false);
+  channel.reset();
+  queue().advance(3s);
+  EXPECT_EQ(client->gap(), 3s);
+}
+
+TEST_F(LogChannelClientTest, WhoWatchesItsChannelItselfIsToldNothingOfLostOnes) {
+  startClient(ChannelWatch::ByUser);
+  channel.reset();
+  openChannel();
+  client->check();
+  EXPECT_TRUE(client->isConnected());
+  EXPECT_THAT(user.gaps, IsEmpty());
+  EXPECT_THAT(platform.telephonyService().previousPorts(), IsEmpty());
 }
 
 }  // namespace

@@ -16,6 +16,7 @@ namespace {
 
 using namespace std::chrono_literals;
 using ::testing::ElementsAre;
+using ::testing::EndsWith;
 using testing::FileSizeLimit;
 using ::testing::IsEmpty;
 
@@ -93,7 +94,9 @@ TEST_F(RecordSessionTest, AChangeOfTechnologyGoesOnInTheNextFile) {
   const std::string second = file.directory() + "/drive-2.pcap";
   EXPECT_THAT(messagesIn(second), ElementsAre("LTE: 2, b"));
   EXPECT_EQ(session->summary(),
-            "2 messages, 2 bytes, 0 dropped, in " + file.path() + ", " + second);
+            "2 messages, 2 bytes, 0 dropped, in " + file.path() + ", " + second +
+                "; lost the connection 1 time, for at most 2.0 s, and an unknown number of "
+                "messages");
   EXPECT_THAT(remarks,
               ElementsAre("recording IFX to " + file.path(), "recording LTE to " + second));
 }
@@ -119,6 +122,45 @@ TEST_F(RecordSessionTest, GoesOnAfterALostConnection) {
   EXPECT_THAT(messagesIn(file.path()), ElementsAre("IFX: 0, a", "IFX: 8, b"));
   EXPECT_THAT(remarks, ElementsAre("recording IFX to " + file.path(), "connecting...",
                                    "recording IFX to " + file.path()));
+}
+
+TEST_F(RecordSessionTest, TellsWhatLostConnectionsHaveCost) {
+  start(file.path());
+  EXPECT_FALSE(session->isIncomplete());
+  channelReply.lost = 823'387;
+  changeTechnology("IFX");
+  EXPECT_THAT(platform.telephonyService().previousPorts(), ElementsAre("Channel"));
+  EXPECT_EQ(session->summary(),
+            "0 messages, 0 bytes, 0 dropped, in " + file.path() +
+                "; lost the connection 1 time, for at most 2.0 s, and 823387 messages");
+  EXPECT_TRUE(session->isIncomplete());
+  channelReply.lost = 3;
+  changeTechnology("IFX");
+  EXPECT_THAT(*session->summary(),
+              EndsWith("; lost the connection 2 times, for at most 4.0 s, and 823390 messages"));
+  channelReply.lost = std::nullopt;
+  changeTechnology("IFX");
+  EXPECT_THAT(*session->summary(), EndsWith("; lost the connection 3 times, for at most 6.0 s, and "
+                                            "at least 823390 messages"));
+}
+
+TEST_F(RecordSessionTest, ALostConnectionThatCostNothingIsNoLoss) {
+  start(file.path());
+  channelReply.lost = 0;
+  changeTechnology("IFX");
+  EXPECT_EQ(session->summary(), "0 messages, 0 bytes, 0 dropped, in " + file.path());
+  EXPECT_FALSE(session->isIncomplete());
+}
+
+TEST_F(RecordSessionTest, AConnectionThatIsLostAtTheEndIsALoss) {
+  start(file.path());
+  queue().advance(10s);
+  loseServer();
+  queue().advance(5s);
+  session->stop();
+  EXPECT_THAT(*session->summary(), EndsWith("; lost the connection 1 time, for at most 5.0 s, and "
+                                            "an unknown number of messages"));
+  EXPECT_TRUE(session->isIncomplete());
 }
 
 TEST_F(RecordSessionTest, WhatComesAfterItsEndIsInNeitherTheFileNorTheSummary) {

@@ -173,6 +173,18 @@ TEST_F(UnixLocalPortTest, AReplyToAPeerThatIsGoneIsDropped) {
   EXPECT_TRUE(port->isValid());
 }
 
+TEST_F(UnixLocalPortTest, ServesWhatHasArrivedWhenAskedTo) {
+  const auto port = openPort("A");
+  RawPeer peer = connectRaw("A");
+  turnUntilIdle();
+  for (int i = 0; i < 50; ++i) peer.send(frame(kMessage, 0, 0, std::string(1000, 'x')));
+  peer.close();
+  EXPECT_THAT(messages, IsEmpty());
+  port->serveArrived();
+  EXPECT_EQ(messages.size(), 50U);
+  EXPECT_THAT(log.lines(), IsEmpty());
+}
+
 // Malformed frames: each closes its connection, and nothing else.
 
 TEST_F(UnixLocalPortTest, AFrameOfUnknownKindClosesItsConnection) {
