@@ -43,6 +43,7 @@ class CountingListener : public PlaybackListener {
     if (_filter.accepts(message)) ++_counts.wanted;
     _server.messageDue(message, time);
   }
+  void sourceEnded() override { _server.sourceEnded(); }
 
  private:
   Server& _server;
