@@ -39,14 +39,18 @@ struct RecordPosition {
   return 0xFFFFFFFFU >> (32 - place.bitCount);
 }
 
+/// The bits of a big-endian place that begins at `offset`. Few places are: it stays out of the way
+/// of the others.
+[[nodiscard]] std::uint32_t readBigEndianBits(const Place& place, PacketView packet,
+                                              std::size_t offset);
+
 /// The place's bits as they stand in the packet, without regard to their sign.
 [[nodiscard]] inline std::uint32_t readBits(const Place& place, PacketView packet,
                                             const RecordPosition& position) {
   const std::size_t offset = offsetOf(place, position);
-  const std::uint32_t word = place.isBigEndian
-                                 ? packet.bigEndianWord(offset) >> (8 * (4 - place.width))
-                                 : packet.word(offset);
-  return word >> place.firstBit & maskOf(place);
+  if (place.isBigEndian) [[unlikely]]
+    return readBigEndianBits(place, packet, offset);
+  return packet.word(offset) >> place.firstBit & maskOf(place);
 }
 
 /// The bits as a number, signed where the place is.
