@@ -2,6 +2,7 @@
 #include "CommandLine/Output.h"
 
 #include <fmt/format.h>
+#include <stdio_ext.h>
 
 #include <cerrno>
 #include <cstring>
@@ -40,6 +41,7 @@ void Output::checkSystemError(bool succeeded) {
   if (succeeded) return;
   _failure = fmt::format("{}: {}", _name, std::strerror(errno));
   _readerIsGone = errno == EPIPE;
+  ::__fpurge(_file.get());  // what waits would only fail, or block, again
 }
 
 void complain(std::string_view message) {

@@ -5,6 +5,7 @@
 #include <unistd.h>
 
 #include <cerrno>
+#include <csignal>
 #include <cstdio>
 #include <cstring>
 #include <filesystem>
@@ -36,6 +37,24 @@ Result<void> writeAsItIs(const std::string& path, std::string_view contents) {
   return {};
 }
 
+/// Holds back, until the new file is in its place or gone, the signals that end the process: none
+/// of them leaves half a file behind.
+class SignalsHeldBack {
+ public:
+  SignalsHeldBack() noexcept {
+    sigset_t ending;
+    ::sigemptyset(&ending);
+    for (const int number : {SIGINT, SIGTERM, SIGHUP, SIGQUIT}) ::sigaddset(&ending, number);
+    ::pthread_sigmask(SIG_BLOCK, &ending, &_before);
+  }
+  ~SignalsHeldBack() { ::pthread_sigmask(SIG_SETMASK, &_before, nullptr); }
+  SignalsHeldBack(const SignalsHeldBack&) = delete;
+  SignalsHeldBack& operator=(const SignalsHeldBack&) = delete;
+
+ private:
+  sigset_t _before{};
+};
+
 /// Writes a file that does not exist yet, with the mode of the earlier one if there is one; false,
 /// with errno, when the system does not take it all.
 bool writeNew(const std::string& path, std::string_view contents, const fs::file_status& earlier) {
@@ -57,6 +76,7 @@ Result<void> replaceFile(const std::string& path, std::string_view contents) {
   if (fs::exists(earlier) && !fs::is_regular_file(earlier)) return writeAsItIs(path, contents);
   // A link goes on leading to the file.
   const std::string target = fs::exists(earlier) ? fs::canonical(path, error).string() : path;
+  const SignalsHeldBack held;
   const std::string part = fmt::format("{}.{}.part", target, ::getpid());
   if (writeNew(part, contents, earlier) && std::rename(part.c_str(), target.c_str()) == 0)
     return {};

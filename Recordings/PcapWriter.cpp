@@ -4,6 +4,7 @@
 
 #include <fmt/format.h>
 #include <pcap/pcap.h>
+#include <stdio_ext.h>
 
 #include <algorithm>
 #include <cerrno>
@@ -87,6 +88,7 @@ Result<void> PcapWriter::write(Moment time, ByteView message) {
   // The dump itself reports nothing.
   if (pcap_dump_flush(dumper) != 0 || std::ferror(pcap_dump_file(dumper)) != 0) {
     _error = writeError(_path);
+    ::__fpurge(pcap_dump_file(dumper));  // what waits would only fail, or block, again
     return tl::unexpected(*_error);
   }
   return {};

@@ -3,6 +3,7 @@
 #pragma once
 
 #include <optional>
+#include <string>
 
 namespace kestro {
 
@@ -10,5 +11,24 @@ namespace kestro {
 /// False when the parent has ended already: `parent` is the process that it should be, where that
 /// is known.
 [[nodiscard]] bool endWithParent(std::optional<int> parent);
+
+/// What the temporary port directory of a demo is called, with something behind it.
+inline constexpr const char* kDemoDirectoryPrefix = "kestro-demo-";
+
+/// Removes the directory of a demo when this is destroyed and the process that made it is gone, so
+/// could not do so itself.
+class OrphanedDirectory {
+ public:
+  /// `parent` made the directory; an empty path, or one that is not named as a demo's, is left
+  /// alone.
+  OrphanedDirectory(std::string path, std::optional<int> parent);
+  ~OrphanedDirectory();
+  OrphanedDirectory(const OrphanedDirectory&) = delete;
+  OrphanedDirectory& operator=(const OrphanedDirectory&) = delete;
+
+ private:
+  std::string _path;
+  std::optional<int> _parent;
+};
 
 }  // namespace kestro

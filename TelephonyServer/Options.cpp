@@ -97,6 +97,10 @@ CommandRow serverProgram(const Bundle& bundle, ServerArguments& arguments) {
                              .target = &arguments.parent,
                              .impliedValue = "",
                              .isHidden = true});
+  program.options.push_back({.name = "--demo-directory",
+                             .value = "PATH",
+                             .target = &arguments.options.demoDirectory,
+                             .isHidden = true});
   return program;
 }
 

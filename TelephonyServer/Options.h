@@ -25,6 +25,8 @@ struct ServerOptions {
   /// The process that started it, where it was said: should another one be the parent by now, that
   /// process has ended already.
   std::optional<int> parent;
+  /// The temporary port directory that goes when that process is gone; empty: none.
+  std::string demoDirectory;
 };
 
 /// What stands on the command line, before it is understood.

@@ -48,6 +48,7 @@ int runServer(int argumentCount, const char* const* arguments) {
   const auto parsed = parseServerOptions(*createBundle(), argumentCount, arguments);
   if (const auto* text = std::get_if<OptionsText>(&parsed)) return tell(*text);
   const auto& options = std::get<ServerOptions>(parsed);
+  const OrphanedDirectory directory(options.demoDirectory, options.parent);
   if (options.exitsWithParent && !endWithParent(options.parent)) return 0;
   allowDescriptors(Server::kMaximumDescriptors);
   giveBackLargeBlocks();

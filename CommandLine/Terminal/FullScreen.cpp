@@ -7,7 +7,7 @@
 #include <termios.h>
 #include <unistd.h>
 
-#include <cerrno>
+#include <csignal>
 #include <cstdlib>
 #include <string>
 #include <string_view>
@@ -34,7 +34,8 @@ SavedTerminal savedTerminal;
 void writeAll(std::string_view text) noexcept {
   while (!text.empty()) {
     const ssize_t written = ::write(STDOUT_FILENO, text.data(), text.size());
-    if (written < 0 && errno != EINTR) return;
+    // Also when it was interrupted: the process is asked to end while its terminal takes nothing.
+    if (written < 0) return;
     if (written > 0) text.remove_prefix(static_cast<std::size_t>(written));
   }
 }
@@ -49,6 +50,13 @@ void silenceKeys() {
   silent.c_cc[VSUSP] = _POSIX_VDISABLE;
   silent.c_cc[VQUIT] = _POSIX_VDISABLE;
   static_cast<void>(::tcsetattr(STDIN_FILENO, TCSANOW, &silent));
+}
+
+/// SIGQUIT ends the process as usual, with the terminal as it was.
+extern "C" void restoreAndQuit(int number) {
+  FullScreen::restore();
+  std::signal(number, SIG_DFL);
+  std::raise(number);
 }
 
 bool isSameFile(int left, int right) {
@@ -84,6 +92,7 @@ FullScreen::FullScreen() : _colour(!hasEnvironment("NO_COLOR")) {
   silenceKeys();
   silenceStandardError();
   savedTerminal.isTaken = true;
+  std::signal(SIGQUIT, restoreAndQuit);
   writeAll(kEnter);
 }
 
@@ -121,6 +130,7 @@ void FullScreen::restore() noexcept {
     ::close(savedTerminal.standardError);
   }
   savedTerminal = SavedTerminal();
+  std::signal(SIGQUIT, SIG_DFL);
 }
 
 }  // namespace kestro

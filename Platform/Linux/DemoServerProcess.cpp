@@ -138,7 +138,8 @@ class DemoServerProcess final : public DemoServer {
 Result<void> DemoServerProcess::start(const std::string& source) {
   const std::string program = serverProgram();
   std::vector<std::string> arguments{program, "--source=" + source,
-                                     fmt::format("--exit-with-parent={}", ::getpid())};
+                                     fmt::format("--exit-with-parent={}", ::getpid()),
+                                     "--demo-directory=" + _directory};
   std::vector<std::string> environment = environmentWithPortDirectory(_directory);
   const SpawnSettings settings(logPath());
   const int error =

@@ -14,13 +14,19 @@ namespace {
 
 /// Where the signal handler writes the number of the signal; -1 while nobody reads.
 std::atomic<int> pipeForHandler = -1;
-static_assert(std::atomic<int>::is_always_lock_free, "a signal handler reads it");
+/// What ends blocked calls when the process is asked to end; null while nobody reads.
+std::atomic<BlockedCalls*> callsForHandler = nullptr;
+static_assert(std::atomic<int>::is_always_lock_free &&
+                  std::atomic<BlockedCalls*>::is_always_lock_free,
+              "a signal handler reads them");
 
 extern "C" void forwardSignal(int number) {
   const int savedErrno = errno;
   const auto byte = static_cast<unsigned char>(number);
   // A full pipe holds unread signals already; losing one more changes nothing.
   [[maybe_unused]] const ssize_t written = ::write(pipeForHandler.load(), &byte, 1);
+  BlockedCalls* calls = callsForHandler.load();
+  if (number != SIGWINCH && calls != nullptr) calls->begin();
   errno = savedErrno;
 }
 
@@ -34,6 +40,7 @@ ProcessSignals::ProcessSignals() {
   _readEnd.reset(ends[0]);
   _writeEnd.reset(ends[1]);
   pipeForHandler = _writeEnd.get();
+  callsForHandler = &_blockedCalls;
   _notifier = std::make_unique<QSocketNotifier>(_readEnd.get(), QSocketNotifier::Read);
   QObject::connect(_notifier.get(), &QSocketNotifier::activated, _notifier.get(),
                    [this] { drain(); });
@@ -41,6 +48,7 @@ ProcessSignals::ProcessSignals() {
 
 ProcessSignals::~ProcessSignals() {
   while (!_earlier.empty()) releaseSignal(_earlier.begin()->first);
+  callsForHandler = nullptr;
   pipeForHandler = -1;
 }
 

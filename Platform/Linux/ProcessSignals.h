@@ -9,6 +9,7 @@
 #include <map>
 #include <memory>
 
+#include "Platform/Linux/BlockedCalls.h"
 #include "Platform/Linux/FileDescriptor.h"
 
 namespace kestro {
@@ -24,7 +25,8 @@ class ProcessSignals {
   ProcessSignals& operator=(const ProcessSignals&) = delete;
 
   /// Runs `handler` on the main thread after SIGINT, SIGTERM or SIGHUP. An empty one gives the
-  /// signals back their effect.
+  /// signals back their effect. A system call that blocks the main thread then fails with EINTR, so
+  /// that the handler's turn comes, and goes on failing so until this is destroyed.
   void setTerminationHandler(std::function<void()> handler);
   /// Runs `handler` on the main thread after SIGWINCH.
   void setResizeHandler(std::function<void()> handler);
@@ -35,6 +37,7 @@ class ProcessSignals {
   void releaseSignal(int number);
   void drain();
 
+  BlockedCalls _blockedCalls;
   FileDescriptor _readEnd;
   FileDescriptor _writeEnd;
   std::unique_ptr<QSocketNotifier> _notifier;

@@ -55,6 +55,15 @@ class LiveTest : public ::testing::Test {
     return std::make_unique<Process>(arguments, options(terminal));
   }
 
+  /// What lies beside the source, as a process that has ended should leave it.
+  [[nodiscard]] std::vector<std::string> filesBesideTheSource() const {
+    std::vector<std::string> result;
+    for (const auto& entry : std::filesystem::directory_iterator(source.directory())) {
+      if (entry.path() != source.path()) result.push_back(entry.path());
+    }
+    return result;
+  }
+
   TemporaryFile source{"source.pcap"};
   std::unique_ptr<Process> server;
 };

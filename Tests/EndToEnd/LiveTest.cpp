@@ -16,6 +16,7 @@ namespace {
 
 using ::testing::Contains;
 using ::testing::HasSubstr;
+using ::testing::IsEmpty;
 using ::testing::IsSupersetOf;
 using ::testing::MatchesRegex;
 using ::testing::Not;
@@ -143,9 +144,7 @@ TEST_F(LiveTest, TheDemoNeedsNoServerAndLeavesNothing) {
   EXPECT_EQ(watch->wait(), 0);
   ASSERT_THAT(watch->outputLines(), SizeIs(1));
   EXPECT_THAT(watch->outputLines()[0], HasSubstr("\"Serving Cell Measurements\""));
-  for (const auto& entry : std::filesystem::directory_iterator(source.directory())) {
-    EXPECT_EQ(entry.path(), source.path());
-  }
+  EXPECT_THAT(filesBesideTheSource(), IsEmpty());
 }
 
 TEST_F(LiveTest, TheDemoIsConnectedToAtTheFirstAttempt) {
@@ -170,6 +169,7 @@ TEST_F(LiveTest, TheDemosServerEndsWithAKilledWatch) {
   watch->signal(SIGKILL);
   watch->wait();
   EXPECT_TRUE(eventually([&] { return !isRunning(children[0]); }));
+  EXPECT_TRUE(eventually([&] { return filesBesideTheSource().empty(); }));
 }
 
 }  // namespace
