@@ -1,6 +1,9 @@
 // SPDX-License-Identifier: MIT
 #include <gtest/gtest.h>
+#include <sys/wait.h>
+#include <unistd.h>
 
+#include <csignal>
 #include <filesystem>
 #include <fstream>
 #include <iterator>
@@ -28,6 +31,20 @@ class ReplaceFileTest : public ::testing::Test {
 
   TemporaryFile file{"file"};
 };
+
+// Whether the new file is in its place already or not: there is one file, and it is whole.
+TEST_F(ReplaceFileTest, ASignalInTheMiddleLeavesNoPartBehind) {
+  write(file.path(), "the earlier one");
+  const std::string contents(64U << 20U, 'x');
+  const pid_t child = ::fork();
+  if (child == 0) ::_exit(replaceFile(file.path(), contents) ? 0 : 1);
+  while (filesInDirectory() == 1 && fs::file_size(file.path()) < contents.size()) {
+  }
+  ::kill(child, SIGTERM);
+  ::waitpid(child, nullptr, 0);
+  EXPECT_EQ(filesInDirectory(), 1U);
+  EXPECT_EQ(fs::file_size(file.path()), contents.size());
+}
 
 TEST_F(ReplaceFileTest, WritesAFileThatWasNotThere) {
   ASSERT_TRUE(replaceFile(file.path(), "new"));

@@ -63,6 +63,13 @@ TEST_F(TerminalTest, SignalsLeaveTheTerminalClean) {
   }
 }
 
+TEST_F(TerminalTest, TheQuitSignalLeavesTheTerminalClean) {
+  watchUntilDisplay();
+  watch->signal(SIGQUIT);
+  EXPECT_EQ(watch->wait(), -SIGQUIT);
+  EXPECT_THAT(watch->output(), EndsWith(kLeave));
+}
+
 TEST_F(TerminalTest, AFailureLeavesTheTerminalBeforeItIsNamed) {
   startGarbageServer();
   watch = start({"kestro-cli", "watch"}, Process::Terminal::Own);
