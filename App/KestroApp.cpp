@@ -176,7 +176,9 @@ void KestroApp::updateViewControllerFromModel() {
 }
 
 void KestroApp::reloadPanes() {
-  paneAt(kRoot).reloadWithNode(_model->topLevelNodes());
+  NodePointer root = _model->topLevelNodes();
+  if (!root) return;  // the channel's technology has no generator: the last display stays
+  paneAt(kRoot).reloadWithNode(std::move(root));
   for (std::size_t i = kRoot + 1; i < _navController->viewControllers().size(); ++i) {
     NodePointer node = _model->nodeAtPath(paneAt(i).path());
     if (!node) {

@@ -77,7 +77,7 @@ class KestroApp : public QApplication, private PaneHost {
   /// Shows "Connecting..." in the pane's toolbar, or the update message while connected.
   void updateStatusForViewController(KestroPaneController& pane);
   /// Shows the model's present tree in all panes. The first one whose path is gone is popped, with
-  /// all above it.
+  /// all above it. Without a tree the panes stay as they are.
   void updateViewControllerFromModel();
   /// Brings the status of a pane up to date before it comes on top.
   void navigationControllerWillShowViewController(ViewController& pane, bool animated);

@@ -56,6 +56,7 @@ void KestroModel::setGenerator(std::string_view technology) {
   if (technology != _technology) {
     // A display of another technology would be neither shown right nor ever updated again.
     for (const std::string_view key : _stateKeysOfTechnology) _state.remove(key);
+    _updated = false;  // what no tick has seen yet is gone with it
   }
   _technology = technology;
   const auto keys = _logGenerator->stateKeys();

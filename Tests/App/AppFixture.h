@@ -61,7 +61,12 @@ class AppFixture : public ModelFixture {
     ASSERT_TRUE(QTest::qWaitFor([] { return !stack().isMoving(); }));
   }
 
-  static std::vector<std::string> rows() { return rowsOf(table()); }
+  static std::vector<std::string> rows() { return kestro::testing::rowsOf(table()); }
+  /// The rows of the pane with this place on the stack.
+  static std::vector<std::string> rowsOf(std::size_t index) {
+    const auto& pane = static_cast<KestroPaneController&>(*stack().viewControllers()[index]);
+    return kestro::testing::rowsOf(pane.tableView());
+  }
   static std::string status() { return statusOf(stack().toolbar()); }
   static bool isLoading() { return isLoadingShown(stack().toolbar()); }
   static std::string title() { return stack().navigationBar().title().toStdString(); }

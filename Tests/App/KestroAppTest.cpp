@@ -208,6 +208,25 @@ TEST_F(KestroAppTest, AfterReconnectingTheOldUpdateShowsUntilNewData) {
   EXPECT_FALSE(isLoading());
 }
 
+TEST_F(KestroAppTest, TheLastDisplayStaysWhileNoGeneratorFitsTheChannel) {
+  launchConnected();
+  show(display("-70"));
+  open(0);
+  sendLog(display("-71"));  // no tick has seen it when the channel changes
+  answerTechnology("Semaphore");
+  channel->invalidate();
+  openChannel();
+  queue().advance(2s);
+  EXPECT_EQ(depth(), 2);
+  EXPECT_THAT(rows(), ElementsAre("RSCP = -70", "Band = 1"));
+  EXPECT_EQ(status(), "Connecting...");
+  answerTechnology("IFX");
+  queue().advance(5s);
+  show(display("-72"));
+  EXPECT_THAT(rows(), ElementsAre("RSCP = -72", "Band = 1"));
+  EXPECT_THAT(rowsOf(0), ElementsAre("Serving >", "Cells >"));
+}
+
 TEST_F(KestroAppTest, AQueuedRedrawAfterTheExitTouchesNothing) {
   launchConnected();
   sendLog(display("-70"));

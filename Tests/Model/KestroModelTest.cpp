@@ -537,6 +537,15 @@ TEST_F(TechnologyChangeTest, RemembersTheTechnologyAcrossOneWithoutAGenerator) {
   EXPECT_THAT(shown(), ElementsAre("DisplayState", "Display", "ExtraInfo", "History", "Running"));
 }
 
+TEST_F(KestroModelTest, AsksForNoRedrawOfDataThatWentWithItsTechnology) {
+  model->restartMonitor();
+  sendLog(Dictionary{{"A", "1"}});
+  answerTechnology("LTE");
+  model->restartMonitor();
+  queue().advance(2s);
+  EXPECT_EQ(redraws, 0);
+}
+
 TEST_F(KestroModelTest, ShowsALeafWhileTheGeneratorHasNoDisplay) {
   model->restartMonitor();
   const NodePointer root = model->topLevelNodes();
