@@ -115,7 +115,7 @@ void KestroApp::restartMonitor() {
 
 void KestroApp::applicationWillTerminate() {
   if (!_platform) return;
-  if (std::exchange(_unsetRSSI, false)) _setGSMRSSI(false);
+  restoreRSSI();
   _updateMessage.clear();
   _saveViewController = nullptr;
   _navController = nullptr;
@@ -133,6 +133,10 @@ void KestroApp::getRSSIPref() {
   if (shown.value_or(false)) return;
   _unsetRSSI = true;
   _setGSMRSSI(true);
+}
+
+void KestroApp::restoreRSSI() {
+  if (_platform && std::exchange(_unsetRSSI, false)) _setGSMRSSI(false);
 }
 
 void KestroApp::getSaveButtonPref() {

@@ -58,6 +58,10 @@ class KestroApp : public QApplication, private PaneHost {
   /// event loop ends; a second call does nothing.
   void applicationWillTerminate();
 
+  /// Has the shell show the signal strength as before, if launching has changed that; for who ends
+  /// the process. A second call does nothing.
+  void restoreRSSI();
+
   /// Connects, or connects anew, in a later turn of the main queue.
   void restartMonitor();
 

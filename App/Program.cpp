@@ -113,6 +113,7 @@ class Run {
     complain(line);
     _platform->systemLog().write(LogPriority::Error, line);
     if (!_app.saveHistory("Unexpected end")) complain("the history could not be saved");
+    _app.restoreRSSI();
     if (_demo != nullptr) _demo->removeDirectory();
     _platform->flushSystemLog();
   }

@@ -370,6 +370,17 @@ TEST_F(KestroAppTest, TheAlertTakesTheKeysUntilItIsClosed) {
   EXPECT_EQ(QApplication::focusWidget(), &table());
 }
 
+TEST_F(KestroAppTest, TheShellIsPutBackOnceWhoeverDoesIt) {
+  app().restoreRSSI();  // there is nothing yet
+  launch();
+  app().restoreRSSI();
+  const auto& events = platform.preferences().events();
+  ASSERT_EQ(events.size(), 6);
+  EXPECT_EQ(events[3], "set org.lumo.Shell LumoShowGSMRSSI false");
+  app().applicationWillTerminate();
+  EXPECT_EQ(events.size(), 6);
+}
+
 TEST_F(KestroAppTest, TheHistoryIsSavedWithoutAsking) {
   launchConnected();
   show(display("-70"));  // at 13:00:03

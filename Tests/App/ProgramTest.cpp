@@ -169,6 +169,14 @@ TEST_F(ProgramTest, AFailureThatNothingCatchesIsNamedAndTheHistorySaved) {
   EXPECT_THAT(saved, HasSubstr("<key>DisplayState</key>"));
 }
 
+TEST_F(ProgramTest, AFailureThatNothingCatchesPutsTheShellBack) {
+  const auto kestro = startKestro({"--demo=capture:" + writeEndingCapture()});
+  ASSERT_TRUE(
+      eventually([&] { return shellPreferences().find("RSSI=true") != std::string::npos; }));
+  EXPECT_EQ(kestro->wait(), -SIGABRT);
+  EXPECT_THAT(shellPreferences(), HasSubstr("LumoShowGSMRSSI=false"));
+}
+
 TEST_F(ProgramTest, LastWordsThatNobodyTakesDoNotHoldUpTheEnd) {
   // Standard error is a pipe that is full.
   const std::string pipe = folder("pipe");
