@@ -122,6 +122,8 @@ void NavigationController::bringIn(ViewController& earlier, bool isForward, bool
   setFocusProxy(&top);
   top.show();
   (isForward ? top : earlier).raise();
+  if (!_sheet) top.setFocus();
+  earlier.setEnabled(false);
   if (duration == 0) return finishSlide();
   placeScreens(0);
   _slide.setDuration(duration);
@@ -143,12 +145,12 @@ void NavigationController::finishSlide() {
   _slide.stop();
   if (!_earlier) return;
   _earlier->hide();
+  _earlier->setEnabled(true);
   _earlier = nullptr;
   topViewController().move(0, 0);
   _bar->setTransition(1);
   // A popped screen may be the one whose handler asked for this.
   for (auto& screen : std::exchange(_leaving, {})) screen.release()->deleteLater();
-  if (!_sheet) topViewController().setFocus();
 }
 
 bool NavigationController::isMoving() const {

@@ -16,7 +16,8 @@
 
 namespace kestro {
 
-/// The stack owns its screens; one that was popped lives until it has slid out. Backspace, Escape,
+/// The stack owns its screens; one that was popped lives until it has slid out. While screens
+/// slide, keys go to the one that comes, and the one that leaves is disabled. Backspace, Escape,
 /// the system's "back" keys and mouse button, and the bar's button pop the top screen. The shortcut
 /// of a toolbar button presses it.
 class NavigationController : public QWidget {

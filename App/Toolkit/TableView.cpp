@@ -144,6 +144,7 @@ void TableView::resizeEvent(QResizeEvent* event) {
 void TableView::changeEvent(QEvent* event) {
   QAbstractScrollArea::changeEvent(event);
   if (event->type() == QEvent::FontChange && _source.cellForRow) reloadData();
+  if (event->type() == QEvent::EnabledChange && !isEnabled()) cancelPress();
 }
 
 void TableView::paintEvent(QPaintEvent*) {
@@ -316,6 +317,12 @@ void TableView::releaseAt(const QPointF& position) {
   if (movement == Movement::Pressed && row >= 0 && row == rowAt(position.toPoint())) select(row);
 }
 
+void TableView::cancelPress() {
+  QScroller::scroller(viewport())->stop();
+  _movement = Movement::None;
+  press(-1);
+}
+
 void TableView::mousePressEvent(QMouseEvent* event) {
   event->setAccepted(event->button() == Qt::LeftButton);
   if (event->isAccepted()) pressAt(event->position());
@@ -332,13 +339,12 @@ bool TableView::viewportEvent(QEvent* event) {
     case QEvent::TouchBegin:
     case QEvent::TouchUpdate:
     case QEvent::TouchEnd:
-      touch(static_cast<QTouchEvent&>(*event));
+      // Touches come to a table that is disabled all the same.
+      if (isEnabled()) touch(static_cast<QTouchEvent&>(*event));
       event->accept();
       return true;
     case QEvent::TouchCancel:  // the system takes the touch away: there are no points
-      QScroller::scroller(viewport())->stop();
-      _movement = Movement::Elsewhere;
-      releaseAt(_lastPosition);
+      cancelPress();
       event->accept();
       return true;
     default:

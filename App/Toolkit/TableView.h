@@ -99,6 +99,7 @@ class TableView : public QAbstractScrollArea {
   void pressAt(const QPointF& position);
   void moveTo(const QPointF& position);
   void releaseAt(const QPointF& position);
+  void cancelPress();
   void touch(const QTouchEvent& event);
   void pan(const QPointF& position);
   void announceFocus() const;

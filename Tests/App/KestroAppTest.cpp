@@ -274,6 +274,76 @@ TEST_F(KestroAppTest, TheSessionsEndIsTheExit) {
   EXPECT_EQ(platform.preferences().events().size(), 6);
 }
 
+// --- Slides --------------------------------------------------------------------------------------
+
+TEST_F(KestroAppTest, ASecondTapOnARowOpensNothingMore) {
+  launchConnected();
+  show(display("-70"));
+  QWidget* viewport = table().viewport();
+  const QPoint place = table().cellAtRow(0)->geometry().center();
+  QTest::mouseClick(viewport, Qt::LeftButton, {}, place);
+  ASSERT_TRUE(stack().isMoving());
+  QTest::mouseClick(viewport, Qt::LeftButton, {}, place);
+  QTest::mouseDClick(viewport, Qt::LeftButton, {}, place);
+  EXPECT_EQ(depth(), 2);
+  EXPECT_TRUE(stack().isMoving());
+}
+
+TEST_F(KestroAppTest, ATapOnAPaneThatIsPoppedOpensNothing) {
+  launchConnected();
+  show(display("-70"));
+  open(1);
+  QWidget* viewport = table().viewport();
+  const QPoint place = table().cellAtRow(0)->geometry().center();
+  QTest::keyClick(&table(), Qt::Key_Backspace);
+  ASSERT_TRUE(stack().isMoving());
+  QTest::mouseClick(viewport, Qt::LeftButton, {}, place);
+  EXPECT_EQ(depth(), 1);
+}
+
+TEST_F(KestroAppTest, APressThatASlideOvertakesOpensNothing) {
+  launchConnected();
+  show(display("-70"));
+  QWidget* viewport = table().viewport();
+  const QPoint place = table().cellAtRow(1)->geometry().center();
+  QTest::mousePress(viewport, Qt::LeftButton, {}, place);
+  table().setFocusedRow(0);
+  QTest::keyClick(&table(), Qt::Key_Return);
+  QTest::mouseRelease(viewport, Qt::LeftButton, {}, place);
+  EXPECT_EQ(title(), "Serving");
+  settle();
+  QTest::mouseRelease(viewport, Qt::LeftButton, {}, place);
+  EXPECT_EQ(depth(), 2);
+}
+
+TEST_F(KestroAppTest, APaneThatSlidOutTakesTapsWhenItIsBack) {
+  launchConnected();
+  show(display("-70"));
+  open(0);
+  QTest::keyClick(&table(), Qt::Key_Backspace);
+  settle();
+  QTest::mouseClick(table().viewport(), Qt::LeftButton, {},
+                    table().cellAtRow(1)->geometry().center());
+  EXPECT_EQ(title(), "Cells");
+}
+
+TEST_F(KestroAppTest, KeysDuringASlideGoToThePaneThatComes) {
+  launchConnected();
+  ASSERT_TRUE(QTest::qWaitForWindowActive(app().window()));
+  show(display("-70"));
+  table().setFocusedRow(1);
+  QTest::keyClick(&table(), Qt::Key_Return);
+  ASSERT_TRUE(stack().isMoving());
+  EXPECT_EQ(QApplication::focusWidget(), &table());
+  const auto press = [](Qt::Key key) { QTest::keyClick(app().window()->windowHandle(), key); };
+  press(Qt::Key_Down);
+  press(Qt::Key_Return);
+  EXPECT_EQ(top().path(), "/Cells/0");
+  ASSERT_TRUE(stack().isMoving());
+  press(Qt::Key_Backspace);
+  EXPECT_EQ(top().path(), "/Cells");
+}
+
 // --- Marks ---------------------------------------------------------------------------------------
 
 bool isMarked(int row, const TableView& table) { return table.cellAtRow(row)->isMarkedChanged(); }

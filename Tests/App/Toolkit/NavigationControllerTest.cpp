@@ -108,6 +108,26 @@ TEST_F(NavigationControllerTest, AMovementThatOvertakesAnotherEndsItFirst) {
   EXPECT_TRUE(stack.topViewController().isVisible());
 }
 
+TEST_F(NavigationControllerTest, AScreenThatLeavesIsDisabledUntilItHasLeft) {
+  stack.pushViewController(screen("A"), true);
+  QWidget& root = *stack.viewControllers()[0];
+  EXPECT_FALSE(root.isEnabled());
+  EXPECT_TRUE(stack.topViewController().isEnabled());
+  EXPECT_TRUE(QTest::qWaitFor([&] { return !stack.isMoving(); }));
+  EXPECT_TRUE(root.isEnabled());
+  const QPointer<QWidget> popped = &stack.topViewController();
+  stack.popViewController(true);
+  EXPECT_FALSE(popped->isEnabled());
+  EXPECT_TRUE(root.isEnabled());
+}
+
+TEST_F(NavigationControllerTest, AFocusThatWasMovedDuringASlideStays) {
+  stack.pushViewController(screen("A"), true);
+  stack.navigationBar().backButton().setFocus();
+  EXPECT_TRUE(QTest::qWaitFor([&] { return !stack.isMoving(); }));
+  EXPECT_EQ(stack.focusWidget(), &stack.navigationBar().backButton());
+}
+
 TEST_F(NavigationControllerTest, BackspaceEscapeAndTheButtonGoBack) {
   for (const Qt::Key key : {Qt::Key_Backspace, Qt::Key_Escape}) {
     push("A");

@@ -222,6 +222,27 @@ TEST_F(TableViewTest, ATouchThatTheSystemTakesAwaySelectsNothing) {
   EXPECT_THAT(selected, IsEmpty());
 }
 
+TEST_F(TableViewTest, ATableThatIsDisabledTakesNoTouch) {
+  const std::unique_ptr<QPointingDevice> device(QTest::createTouchDevice());
+  const QPoint place = table.viewport()->mapTo(&table, middleOf(3));
+  table.setEnabled(false);
+  QTest::touchEvent(&table, device.get()).press(0, place, &table);
+  QTest::touchEvent(&table, device.get()).release(0, place, &table);
+  EXPECT_THAT(selected, IsEmpty());
+}
+
+TEST_F(TableViewTest, ADisabledTableForgetsThatARowIsPressed) {
+  const std::unique_ptr<QPointingDevice> device(QTest::createTouchDevice());
+  const QPoint place = table.viewport()->mapTo(&table, middleOf(3));
+  QTest::touchEvent(&table, device.get()).press(0, place, &table);
+  ASSERT_TRUE(cell(3).isPressed());
+  table.setEnabled(false);
+  EXPECT_FALSE(cell(3).isPressed());
+  table.setEnabled(true);
+  QTest::touchEvent(&table, device.get()).release(0, place, &table);
+  EXPECT_THAT(selected, IsEmpty());
+}
+
 TEST_F(TableViewTest, AFingerThatStopsCoastingRowsSelectsNone) {
   const std::unique_ptr<QPointingDevice> device(QTest::createTouchDevice());
   QTest::touchEvent(&table, device.get()).press(0, QPoint(200, 400), &table);
