@@ -19,7 +19,7 @@ KINDS = (
     ("text", r"fmt/.*"),
     ("results", r"tl/expected\.hpp"),
     ("unicode", r"utf8proc\.h"),
-    ("files", r"fstream|filesystem|iostream|cstdio|stdio\.h"),
+    ("files", r"fstream|filesystem|iostream|cstdio|stdio(_ext)?\.h"),
     ("posix", r"(sys/)?[a-z]+\.h|csignal"),
     ("standard", r"[a-z_]+"),
 )
