@@ -2,13 +2,14 @@
 #include "LogGenerator/ArrayLock.h"
 
 #include <list>
-#include <mutex>
+
+#include "LogGenerator/DeepMutex.h"
 
 namespace kestro {
 namespace {
 
-constinit std::recursive_mutex firstMutex;
-constinit std::recursive_mutex* currentMutex = &firstMutex;
+constinit DeepMutex firstMutex;
+constinit DeepMutex* currentMutex = &firstMutex;
 constinit std::uint8_t currentNesting = 0;
 
 }  // namespace
@@ -16,7 +17,7 @@ constinit std::uint8_t currentNesting = 0;
 void ArrayLock::initialize() {
   // Replaced mutexes stay: destroying one that a thread holds is not allowed, and by the nesting
   // rule the main thread usually holds it.
-  static std::list<std::recursive_mutex> mutexes;
+  static std::list<DeepMutex> mutexes;
   currentMutex = &mutexes.emplace_back();
   currentNesting = 0;
 }

@@ -9,8 +9,8 @@ namespace kestro {
 /// Never instantiated. Every `lockArray` acquires the recursive mutex once more and raises an 8-bit
 /// nesting counter; `unlockArray` lowers the counter, and only the call that brings it back to 0
 /// releases the mutex, exactly once. So after nested use the thread keeps the mutex for the extra
-/// levels: decoding and display building share the one main thread, which it never blocks. 256
-/// nested acquisitions wrap the counter to 0.
+/// levels: decoding and display building share the one main thread, which it never blocks. However
+/// many levels pile up, the mutex counts them. 256 nested acquisitions wrap the counter to 0.
 class ArrayLock {
  public:
   ArrayLock() = delete;

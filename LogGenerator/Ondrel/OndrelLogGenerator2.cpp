@@ -192,7 +192,7 @@ void OndrelLogGenerator2::printDict(const Value& object) const {
     for (const auto& [key, value] : object.dictionary()) printDict(value);
   } else if (object.isArray()) {
     for (const Value& element : object.array()) printDict(element);
-  } else if (!object.isText()) {
+  } else if (!object.isText() && !object.isNull()) {
     services().systemLog.write(LogPriority::Error, "Received an object of unknown type");
   }
 }

@@ -41,7 +41,8 @@ class OndrelLogGenerator2 : public OndrelLogGenerator {
   /// decoder.
   [[nodiscard]] Value processTemplate(const Value& templateObject);
 
-  /// Walks a display and reports what is neither text, dictionary nor array.
+  /// Walks a display and reports what is neither text, dictionary nor array. Nothing is said of a
+  /// null, which stands where `processTemplate` has reported an object.
   void printDict(const Value& object) const;
 
  protected:

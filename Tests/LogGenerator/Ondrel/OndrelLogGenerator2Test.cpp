@@ -13,6 +13,7 @@
 namespace kestro {
 namespace {
 
+using ::testing::Contains;
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 using ::testing::SizeIs;
@@ -300,6 +301,14 @@ TEST_F(OndrelLogGenerator2Test, ReportsObjectsOfUnknownTypeInTheTemplate) {
   EXPECT_THAT(takeLines(),
               ElementsAre(Line{LogPriority::Error, "Received an object of unknown type"},
                           Line{LogPriority::Warning, "Processing the template"}));
+}
+
+TEST_F(OndrelLogGenerator2Test, ReportsEachUnknownObjectOnceWhenTheDisplayIsBuilt) {
+  setTemplate(Dictionary{{"Title", Value::integer(1)}, {"List", Array{"a", Value::real(0.5)}}});
+  takeLines();
+  generator->generateLogUsingState(state);
+  EXPECT_THAT(takeLines(),
+              Contains(Line{LogPriority::Error, "Received an object of unknown type"}).Times(2));
 }
 
 TEST_F(OndrelLogGenerator2Test, ProcessesArraysElementByElement) {
