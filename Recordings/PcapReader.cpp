@@ -5,7 +5,6 @@
 #include <fmt/format.h>
 #include <pcap/pcap.h>
 
-#include <algorithm>
 #include <filesystem>
 #include <utility>
 
@@ -24,12 +23,19 @@ struct PcapReader::Handle {
 
 namespace {
 
-Moment momentOf(const timeval& time) {
-  // A damaged record can hold any number of seconds; the end of the year 9999 is the latest time
-  // that stays representable in every text and difference made of it.
-  constexpr std::int64_t kLatestSecond = 253'402'300'799;
-  const auto seconds = std::clamp<std::int64_t>(time.tv_sec, 0, kLatestSecond);
-  return Moment(std::chrono::seconds(seconds) + std::chrono::microseconds(time.tv_usec));
+/// When the record was received, or why its time can be none. A capture's seconds are unsigned and
+/// reach to 2106; the library hands over those of files in this machine's byte order as signed.
+Result<Moment> momentOf(const timeval& time) {
+  constexpr std::int64_t kSecondsEnd = std::int64_t{1} << 32;
+  constexpr std::int64_t kMicrosecondsEnd = 1'000'000;
+  const std::int64_t written = time.tv_sec;
+  const std::int64_t seconds = written < 0 ? written + kSecondsEnd : written;
+  if (seconds < 0 || seconds >= kSecondsEnd) return failure("a time beyond the year 2106");
+  const std::int64_t microseconds = time.tv_usec;
+  if (microseconds < 0 || microseconds >= kMicrosecondsEnd) {
+    return failure("a time of more than 999999 microseconds");
+  }
+  return Moment(std::chrono::seconds(seconds) + std::chrono::microseconds(microseconds));
 }
 
 bool isEmptyFile(const std::string& path) {
@@ -75,17 +81,20 @@ Result<std::optional<RecordedMessage>> PcapReader::next() {
   const unsigned char* bytes = nullptr;
   const int outcome = pcap_next_ex(_handle->pcap, &header, &bytes);
   if (outcome == PCAP_ERROR_BREAK) return std::nullopt;
-  if (outcome != 1) {
-    _error = Error{
-        fmt::format("{}: record {}: {}", _path, _messageCount + 1, pcap_geterr(_handle->pcap))};
-    return tl::unexpected(*_error);
-  }
-  RecordedMessage message{.time = momentOf(header->ts),
+  if (outcome != 1) return damaged(pcap_geterr(_handle->pcap));
+  const Result<Moment> time = momentOf(header->ts);
+  if (!time) return damaged(time.error().message);
+  RecordedMessage message{.time = *time,
                           .bytes = {bytes, header->caplen},
                           .number = ++_messageCount,
                           .originalLength = header->len};
   if (message.isCut()) ++_cutMessageCount;
   return message;
+}
+
+tl::unexpected<Error> PcapReader::damaged(std::string_view reason) {
+  _error = Error{fmt::format("{}: record {}: {}", _path, _messageCount + 1, reason)};
+  return tl::unexpected(*_error);
 }
 
 }  // namespace kestro

@@ -43,7 +43,8 @@ class PcapReader {
 
   /// The next message, or nothing at the end of the capture. A capture that is cut or damaged
   /// yields every whole record before the damage, then an error that names the record; after an
-  /// error every call yields the same error.
+  /// error every call yields the same error. Damage is also a time that no capture can hold: beyond
+  /// the year 2106, or of more than 999,999 microseconds.
   [[nodiscard]] Result<std::optional<RecordedMessage>> next();
 
   /// How many messages `next` has yielded so far, and how many of them the recorder had cut.
@@ -53,6 +54,9 @@ class PcapReader {
  private:
   struct Handle;
   PcapReader(std::string path, std::unique_ptr<Handle> handle, std::string_view technology);
+
+  /// The error of the record after the last one, from now on.
+  [[nodiscard]] tl::unexpected<Error> damaged(std::string_view reason);
 
   std::string _path;
   std::unique_ptr<Handle> _handle;

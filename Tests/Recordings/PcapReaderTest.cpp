@@ -154,6 +154,48 @@ TEST_F(PcapReaderTest, AnImpossibleRecordLengthEndsTheReadingForGood) {
   EXPECT_EQ(again.error().message, first.error().message);
 }
 
+TEST_F(PcapReaderTest, SecondsAreUnsignedUpTo2106) {
+  // 2038-01-19 03:14:08, the first second beyond 31 bits, and 2106-02-07 06:28:15.999999, the last.
+  const Bytes records = {0,    0,    0,    0x80, 0,    0,    0,    0, 1, 0, 0, 0, 1, 0, 0, 0, 'a',
+                         0xFF, 0xFF, 0xFF, 0xFF, 0x3F, 0x42, 0x0F, 0, 1, 0, 0, 0, 1, 0, 0, 0, 'b'};
+  auto reader = open(joined({captureHeader(147), records}));
+  ASSERT_TRUE(reader.has_value());
+  for (const Moment expected :
+       {Moment(std::chrono::seconds(2'147'483'648)), Moment(microseconds(4'294'967'295'999'999))}) {
+    const auto message = reader->next();
+    ASSERT_TRUE(message.has_value() && message->has_value());
+    EXPECT_EQ((*message)->time, expected);
+  }
+}
+
+TEST_F(PcapReaderTest, SecondsAreUnsignedInTheOtherByteOrderToo) {
+  const Bytes file = {0xA1, 0xB2, 0xC3, 0xD4, 0, 2, 0, 4, 0, 0, 0, 0, 0, 0, 0, 0, 0, 4, 0, 0,  0,
+                      0,    0,    147,  0x80, 0, 0, 0, 0, 0, 0, 7, 0, 0, 0, 1, 0, 0, 0, 1, 'x'};
+  auto reader = open(file);
+  ASSERT_TRUE(reader.has_value()) << reader.error().message;
+  const auto message = reader->next();
+  ASSERT_TRUE(message.has_value() && message->has_value());
+  EXPECT_EQ((*message)->time, Moment(microseconds(2'147'483'648'000'007)));
+}
+
+TEST_F(PcapReaderTest, AMillionMicrosecondsAreDamageOfTheirRecord) {
+  // 1,000,000 µs, and 4,294,967,295 µs, which the library hands over as -1.
+  for (const Bytes& field : {Bytes{0x40, 0x42, 0x0F, 0}, Bytes{0xFF, 0xFF, 0xFF, 0xFF}}) {
+    const Bytes lengths = {1, 0, 0, 0, 1, 0, 0, 0, 'x'};
+    auto reader = open(
+        joined({captureHeader(147), twoRecords(), {1, 0, 0, 0}, field, lengths, twoRecords()}));
+    ASSERT_TRUE(reader.has_value());
+    for (int i = 0; i < 2; ++i) EXPECT_TRUE(reader->next().has_value());
+    for (int i = 0; i < 2; ++i) {
+      const auto third = reader->next();
+      ASSERT_FALSE(third.has_value());
+      EXPECT_EQ(third.error().message, _directory.pathOf("a.pcap") +
+                                           ": record 3: a time of more than 999999 microseconds");
+    }
+    EXPECT_EQ(reader->messageCount(), 2U);
+  }
+}
+
 TEST_F(PcapReaderTest, AMessageThatTheRecorderCutIsCounted) {
   const Bytes record = {1, 0, 0, 0, 0, 0, 0, 0, 2, 0, 0, 0, 9, 0, 0, 0, 'a', 'b'};
   auto reader = open(joined({captureHeader(147), record}));
