@@ -81,12 +81,16 @@ std::unique_ptr<LogGenerator> LogGenerator::generatorFromTechnology(
 }
 
 void LogGenerator::updateHistoryInState(Dictionary& state, const Clock& clock) {
+  appendToHistory(state, makeHistoryEntry(state, clock));
+}
+
+void LogGenerator::appendToHistory(Dictionary& state, const Dictionary& entry) {
   if (!state[kStateHistory].isArray()) state.set(kStateHistory, Array());
   Array history = state[kStateHistory].array();
   if (history.size() >= kMaximumHistoryEntries) {
     history.removeFirst(history.size() - (kMaximumHistoryEntries - 1));
   }
-  history.append(makeHistoryEntry(state, clock));
+  history.append(entry);
 }
 
 Array LogGenerator::historyOfState(const Dictionary& state) {

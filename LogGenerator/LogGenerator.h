@@ -28,6 +28,10 @@ inline constexpr std::string_view kHistoryDescription = "Description";
 /// The most entries that a history keeps.
 inline constexpr std::size_t kMaximumHistoryEntries = 5;
 
+/// The most that a history entry keeps of what it was made of, in bytes, so that a fast or hostile
+/// server does not grow the memory without end: of its packets, or of all its texts.
+inline constexpr std::size_t kMaximumEntryBytes = std::size_t{16} * 1024 * 1024;
+
 /// Turns the messages of one log channel into a display.
 ///
 /// The generator state is one dictionary, owned by the model and handed to every operation; it
@@ -43,7 +47,8 @@ class LogGenerator {
   /// Applies one message, borrowed for the call, to the state. A message that ends the application
   /// throws: InternalConsistencyFailure (IFX; the state is as it was), ArrayOutOfBoundsException or
   /// UnknownDataException (packets; sections may be half written, and the packet is not collected).
-  /// Packets are collected until the next `generateLogUsingState`.
+  /// Packets are collected until the next `generateLogUsingState`: the first 16 MiB of them. Those
+  /// beyond are decoded only.
   virtual void updateStateWithData(Dictionary& state, ByteView data) = 0;
 
   /// Returns the display object, or null when there is none yet, after recording a history entry.
@@ -90,6 +95,9 @@ class LogGenerator {
   void init();
 
   [[nodiscard]] const GeneratorServices& services() const noexcept { return _services; }
+
+  /// Appends an entry to the state's history as `updateHistoryInState` does.
+  static void appendToHistory(Dictionary& state, const Dictionary& entry);
 
   /// A new array with the entries of the state's history, the entries themselves shared; empty when
   /// there is no history.

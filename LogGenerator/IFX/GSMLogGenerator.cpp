@@ -5,6 +5,7 @@
 
 #include "LogGenerator/InternalConsistencyFailure.h"
 #include "Platform/PropertyListCoding.h"
+#include "Platform/SystemLog.h"
 #include "Platform/TelephonyProtocol.h"
 
 namespace kestro {
@@ -37,6 +38,16 @@ Array processArray(const Array& array) {
   return result;
 }
 
+/// The bytes of all texts and keys in an object.
+std::size_t textBytes(const Value& object) {
+  std::size_t bytes = object.text().size();
+  for (const Value& element : object.array()) bytes += textBytes(element);
+  for (const auto& [key, value] : object.dictionary()) {
+    bytes += key.text().size() + textBytes(value);
+  }
+  return bytes;
+}
+
 }  // namespace
 
 std::unique_ptr<GSMLogGenerator> GSMLogGenerator::generator(const GeneratorServices& services) {
@@ -59,7 +70,14 @@ void GSMLogGenerator::updateStateWithData(Dictionary& state, ByteView data) {
 }
 
 Value GSMLogGenerator::generateLogUsingState(Dictionary& state) {
-  updateHistoryInState(state, services().clock);
+  const std::size_t text = textBytes(state[kStateDisplayState]) + textBytes(state[kStateDisplay]);
+  if (text > kMaximumEntryBytes) {
+    services().systemLog.log(
+        LogPriority::Error, "History: an entry beyond 16 MiB of text is not kept ({} bytes)", text);
+    appendToHistory(state, Dictionary());
+  } else {
+    updateHistoryInState(state, services().clock);
+  }
   return state[kStateDisplay];
 }
 

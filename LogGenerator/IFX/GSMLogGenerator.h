@@ -17,6 +17,8 @@ class GSMLogGenerator : public LogGenerator {
   explicit GSMLogGenerator(const GeneratorServices& services);
 
   void updateStateWithData(Dictionary& state, ByteView data) override;
+  /// Records the history and returns the display. Of a message and display of more than 16 MiB of
+  /// texts the history's entry keeps nothing, and a line says so.
   Value generateLogUsingState(Dictionary& state) override;
   [[nodiscard]] Dictionary getStartCommand() const override;
   [[nodiscard]] Array getSaveContentsFromState(const Dictionary& state) override;

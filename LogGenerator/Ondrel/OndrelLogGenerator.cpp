@@ -3,6 +3,7 @@
 
 #include <fmt/format.h>
 
+#include <algorithm>
 #include <utility>
 
 #include "LogGenerator/Ondrel/VersionReport.h"
@@ -38,7 +39,25 @@ ByteView exportedPart(ByteView collected) noexcept {
   return collected.size() < kSmallestExportedBuffer ? ByteView() : collected.subspan(1);
 }
 
+void OndrelLogGenerator::collect(ByteView packet) {
+  const std::size_t size = _binData.size() + packet.size();
+  if (_packetsNotKept != 0 || size > kMaximumEntryBytes) {
+    ++_packetsNotKept;
+    return;
+  }
+  if (size > _binData.capacity()) {
+    // Grows as a vector does, but to no more than may be needed: the history keeps the room, too.
+    _binData.reserve(std::min(std::max(size, 2 * _binData.capacity()), kMaximumEntryBytes));
+  }
+  _binData.insert(_binData.end(), packet.begin(), packet.end());
+}
+
 void OndrelLogGenerator::handOverCollected(Dictionary& state) {
+  if (_packetsNotKept != 0) {
+    services().systemLog.log(LogPriority::Error,
+                             "History: packets beyond 16 MiB are not kept ({} of this entry)",
+                             std::exchange(_packetsNotKept, 0));
+  }
   const std::size_t size = _binData.size();
   state.set(kStateDisplayState, Value::data(std::exchange(_binData, {})));
   _binData.reserve(size);  // the next refresh brings about as much

@@ -2,6 +2,7 @@
 // The base of the generators whose channels deliver raw baseband packets.
 #pragma once
 
+#include <cstdint>
 #include <optional>
 
 #include "LogGenerator/LogGenerator.h"
@@ -29,15 +30,19 @@ class OndrelLogGenerator : public LogGenerator {
   explicit OndrelLogGenerator(const GeneratorServices& services) noexcept
       : LogGenerator(services) {}
 
-  void collect(ByteView packet) { _binData.insert(_binData.end(), packet.begin(), packet.end()); }
+  /// Keeps a packet for the history's next entry, which holds 16 MiB of them. From the first that
+  /// does not fit they are only counted, so that none is missing between two that are kept.
+  void collect(ByteView packet);
 
-  /// Stores what was collected in the state under "DisplayState" and begins anew.
+  /// Stores what was collected in the state under "DisplayState" and begins anew. A line says how
+  /// many packets were not kept.
   void handOverCollected(Dictionary& state);
 
  private:
   [[nodiscard]] std::optional<Bytes> versionReport();
 
   Bytes _binData;
+  std::uint64_t _packetsNotKept = 0;  ///< since the last entry
 };
 
 }  // namespace kestro

@@ -341,5 +341,16 @@ TEST_F(C2KTemplateTest, EveryGroupIsOrdered) {
   isOrdered(isOrdered, generator->getDisplayFromState(state).dictionary());
 }
 
+TEST_F(C2KLogGeneratorTest, DecodesWhatTheHistoryDoesNotKeep) {
+  setTemplate(Dictionary{{"FER", "kTrafficFER"}});
+  Bytes large = frame(0).bytes();
+  large.resize(kMaximumEntryBytes);
+  receive(large);
+  const Value before = state[kStateTrafficFER];
+  receive(frame(1));
+  EXPECT_NE(state[kStateTrafficFER], before);
+  EXPECT_EQ(collected(), large);
+}
+
 }  // namespace
 }  // namespace kestro::testing

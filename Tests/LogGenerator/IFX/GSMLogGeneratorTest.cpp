@@ -11,6 +11,8 @@
 namespace kestro {
 namespace {
 
+using ::testing::ElementsAre;
+
 class GSMLogGeneratorTest : public ::testing::Test {
  protected:
   void receive(const Value& message) {
@@ -161,6 +163,34 @@ TEST_F(GSMLogGeneratorTest, SavesAnArrayOfItsOwn) {
   Array saved = generator->getSaveContentsFromState(state);
   saved.clear();
   EXPECT_EQ(generator->getSaveContentsFromState(state).size(), 1U);
+}
+
+TEST_F(GSMLogGeneratorTest, AnEntryKeepsSixteenMebibytesOfTexts) {
+  // The key and the text stand in the message and in the display.
+  receive(Dictionary{{"A", std::string(kMaximumEntryBytes / 2 - 1, 'x')}});
+  static_cast<void>(generator->generateLogUsingState(state));
+  EXPECT_FALSE(state["History"].array()[0].dictionary().empty());
+}
+
+TEST_F(GSMLogGeneratorTest, OfMoreTextAnEntryKeepsNothingAndSaysSo) {
+  receive(Dictionary{{"A", "1"}});
+  static_cast<void>(generator->generateLogUsingState(state));
+  static_cast<void>(platform.systemLog().take());
+  const Value large = Dictionary{{"A", Array{"", std::string(kMaximumEntryBytes / 2, 'x')}}};
+  receive(large);
+  EXPECT_EQ(generator->generateLogUsingState(state), state["Display"]);
+  receive(Dictionary{{"A", "2"}});
+  static_cast<void>(generator->generateLogUsingState(state));
+
+  const Array history = state["History"].array();
+  ASSERT_EQ(history.size(), 3U);
+  EXPECT_EQ(history[0].dictionary()["Display"], Value(Dictionary{{"A", "1"}}));
+  EXPECT_TRUE(history[1].dictionary().empty());
+  EXPECT_EQ(history[2].dictionary()["Display"], Value(Dictionary{{"A", "2"}}));
+  EXPECT_THAT(platform.systemLog().take(),
+              ElementsAre(RecordingSystemLog::Line{
+                  LogPriority::Error,
+                  "History: an entry beyond 16 MiB of text is not kept (16777218 bytes)"}));
 }
 
 }  // namespace

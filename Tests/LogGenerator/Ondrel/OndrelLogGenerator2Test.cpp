@@ -303,6 +303,15 @@ TEST_F(OndrelLogGenerator2Test, ReportsObjectsOfUnknownTypeInTheTemplate) {
                           Line{LogPriority::Warning, "Processing the template"}));
 }
 
+TEST_F(OndrelLogGenerator2Test, DecodesWhatTheHistoryDoesNotKeep) {
+  const Bytes large(kMaximumEntryBytes, 1);
+  receive(large);
+  receive(levelPacket({7}));
+  EXPECT_EQ(level(), Value("7"));
+  generator->generateLogUsingState(state);
+  EXPECT_EQ(state["DisplayState"], Value::data(large));
+}
+
 TEST_F(OndrelLogGenerator2Test, ReportsEachUnknownObjectOnceWhenTheDisplayIsBuilt) {
   setTemplate(Dictionary{{"Title", Value::integer(1)}, {"List", Array{"a", Value::real(0.5)}}});
   takeLines();

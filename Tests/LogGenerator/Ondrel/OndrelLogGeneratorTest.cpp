@@ -13,6 +13,7 @@ namespace kestro {
 namespace {
 
 using ::testing::ElementsAre;
+using ::testing::IsEmpty;
 using ::testing::Optional;
 using ::testing::SizeIs;
 
@@ -145,6 +146,40 @@ TEST_F(OndrelLogGeneratorTest, HandsItsPacketsOverOnce) {
   EXPECT_EQ(state["DisplayState"], Value::data({1, 2, 3}));
   generator.generateLogUsingState(state);
   EXPECT_EQ(state["DisplayState"], Value::data({}));
+}
+
+// --- The most that an entry keeps
+
+constexpr std::size_t kMebibyte = std::size_t{1024} * 1024;
+
+TEST_F(OndrelLogGeneratorTest, AnEntryKeepsSixteenMebibytesOfPackets) {
+  generator.updateStateWithData(state, Bytes(10 * kMebibyte, 1));
+  generator.updateStateWithData(state, Bytes(6 * kMebibyte, 2));
+  generator.generateLogUsingState(state);
+  EXPECT_THAT(state["DisplayState"].bytes(), SizeIs(16 * kMebibyte));
+  EXPECT_THAT(platform.systemLog().lines(), IsEmpty());
+}
+
+TEST_F(OndrelLogGeneratorTest, WhatComesAfterAPacketThatDoesNotFitIsNotKeptEither) {
+  generator.updateStateWithData(state, Bytes(10 * kMebibyte, 1));
+  generator.updateStateWithData(state, Bytes(6 * kMebibyte + 1, 2));
+  generator.updateStateWithData(state, Bytes{3});
+  generator.generateLogUsingState(state);
+  EXPECT_EQ(state["DisplayState"], Value::data(Bytes(10 * kMebibyte, 1)));
+}
+
+TEST_F(OndrelLogGeneratorTest, EachEntrySaysOnceHowManyPacketsItDoesNotKeep) {
+  for (const unsigned extra : {3U, 1U, 0U}) {
+    generator.updateStateWithData(state, Bytes(16 * kMebibyte, 1));
+    for (unsigned i = 0; i < extra; ++i) generator.updateStateWithData(state, Bytes{2});
+    generator.generateLogUsingState(state);
+  }
+  const auto line = [](std::string_view count) {
+    return RecordingSystemLog::Line{
+        LogPriority::Error,
+        "History: packets beyond 16 MiB are not kept (" + std::string(count) + " of this entry)"};
+  };
+  EXPECT_THAT(platform.systemLog().lines(), ElementsAre(line("3"), line("1")));
 }
 
 }  // namespace
