@@ -6,8 +6,8 @@
 #include <algorithm>
 #include <iterator>
 
-#include "CommandLine/Formats/LayoutText.h"
 #include "CommandLine/Formats/DisplayText.h"
+#include "CommandLine/Formats/LayoutText.h"
 #include "CommandLine/Formats/TimeText.h"
 #include "Platform/PropertyListDescription.h"
 
