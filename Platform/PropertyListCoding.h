@@ -37,14 +37,17 @@ class PropertyListCoding {
 
   /// Parses XML or binary, told apart by the bytes. The order of dictionary entries is the order in
   /// the list; of entries with one key the last counts. The error says what is wrong and, where
-  /// known, at which byte. Binary dates are read to 10 µs. Texts that are not UTF-8 or hold a NUL
-  /// are refused, and so are XML dictionaries of more than 9,999 keys.
+  /// known, at which byte. XML is read in UTF-8, UTF-16 and ISO-8859-1, and with a bare value
+  /// behind its declaration. Binary dates are read to 10 µs, before 1933 and after 2068 to the
+  /// second. Texts of bytes that their encoding does not have, or with a NUL, are refused, and so
+  /// are dates outside the years 1 to 9999. The limit of bytes holds for a list as it comes and in
+  /// UTF-8.
   [[nodiscard]] virtual Result<Value> parse(
       ByteView bytes, const PropertyListLimits& limits = PropertyListLimits::message()) const = 0;
 
   /// The XML form, version 1.0, without a DOCTYPE line. Absent when `value` cannot be serialised:
   /// it is null, or holds a null value, a dictionary key that is no text, a text that is not UTF-8
-  /// or holds a NUL, a date outside 1933 to 2068, or containers more than 128 levels deep.
+  /// or holds a NUL, a date outside the years 1 to 9999, or containers more than 128 levels deep.
   [[nodiscard]] virtual std::optional<Bytes> xml(const Value& value) const = 0;
 
   /// The binary form; absent in the same cases.

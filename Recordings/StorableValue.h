@@ -17,7 +17,7 @@ namespace kestro {
 /// keys become storable texts; dictionary entries that a display leaves out (a null value, a key
 /// that is no text) are left out; any other null, and containers more than 128 levels deep, become
 /// the text "(unknown)", as a display shows them. Two keys that become the same are told apart by
-/// another U+FFFD. Dates must lie between 1933 and 2068, as those in a message do.
+/// another U+FFFD. Dates must be of the years 1 to 9999, as those in a message are.
 [[nodiscard]] Value storableValue(const Value& value);
 
 }  // namespace kestro

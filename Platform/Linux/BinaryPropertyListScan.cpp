@@ -244,7 +244,8 @@ class BinaryScan {
     if (object.count != 3) return failKind(object);
     if (!holds(object, sizeof(double))) return false;
     const double seconds = std::bit_cast<double>(number(object.content, sizeof(double)));
-    return isPropertyListDate(seconds) || fail("a date outside 1933 to 2068", object.at);
+    _facts.hasFarDates |= !isLibraryDate(seconds);
+    return isPropertyListDate(seconds) || fail("a date outside the years 1 to 9999", object.at);
   }
 
   bool checkAscii(const Object& object) {

@@ -3,6 +3,8 @@
 
 #include <fmt/format.h>
 
+#include <bit>
+#include <cmath>
 #include <cstdint>
 #include <cstdlib>
 #include <string>
@@ -10,7 +12,9 @@
 #include <utility>
 #include <vector>
 
+#include "Platform/Bytes.h"
 #include "Platform/Linux/PropertyListDates.h"
+#include "Platform/Linux/XmlPropertyListEdits.h"
 #include "Platform/PropertyListCoding.h"
 #include "Platform/Utf8.h"
 
@@ -90,13 +94,32 @@ class Reader {
 
   // The library gives the fraction without its sign, cut to whole microseconds of a double that
   // need not reach the one that was written. Ten microseconds come back as they went.
-  [[nodiscard]] static Value date(plist_t node) {
+  [[nodiscard]] Value date(plist_t node) const {
+    if (_facts.hasFarDates) {
+      const double sinceEpoch = writtenSeconds(node);
+      if (!isLibraryDate(sinceEpoch)) {
+        return Value::date(kPropertyListEpoch +
+                           std::chrono::seconds(static_cast<std::int64_t>(std::floor(sinceEpoch))));
+      }
+    }
     std::int32_t seconds = 0;
     std::int32_t fraction = 0;
     plist_get_date_val(node, &seconds, &fraction);
     const std::int32_t rounded = (fraction + 5) / 10 * 10;
     const std::chrono::microseconds microseconds(seconds < 0 ? -rounded : rounded);
     return Value::date(kPropertyListEpoch + std::chrono::seconds(seconds) + microseconds);
+  }
+
+  /// The library hands 32 bits of a date's seconds over, but its binary form has them all: the
+  /// signature, the object's first byte, and the seconds.
+  [[nodiscard]] static double writtenSeconds(plist_t node) {
+    constexpr std::size_t kSecondsAt = 9;
+    char* binary = nullptr;
+    std::uint32_t length = 0;
+    plist_to_bin(node, &binary, &length);
+    const AllocatedText owner(binary);
+    const ByteView bytes(reinterpret_cast<const std::uint8_t*>(binary), length);
+    return std::bit_cast<double>(loadBigEndian<std::uint64_t>(bytes, kSecondsAt));
   }
 
   [[nodiscard]] static Value data(plist_t node) {
@@ -120,9 +143,15 @@ class Reader {
   }
 
   struct Entry {
-    AllocatedText key;
+    AllocatedText written;
+    std::string_view key;
     Value value;
   };
+
+  /// A key as the list had it before it was edited.
+  [[nodiscard]] std::string_view keyOf(const AllocatedText& written) const {
+    return std::string_view(written.get()).substr(_facts.hasManyKeys ? kKeyBeginning : 0);
+  }
 
   [[nodiscard]] std::vector<Entry> entriesOf(plist_t node) {
     std::vector<Entry> entries;
@@ -136,14 +165,15 @@ class Reader {
       plist_dict_next_item(node, state, &key, &content);
       AllocatedText owner(key);
       if (content == nullptr) return entries;
-      entries.push_back({std::move(owner), value(content)});
+      const std::string_view text = keyOf(owner);
+      entries.push_back({std::move(owner), text, value(content)});
     }
   }
 
   [[nodiscard]] bool haveEarlierKeys(const std::vector<Entry>& entries) const {
     std::size_t same = 0;
     for (const auto& [key, value] : _earlierKeys) {
-      if (same == entries.size() || key.text() != entries[same].key.get()) return false;
+      if (same == entries.size() || key.text() != entries[same].key) return false;
       ++same;
     }
     return same == entries.size();
@@ -154,7 +184,7 @@ class Reader {
     std::vector<Entry> entries = entriesOf(node);
     if (!haveEarlierKeys(entries)) {
       _earlierKeys = Dictionary();
-      for (const Entry& entry : entries) _earlierKeys.set(entry.key.get(), Value());
+      for (const Entry& entry : entries) _earlierKeys.set(entry.key, Value());
     }
     Dictionary result = _earlierKeys.copy();
     if (result.size() == entries.size()) {
@@ -162,7 +192,7 @@ class Reader {
         result.setValueAt(i, std::move(entries[i].value));
       }
     } else {  // of entries with one key the last counts
-      for (Entry& entry : entries) result.set(entry.key.get(), std::move(entry.value));
+      for (Entry& entry : entries) result.set(entry.key, std::move(entry.value));
     }
     return result;
   }
@@ -180,13 +210,17 @@ PlistNode textNode(std::string_view text) {
   return PlistNode(plist_new_string(std::string(text).c_str()));
 }
 
-/// The library's own function for integers takes large ones for negative; its parser does not.
-PlistNode largeIntegerNode(std::uint64_t number) {
-  const std::string xml =
-      fmt::format("<plist version=\"1.0\"><integer>{}</integer></plist>", number);
+/// A node that the library's parser makes and its own functions do not.
+PlistNode parsedNode(std::string_view element) {
+  const std::string xml = fmt::format("<plist version=\"1.0\">{}</plist>", element);
   plist_t node = nullptr;
   plist_from_xml(xml.data(), static_cast<std::uint32_t>(xml.size()), &node);
   return PlistNode(node);
+}
+
+/// The library's own function for integers takes large ones for negative.
+PlistNode largeIntegerNode(std::uint64_t number) {
+  return parsedNode(fmt::format("<integer>{}</integer>", number));
 }
 
 PlistNode integerNode(const Value& value) {
@@ -194,11 +228,24 @@ PlistNode integerNode(const Value& value) {
   return value.isAboveInt64() ? largeIntegerNode(bits) : PlistNode(plist_new_uint(bits));
 }
 
+/// The library's own function for dates takes 32 bits of seconds.
+PlistNode farDateNode(Moment moment) {
+  const auto days = std::chrono::floor<std::chrono::days>(moment);
+  const std::chrono::year_month_day day(days);
+  const std::chrono::hh_mm_ss time(std::chrono::floor<std::chrono::seconds>(moment - days));
+  return parsedNode(fmt::format("<date>{:04}-{:02}-{:02}T{:02}:{:02}:{:02}Z</date>",
+                                static_cast<int>(day.year()), static_cast<unsigned>(day.month()),
+                                static_cast<unsigned>(day.day()), time.hours().count(),
+                                time.minutes().count(), time.seconds().count()));
+}
+
 PlistNode dateNode(Moment moment) {
   const auto sinceEpoch = moment - kPropertyListEpoch;
   const auto seconds = std::chrono::floor<std::chrono::seconds>(sinceEpoch);
   const auto fraction = std::chrono::microseconds(sinceEpoch - seconds);
-  if (!isPropertyListDate(static_cast<double>(seconds.count()))) return nullptr;
+  const auto count = static_cast<double>(seconds.count());
+  if (!isPropertyListDate(count)) return nullptr;
+  if (!isLibraryDate(count)) return farDateNode(moment);
   return PlistNode(plist_new_date(static_cast<std::int32_t>(seconds.count()),
                                   static_cast<std::int32_t>(fraction.count())));
 }

@@ -31,11 +31,16 @@ std::optional<T> wholeNumber(std::string_view digits, Format... format) {
   return result;
 }
 
-/// An integer's amount without its sign. Other readers differ on leading zeros: octal or not.
+/// An integer's amount without its sign.
 std::optional<std::uint64_t> magnitude(std::string_view digits) {
   if (digits.starts_with("0x")) return wholeNumber<std::uint64_t>(digits.substr(2), 16);
-  if (digits.size() > 1 && digits.starts_with('0')) return std::nullopt;
   return wholeNumber<std::uint64_t>(digits, 10);
+}
+
+/// How many zeros stand in front of the first digit that counts, of a decimal number.
+std::size_t leadingZeros(std::string_view digits) {
+  if (digits.starts_with("0x")) return 0;
+  return std::min(digits.find_first_not_of('0'), digits.size() - 1);
 }
 
 LeafVerdict checkInteger(std::string_view content) {
@@ -47,7 +52,10 @@ LeafVerdict checkInteger(std::string_view content) {
   if (!amount || (isNegative && *amount > kLargest + 1)) {
     return {.problem = "an integer that is none or beyond 64 bits"};
   }
-  return {.problem = {}, .isLargeInteger = !isNegative && *amount > kLargest};
+  return {.problem = {},
+          .isLargeInteger = !isNegative && *amount > kLargest,
+          .zerosAt = static_cast<std::size_t>(digits.data() - content.data()),
+          .zeros = leadingZeros(digits)};
 }
 
 bool isReal(std::string_view content) {
@@ -75,7 +83,8 @@ std::optional<std::chrono::sys_seconds> dateOf(std::string_view content) {
   const unsigned hour = field(11, 2);
   const unsigned minute = field(14, 2);
   const unsigned second = field(17, 2);
-  if (!day.ok() || hour > 23 || minute > 59 || second > 59) return std::nullopt;
+  if (!day.ok() || day.year() < std::chrono::year(1) || hour > 23 || minute > 59 || second > 59)
+    return std::nullopt;
   return std::chrono::sys_days(day) + std::chrono::hours(hour) + std::chrono::minutes(minute) +
          std::chrono::seconds(second);
 }
@@ -84,8 +93,7 @@ LeafVerdict checkDate(std::string_view content) {
   const std::optional<std::chrono::sys_seconds> date = dateOf(content);
   if (!date) return {.problem = "a date that is none"};
   const std::chrono::duration<double> sinceEpoch = *date - kPropertyListEpoch;
-  if (!isPropertyListDate(sinceEpoch.count())) return {.problem = "a date outside 1933 to 2068"};
-  return {};
+  return {.problem = {}, .isFarDate = !isLibraryDate(sinceEpoch.count())};
 }
 
 enum class Base64 : std::uint8_t { No, Digit, Padding, Space };
@@ -138,17 +146,18 @@ bool isXmlEntity(std::string_view name) {
   return name == "lt" || name == "gt" || name == "amp" || name == "apos" || name == "quot";
 }
 
-bool isUtf8Declaration(std::string_view declaration) {
+std::optional<std::string> declaredEncoding(std::string_view declaration) {
   const std::size_t key = declaration.find("encoding");
-  if (key == std::string_view::npos) return true;
+  if (key == std::string_view::npos) return std::nullopt;
   const std::size_t quote = declaration.find_first_of("\"'", key);
-  if (quote == std::string_view::npos) return false;
+  if (quote == std::string_view::npos) return "";
   const std::string_view value = declaration.substr(quote + 1);
-  const std::string_view name = value.substr(0, value.find(declaration[quote]));
-  constexpr std::string_view kName = "utf-8";
-  return std::ranges::equal(name, kName, [](char left, char right) {
-    return (left >= 'A' && left <= 'Z' ? left - 'A' + 'a' : left) == right;
+  std::string name(value.substr(0, value.find(declaration[quote])));
+  std::ranges::transform(name, name.begin(), [](char character) {
+    return character >= 'A' && character <= 'Z' ? static_cast<char>(character - 'A' + 'a')
+                                                : character;
   });
+  return name;
 }
 
 }  // namespace kestro

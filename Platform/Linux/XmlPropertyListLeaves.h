@@ -2,6 +2,9 @@
 // What stands inside the XML elements of numbers, booleans, dates and data, and inside entities.
 #pragma once
 
+#include <cstddef>
+#include <optional>
+#include <string>
 #include <string_view>
 
 namespace kestro {
@@ -9,6 +12,11 @@ namespace kestro {
 struct LeafVerdict {
   std::string_view problem;     ///< empty when the element is in order; else lives for ever
   bool isLargeInteger = false;  ///< an integer above 2^63 - 1
+  bool isFarDate = false;       ///< a date that the library does not hand over
+  /// The leading zeros of an integer, where in the content they begin and how many; the library
+  /// would take it for octal.
+  std::size_t zerosAt = 0;
+  std::size_t zeros = 0;
 };
 
 /// Checks an element that is neither a container nor a text: its name ("integer", "true", …) and
@@ -19,7 +27,8 @@ struct LeafVerdict {
 /// Unicode character other than NUL.
 [[nodiscard]] bool isXmlEntity(std::string_view name);
 
-/// Whether an XML declaration ("<?xml …" without its end) names UTF-8 or no encoding.
-[[nodiscard]] bool isUtf8Declaration(std::string_view declaration);
+/// The encoding that an XML declaration ("<?xml …" without its end) names, in lower case; nothing
+/// when it names none.
+[[nodiscard]] std::optional<std::string> declaredEncoding(std::string_view declaration);
 
 }  // namespace kestro

@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <array>
 #include <string_view>
+#include <utility>
 #include <vector>
 
 #include "Platform/Linux/PropertyListScan.h"
@@ -21,11 +22,16 @@ constexpr bool isNameCharacter(char character) { return character >= 'a' && char
 
 constexpr bool isMarkup(char character) { return character == '<' || character == '&'; }
 
-/// The library moves the rest of a text once for each entity in it: so many bytes may be moved.
+/// The library moves the rest of a text once for each entity in it. When more bytes than these may
+/// have to be moved, texts are divided.
 constexpr std::size_t kEntityWork = std::size_t{512} * 1024 * 1024;
 
-/// The library compares a key with those before it, all of them when their hashes collide: so many
-/// comparisons may be needed, enough for a dictionary of 9,999 keys.
+/// A part of a divided text has so many entities at most, and so many bytes without one.
+constexpr std::size_t kEntitiesOfPart = 16;
+constexpr std::size_t kBytesOfPart = 1024;
+
+/// The library compares a key with those before it, all of them when their hashes collide. When
+/// more comparisons than these may be needed in all, keys get beginnings whose hashes do not.
 constexpr std::size_t kKeyWork = 50'000'000;
 
 struct Tag {
@@ -47,7 +53,11 @@ class XmlScan {
   XmlScan(std::string_view text, const PropertyListLimits& limits) : _text(text), _limits(limits) {}
 
   Result<PropertyListFacts> scan() {
-    if (checkText() && readProlog() && readValues() && readEnd()) return _facts;
+    if (checkText() && readProlog() && readValues() && readEnd()) {
+      _facts.hasManyKeys = _keyWork > kKeyWork;
+      _facts.needsEdits |= _facts.hasManyKeys || _entityWork > kEntityWork;
+      return std::move(_facts);
+    }
     return failure(fmt::format("XML property list: {} (byte {})", _problem, _problemAt));
   }
 
@@ -75,7 +85,9 @@ class XmlScan {
     if (rest().starts_with("<!DOCTYPE") && !(readDoctype() && skipSpacesAndComments())) {
       return false;
     }
-    return readPlistTag();
+    // A value may stand alone behind a declaration.
+    _isBare = _isDeclared && !rest().starts_with("<plist");
+    return _isBare || readPlistTag();
   }
 
   /// Moves past `end`, which closes what begins here, and sets `inside` to what lies between.
@@ -97,7 +109,9 @@ class XmlScan {
     const std::size_t start = _at;
     std::string_view declaration;
     if (!readUntil("?>", declaration)) return false;
-    return isUtf8Declaration(declaration) || fail("an encoding other than UTF-8", start);
+    _isDeclared = true;
+    return declaredEncoding(declaration).value_or("utf-8") == "utf-8" ||
+           fail("an encoding other than that of its bytes", start);
   }
 
   bool readDoctype() {
@@ -121,6 +135,10 @@ class XmlScan {
   }
 
   bool readEnd() {
+    if (_isBare) {
+      if (!skipSpacesAndComments()) return false;
+      return _at == _text.size() || fail("something after the value");
+    }
     Tag tag;
     if (!skipSpacesAndComments() || !readTag(tag)) return false;
     if (tag.name != "plist" || tag.form != Tag::Form::Close) {
@@ -211,16 +229,23 @@ class XmlScan {
         return fail("a dictionary whose keys and values do not alternate", tag.at);
       }
       dictionary.needsValue = !dictionary.needsValue;
-      if (tag.name == "key") return countKey(dictionary) && readText(tag);
+      if (tag.name == "key") return readKey(tag, dictionary);
     }
     if (tag.name == "dict" || tag.name == "array") return openContainer(tag);
     if (tag.name == "string") return readText(tag);
     return readLeaf(tag);
   }
 
-  bool countKey(OpenContainer& dictionary) {
+  bool readKey(const Tag& tag, OpenContainer& dictionary) {
     _keyWork += ++dictionary.keys;
-    return _keyWork <= kKeyWork || fail("dictionaries of too many keys");
+    edit(tag.form == Tag::Form::Empty ? tag.at : _at, _at, XmlEdit::Kind::Key);
+    return readText(tag);
+  }
+
+  void edit(std::size_t start, std::size_t end, XmlEdit::Kind kind) {
+    _facts.edits.push_back({.at = static_cast<std::uint32_t>(start),
+                            .length = static_cast<std::uint32_t>(end - start),
+                            .kind = kind});
   }
 
   bool openContainer(const Tag& tag) {
@@ -238,15 +263,36 @@ class XmlScan {
 
   bool readLeaf(const Tag& tag) {
     std::string_view content;
+    const std::size_t start = _at;
     if (tag.form == Tag::Form::Open) {
-      const std::size_t start = _at;
       _at = std::min(_text.find('<', _at), _text.size());
       content = _text.substr(start, _at - start);
       if (!readEndTagOf(tag)) return false;
     }
     const LeafVerdict verdict = checkXmlLeaf(tag.name, content);
     _facts.hasLargeIntegers |= verdict.isLargeInteger;
+    _facts.hasFarDates |= verdict.isFarDate;
+    if (verdict.zeros != 0) {
+      const std::size_t zeros = start + verdict.zerosAt;
+      edit(zeros, zeros + verdict.zeros, XmlEdit::Kind::Zeros);
+      _facts.needsEdits = true;
+    }
     return verdict.problem.empty() || fail(verdict.problem, tag.at);
+  }
+
+  /// What is read of a text since its beginning, or since it can last be divided.
+  struct TextPart {
+    std::size_t entities = 0;
+    std::size_t entitiesEnd = 0;  ///< behind the last of them
+  };
+
+  /// Lets the text be divided behind its last entity when the part is large enough.
+  void divideText(TextPart& part) {
+    const bool isLarge = part.entities == kEntitiesOfPart ||
+                         (part.entities != 0 && _at - part.entitiesEnd > kBytesOfPart);
+    if (!isLarge) return;
+    edit(part.entitiesEnd, part.entitiesEnd, XmlEdit::Kind::TextBreak);
+    part.entities = 0;
   }
 
   /// A text or a key: characters, entities and CDATA sections.
@@ -254,12 +300,17 @@ class XmlScan {
     if (tag.form == Tag::Form::Empty) return true;
     const std::size_t start = _at;
     std::size_t entities = 0;
+    TextPart part;
     while (_at < _text.size()) {
       skipWhile([](char character) { return !isMarkup(character); });
+      divideText(part);
       if (rest().starts_with('&')) {
         ++entities;
+        ++part.entities;
         if (!readEntity()) return false;
+        part.entitiesEnd = _at;
       } else if (rest().starts_with("<![CDATA[")) {
+        part.entities = 0;
         std::string_view section;
         if (!readUntil("]]>", section)) return false;
       } else {
@@ -267,7 +318,6 @@ class XmlScan {
       }
     }
     _entityWork += entities * (_at - start);
-    if (_entityWork > kEntityWork) return fail("too many entities in a text", start);
     return readEndTagOf(tag);
   }
 
@@ -284,6 +334,8 @@ class XmlScan {
   std::string_view _text;
   const PropertyListLimits& _limits;
   std::size_t _at = 0;
+  bool _isDeclared = false;
+  bool _isBare = false;  ///< without <plist> around the value
   std::vector<OpenContainer> _open;
   PropertyListFacts _facts;
   std::size_t _nodes = 0;

@@ -74,7 +74,7 @@ TEST_F(SnapshotFileTest, TheDeepestMessageIsWrittenAllTheSame) {
 
 TEST_F(SnapshotFileTest, ADateBeyondTheYearsOfAFileIsAFailure) {
   const auto file = snapshotFile(
-      *coding, {{"Data", Value::date(Moment(std::chrono::hours(1'000'000)))}});  // 2084
+      *coding, {{"Data", Value::date(Moment(std::chrono::hours(71'000'000)))}});  // 10069
   ASSERT_FALSE(file);
   EXPECT_EQ(file.error().message, "the snapshot cannot be serialised");
 }
@@ -123,6 +123,30 @@ TEST_F(SnapshotFileTest, ReadsWhatIsTooLargeForAMessage) {
     history.append(Dictionary{{"DisplayState", message}, {"Display", message}});
   }
   EXPECT_EQ(refusal(fileText({{"Timestamp", "t"}, {"Data", history}})), "(accepted)");
+}
+
+TEST_F(SnapshotFileTest, ReadsDisplaysOfManyKeys) {
+  Dictionary message;
+  for (int i = 0; i < 3'200; ++i) message.set("key " + std::to_string(i), "value");
+  Array history;
+  for (int i = 0; i < 5; ++i) {
+    history.append(Dictionary{{"DisplayState", message}, {"Display", message}});
+  }
+  const Dictionary snapshot{{"Timestamp", "t"}, {"Data", history}};
+  const auto read = parse(fileText(snapshot));
+  ASSERT_TRUE(read) << read.error().message;
+  EXPECT_EQ(Value(*read), Value(snapshot));
+}
+
+TEST_F(SnapshotFileTest, ReadsTheLargestMessageOfKeysAlone) {
+  Dictionary message;  // 200,000 nodes, as many as a message may have
+  for (int i = 0; i < 99'999; ++i) message.set("key " + std::to_string(i), "");
+  EXPECT_EQ(refusal(fileText({{"Timestamp", "t"}, {"Data", Array{message}}})), "(accepted)");
+}
+
+TEST_F(SnapshotFileTest, ReadsATextOfMarkupAlone) {
+  EXPECT_EQ(refusal(fileText({{"Timestamp", "t"}, {"Data", std::string(200'000, '&')}})),
+            "(accepted)");
 }
 
 TEST_F(SnapshotFileTest, FindsTheDlfLog) {

@@ -141,6 +141,20 @@ TEST_F(GSMLogGeneratorTest, RaisesAFailureNamingTheTypeOfAnUnknownObject) {
   EXPECT_TRUE(state.empty());
 }
 
+TEST_F(GSMLogGeneratorTest, ADateOfAnyYearIsAnUnknownObjectAndNoUnparsableMessage) {
+  using namespace std::chrono;
+  for (const year each : {1y, 1932y, 2070y, 9999y}) {
+    EXPECT_EQ(failureOf(Dictionary{{"A", Value::date(sys_days(each / January / 1))}}),
+              "Unknown object of type date encountered");
+  }
+}
+
+TEST_F(GSMLogGeneratorTest, ADroppedFirstElementMayBeADateOfAnyYear) {
+  using namespace std::chrono;
+  receive(Array{Value::date(sys_days(1900y / January / 1)), "shown"});
+  EXPECT_EQ(state["Display"], Value(Array{"shown"}));
+}
+
 TEST_F(GSMLogGeneratorTest, RecordsTheHistoryWithEachDisplay) {
   receive(Dictionary{{"A", "1"}});
   EXPECT_EQ(generator->generateLogUsingState(state), Value(Dictionary{{"A", "1"}}));

@@ -68,6 +68,16 @@ struct BinaryList {
   return bytesOf(result);
 }
 
+/// An ASCII text in UTF-16, least significant byte first, behind its byte-order mark.
+[[nodiscard]] inline Bytes utf16(std::string_view text) {
+  Bytes result = {0xFF, 0xFE};
+  for (const char character : text) {
+    result.push_back(static_cast<std::uint8_t>(character));
+    result.push_back(0);
+  }
+  return result;
+}
+
 /// `text`, `count` times.
 [[nodiscard]] inline std::string repeated(std::string_view text, std::size_t count) {
   std::string result;

@@ -246,6 +246,63 @@ TEST_F(PropertyListCodingTest, ReadsXmlDates) {
   EXPECT_EQ(parsedXml("<date>2012-03-04T13:05:09Z</date>"), Value::date(sampleMoment()));
 }
 
+TEST_F(PropertyListCodingTest, DatesOfTheYearsOneTo9999SurviveBothForms) {
+  using namespace std::chrono;
+  expectRoundTrips(Array{Value::date(sys_days(1y / January / 1)),
+                         Value::date(sys_days(999y / December / 31) + 23h + 59min + 59s),
+                         Value::date(sampleMoment()), "<date>1-2",
+                         Value::date(sys_days(1932y / December / 13)),
+                         Value::date(sys_days(2069y / January / 20)),
+                         Value::date(sys_days(9999y / December / 31) + 23h + 59min + 59s)});
+}
+
+TEST_F(PropertyListCodingTest, ReadsDatesOfTheYearsOneTo9999) {
+  using namespace std::chrono;
+  const Value first = Value::date(sys_days(1y / January / 1));
+  const Value last = Value::date(sys_days(9999y / December / 31) + 23h + 59min + 59s);
+  EXPECT_EQ(parsedXml("<date>0001-01-01T00:00:00Z</date>"), first);
+  EXPECT_EQ(parsedXml("<date>9999-12-31T23:59:59Z</date>"), last);
+  // -63,113,904,000 s and 252,423,993,599 s after 2001-01-01
+  EXPECT_EQ(parsedObject(bytesOf("\x33\xC2\x2D\x63\xC3\x7F\0\0\0")), first);
+  EXPECT_EQ(parsedObject(bytesOf("\x33\x42\x4D\x62\xD2\x3C\x7F\x80\0")), last);
+}
+
+TEST_F(PropertyListCodingTest, LeadingZerosDoNotMakeAnIntegerOctal) {
+  EXPECT_EQ(parsedXml("<array><integer>007</integer><integer>-0012</integer><integer>\n+010\t"
+                      "</integer><integer>000</integer><integer>-0</integer><string>007</string>"
+                      "<integer>0x0010</integer><integer>018446744073709551615</integer></array>"),
+            Value(Array{Value::integer(7), Value::integer(-12), Value::integer(10),
+                        Value::integer(0), Value::integer(0), "007", Value::integer(16),
+                        Value::unsignedInteger(kUint64Maximum)}));
+}
+
+TEST_F(PropertyListCodingTest, ReadsXmlInUtf16) {
+  const std::string list = "<plist><string>x</string></plist>";
+  Bytes bigEndianOne = {0xFE, 0xFF};
+  for (const char character : "<plist><string>" + std::string("\x01") + "</string></plist>") {
+    bigEndianOne.push_back(character == '\x01' ? 0x4E : 0);  // U+4E2D
+    bigEndianOne.push_back(static_cast<std::uint8_t>(character == '\x01' ? 0x2D : character));
+  }
+  EXPECT_EQ(parsed(utf16(list)), Value("x"));
+  EXPECT_EQ(parsed(utf16("<?xml version='1.0' encoding='utf-16'?>" + list)), Value("x"));
+  EXPECT_EQ(parsed(bigEndianOne), Value("\xE4\xB8\xAD"));
+  // Without the mark the first character tells the order.
+  EXPECT_EQ(parsed(Bytes(bigEndianOne.begin() + 2, bigEndianOne.end())), Value("\xE4\xB8\xAD"));
+}
+
+TEST_F(PropertyListCodingTest, ReadsXmlInIso8859_1) {
+  EXPECT_EQ(parsed(bytesOf("<?xml version=\"1.0\" encoding=\"ISO-8859-1\"?>\n"
+                           "<plist><string>caf\xE9 \x80</string></plist>")),
+            Value("caf\xC3\xA9 \xC2\x80"));
+}
+
+TEST_F(PropertyListCodingTest, ReadsABareValueBehindAnXmlDeclaration) {
+  EXPECT_EQ(parsed(bytesOf("<?xml version=\"1.0\"?>\n<dict><key>a</key><string>b</string></dict>\n"
+                           "<!-- end -->\n")),
+            Value(Dictionary{{"a", "b"}}));
+  EXPECT_EQ(parsed(bytesOf("<?xml version=\"1.0\"?><!-- c --><string/>")), Value(""));
+}
+
 TEST_F(PropertyListCodingTest, ReadsUtf16Texts) {
   EXPECT_EQ(parsedObject(bytesOf("\x64\x4E\x2D\0A\xD8\x3D\xDE\0")), Value("\xE4\xB8\xAD"
                                                                           "A\xF0\x9F\x98\x80"));
@@ -323,10 +380,10 @@ TEST_F(PropertyListCodingTest, TextsThatAreNoUtf8OrHoldANulAreNotSerialised) {
   EXPECT_EQ(coding->xml(Value(std::string_view("a\0b", 3))), std::nullopt);
 }
 
-TEST_F(PropertyListCodingTest, DatesBeyondTheLibrarysRangeAreNotSerialised) {
+TEST_F(PropertyListCodingTest, DatesOutsideTheYearsOneTo9999AreNotSerialised) {
   using namespace std::chrono;
-  EXPECT_EQ(coding->xml(Value::date(sys_days(2070y / January / 1))), std::nullopt);
-  EXPECT_EQ(coding->binary(Value::date(sys_days(1932y / January / 1))), std::nullopt);
+  EXPECT_EQ(coding->xml(Value::date(sys_days(10'000y / January / 1))), std::nullopt);
+  EXPECT_EQ(coding->binary(Value::date(sys_days(0y / December / 31))), std::nullopt);
 }
 
 TEST_F(PropertyListCodingTest, AContainerThatHoldsItselfIsNotSerialised) {
