@@ -63,20 +63,20 @@ void OndrelLogGenerator::handOverCollected(Dictionary& state) {
   _binData.reserve(size);  // the next refresh brings about as much
 }
 
-std::optional<Bytes> OndrelLogGenerator::versionReport() {
-  Bytes report(kVersionReportSize, 0);
+std::optional<Bytes> OndrelLogGenerator::versionReport(std::size_t size) {
+  Bytes report(size, 0);
   std::uint32_t written = 0;
   const Bundle& bundle = services().bundle;
-  const int status = QbxDLFAddVersionReport(report, kVersionReportSize, written, kReportVersion,
-                                            kReportVersion, versionText(bundle), kExecutableName,
-                                            bundle.buildDate(), reportTime(services().clock));
+  const int status = QbxDLFAddVersionReport(
+      report, static_cast<std::uint32_t>(size), written, kReportVersion, kReportVersion,
+      versionText(bundle), kExecutableName, bundle.buildDate(), reportTime(services().clock));
   if (status == kVersionReportWritten) return report;
   services().systemLog.log(LogPriority::Error, "Could not write DLF header (result={})", status);
   return std::nullopt;
 }
 
 std::optional<Bytes> OndrelLogGenerator::generateDlfFromState(const Dictionary& state) {
-  std::optional<Bytes> dlf = versionReport();
+  std::optional<Bytes> dlf = versionReport(kVersionReportSize);
   if (!dlf) return std::nullopt;
   const Array history = state[kStateHistory].array();
   for (const Value& entry : history) {

@@ -38,9 +38,11 @@ class OndrelLogGenerator : public LogGenerator {
   /// many packets were not kept.
   void handOverCollected(Dictionary& state);
 
- private:
-  [[nodiscard]] std::optional<Bytes> versionReport();
+  /// A DLF log's version report, in a buffer of `size` bytes; absent, with a line in the system
+  /// log, when it needs more.
+  [[nodiscard]] std::optional<Bytes> versionReport(std::size_t size);
 
+ private:
   Bytes _binData;
   std::uint64_t _packetsNotKept = 0;  ///< since the last entry
 };

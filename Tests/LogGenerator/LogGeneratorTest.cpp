@@ -146,5 +146,17 @@ TEST_F(LogGeneratorTest, KeepsTheDisplayAsItWas) {
   EXPECT_EQ(kept["Rows"].array()[0].dictionary()["RSRP"], Value("-90 dBm"));
 }
 
+TEST_F(LogGeneratorTest, KeepsTheExtraInformationAsItWas) {
+  Dictionary extra{{"newest", "1"}};
+  state.set("DisplayState", "raw");
+  state.set("Display", "shown");
+  state.set("ExtraInfo", extra);
+  update();
+  extra.set("newest", "2");
+  update();
+  EXPECT_EQ(entry(0)["ExtraInfo"].dictionary()["newest"], Value("1"));
+  EXPECT_EQ(entry(1)["ExtraInfo"].dictionary()["newest"], Value("2"));
+}
+
 }  // namespace
 }  // namespace kestro

@@ -2,6 +2,12 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <atomic>
+#include <chrono>
+#include <future>
+#include <memory>
+#include <thread>
+#include <utility>
 #include <vector>
 
 #include "LogGenerator/ArrayLock.h"
@@ -146,6 +152,86 @@ TEST_F(KestroModelNodeTest, HoldsTheArrayLockOncePerNestedArrayAndGivesItBack) {
   build(Array{Array{Array{"x"}}});
   EXPECT_EQ(ArrayLock::nesting(), 0);
   EXPECT_EQ(*nodesByPath.at("/0/0/0")->value(), "x");
+}
+
+/// A thread that takes the array lock, keeps it until it is told to go on, and gives it back. One
+/// that waits for a lock which nobody can give back is left behind.
+class OtherThread {
+ public:
+  OtherThread() {
+    std::thread([shared = _shared] {
+      shared->isRunning = true;
+      ArrayLock::lockArray();
+      shared->hasLock = true;
+      shared->mayGoOn.get_future().wait();
+      ArrayLock::unlockArray();
+    }).detach();
+    waitUntil(_shared->isRunning, std::chrono::seconds(30));
+  }
+  ~OtherThread() { goOn(); }
+  OtherThread(const OtherThread&) = delete;
+  OtherThread& operator=(const OtherThread&) = delete;
+
+  /// Whether it has the lock, or gets it within that time.
+  [[nodiscard]] bool hasLock(std::chrono::milliseconds time) const {
+    return waitUntil(_shared->hasLock, time);
+  }
+  void goOn() {
+    if (!std::exchange(_isOver, true)) _shared->mayGoOn.set_value();
+  }
+
+ private:
+  struct Shared {
+    std::atomic<bool> isRunning = false;
+    std::atomic<bool> hasLock = false;
+    std::promise<void> mayGoOn;
+  };
+
+  static bool waitUntil(const std::atomic<bool>& flag, std::chrono::milliseconds time) {
+    const auto end = std::chrono::steady_clock::now() + time;
+    while (!flag && std::chrono::steady_clock::now() < end) {
+      std::this_thread::sleep_for(std::chrono::milliseconds(1));
+    }
+    return flag;
+  }
+
+  std::shared_ptr<Shared> _shared = std::make_shared<Shared>();
+  bool _isOver = false;
+};
+
+constexpr std::chrono::milliseconds kLong = std::chrono::seconds(30);
+/// What would be done without the lock is done by then.
+constexpr std::chrono::milliseconds kShort{300};
+
+class ArrayLockUseTest : public KestroModelNodeTest {
+ protected:
+  void SetUp() override { ArrayLock::initialize(); }
+  void TearDown() override { ArrayLock::initialize(); }
+};
+
+TEST_F(ArrayLockUseTest, AWalkOfAnArrayWaitsForTheLock) {
+  OtherThread other;
+  ASSERT_TRUE(other.hasLock(kLong));
+  auto walk = std::async(std::launch::async, [this] { build(Array{"x"}); });
+  EXPECT_EQ(walk.wait_for(kShort), std::future_status::timeout);
+  other.goOn();
+  EXPECT_EQ(walk.wait_for(kLong), std::future_status::ready);
+}
+
+TEST_F(ArrayLockUseTest, AWalkWithoutArraysNeedsNoLock) {
+  OtherThread other;
+  ASSERT_TRUE(other.hasLock(kLong));
+  build(Dictionary{{"A", "x"}});
+}
+
+TEST_F(ArrayLockUseTest, TheLockIsFreeAfterAWalkOfOneArray) {
+  build(Dictionary{{"A", Array{"x"}}, {"B", Array{"y"}}});
+  EXPECT_TRUE(OtherThread().hasLock(kLong));
+}
+
+TEST_F(ArrayLockUseTest, TheLockStaysHeldAfterAWalkOfNestedArrays) {
+  build(Array{Array{"x"}});
+  EXPECT_FALSE(OtherThread().hasLock(kShort));
 }
 
 TEST(PathByAppendingTest, PutsOneSlashBetween) {

@@ -108,6 +108,14 @@ TEST_F(GSMLogGeneratorTest, StoresTheMessageAsReceivedAndAsShown) {
   EXPECT_EQ(state["ExtraInfo"], Value(Dictionary()));
 }
 
+TEST_F(GSMLogGeneratorTest, GivesEachMessageExtraInformationOfItsOwn) {
+  receive(Dictionary{{"A", "1"}});
+  Dictionary first = state["ExtraInfo"].dictionary();
+  first.set("left", "behind");
+  receive(Dictionary{{"A", "2"}});
+  EXPECT_EQ(state["ExtraInfo"], Value(Dictionary()));
+}
+
 TEST_F(GSMLogGeneratorTest, ParsesXmlMessages) {
   receiveText("<plist version=\"1.0\"><dict><key>A</key><string>1</string></dict></plist>");
   EXPECT_EQ(state["Display"], Value(Dictionary{{"A", "1"}}));

@@ -27,6 +27,7 @@ class CollectingGenerator : public OndrelLogGenerator {
     return {};
   }
   [[nodiscard]] Dictionary getStartCommand() const override { return {}; }
+  using OndrelLogGenerator::versionReport;
 };
 
 class OndrelLogGeneratorTest : public ::testing::Test {
@@ -90,6 +91,14 @@ TEST_F(OndrelLogGeneratorTest, AbortsAtAnEntryWhosePacketsAreNoData) {
               ElementsAre(RecordingSystemLog::Line{
                   LogPriority::Error,
                   "Got wrong class writing history to DLF; aborting writing the DLF file"}));
+}
+
+TEST_F(OndrelLogGeneratorTest, SaysWhenTheVersionReportDoesNotFit) {
+  EXPECT_FALSE(generator.versionReport(160));
+  EXPECT_THAT(platform.systemLog().lines(),
+              ElementsAre(RecordingSystemLog::Line{LogPriority::Error,
+                                                   "Could not write DLF header (result=3)"}));
+  EXPECT_THAT(generator.versionReport(161), Optional(SizeIs(161)));
 }
 
 TEST_F(OndrelLogGeneratorTest, SavesTheHistoryAloneWhenThereIsNoDlf) {

@@ -74,6 +74,18 @@ TEST_F(VersionReportTest, HoldsTheWholeExecutableNameAndZeros) {
   EXPECT_THAT(bytes(38, 25), Each(0));
 }
 
+TEST_F(VersionReportTest, CutsALongerExecutableNameToFifteenCharacters) {
+  const std::string name(50, 'N');
+  QbxDLFAddVersionReport(buffer, 161, written, 1, 1, "", name, "", 0);
+  EXPECT_EQ(text(23, 15), std::string(15, 'N'));
+  EXPECT_THAT(bytes(38, 25), Each(0));
+}
+
+TEST_F(VersionReportTest, HoldsTheFirstVersionBeforeTheSecond) {
+  QbxDLFAddVersionReport(buffer, 161, written, 0x1234, 0x5678, "", "", "", 0);
+  EXPECT_THAT(bytes(12, 4), ElementsAre(0x34, 0x12, 0x78, 0x56));
+}
+
 TEST_F(VersionReportTest, CutsTheBuildDateToSeventeenCharacters) {
   write(161);
   EXPECT_EQ(text(63, 17), "Mar  4 2012 13:05");
@@ -84,6 +96,11 @@ TEST_F(VersionReportTest, SpreadsThePackedTime) {
   write(161, packedReportTime(0x4F535EF5, -210, true));
   EXPECT_THAT(bytes(97, 8), ElementsAre(0xF5, 0x5E, 0x53, 0x4F, 0x2E, 0xFF, 1, 0));
   EXPECT_THAT(bytes(105, 56), Each(0));
+}
+
+TEST_F(VersionReportTest, TakesEightBitsForTheDaylightSavingFlag) {
+  write(161, 0xAB01'0000'0000'0000ULL);
+  EXPECT_THAT(bytes(103, 3), ElementsAre(1, 0, 0));
 }
 
 TEST_F(VersionReportTest, PacksTheTimeFromTheLeastSignificantBit) {
