@@ -32,7 +32,9 @@ class SaveHistoryContentCell : public TableCell {
  public:
   SaveHistoryContentCell() : TableCell(saveIdentifier()) {}
 
+  /// The font follows the system's text size, as tables fill their cells anew when it changes.
   void setText(const QString& text) {
+    setFont(scaledFont(QFont(QStringLiteral("Helvetica")), kCellPoints, QFont::Normal));
     _text = text;
     setAccessibleName(text);
     update();
@@ -40,8 +42,7 @@ class SaveHistoryContentCell : public TableCell {
 
  protected:
   void paintContent(QPainter& painter) override {
-    const TextStyle style(
-        scaledFont(QFont(QStringLiteral("Helvetica")), kCellPoints, QFont::Normal));
+    const TextStyle style(font());
     const QRectF frame = contentBounds().adjusted(kTextIndent, 0, 0, 0);
     style.draw(painter, frame, style.elided(_text, frame.width()));
   }

@@ -197,6 +197,18 @@ TEST_F(KestroAppTest, AScreenChangeWhileDisconnectedShowsConnecting) {
   EXPECT_TRUE(isLoading());
 }
 
+TEST_F(KestroAppTest, APaneThatComesBackWhileDisconnectedShowsConnecting) {
+  launchConnected();
+  show(display("-70"));
+  open(0);
+  loseServer();
+  queue().advance(2s);
+  QTest::keyClick(&table(), Qt::Key_Backspace);
+  EXPECT_EQ(depth(), 1);
+  EXPECT_EQ(status(), "Connecting...");
+  EXPECT_TRUE(isLoading());
+}
+
 TEST_F(KestroAppTest, AfterReconnectingTheOldUpdateShowsUntilNewData) {
   launchConnected();
   show(display("-70"));
@@ -254,6 +266,15 @@ TEST_F(KestroAppTest, TheExitClosesThePorts) {
   EXPECT_TRUE(app().updateMessage().isEmpty());
 }
 
+TEST_F(KestroAppTest, TheExitTakesTheWindowAwayBeforeTheModel) {
+  launchConnected();
+  std::size_t portsLeft = 0;
+  QObject::connect(app().window(), &QObject::destroyed,
+                   [&] { portsLeft = platform.messagePorts().names().size(); });
+  app().applicationWillTerminate();
+  EXPECT_EQ(portsLeft, 2);
+}
+
 TEST_F(KestroAppTest, TheEndOfTheEventLoopIsTheExit) {
   launch();
   QTimer::singleShot(0, [] { QCoreApplication::exit(0); });
@@ -275,6 +296,48 @@ TEST_F(KestroAppTest, TheSessionsEndIsTheExit) {
 }
 
 // --- Slides --------------------------------------------------------------------------------------
+
+TEST_F(KestroAppTest, APaneSlidesInAndOut) {
+  launchConnected();
+  show(display("-70"));
+  table().setFocusedRow(0);
+  QTest::keyClick(&table(), Qt::Key_Return);
+  EXPECT_TRUE(stack().isMoving());
+  settle();
+  QTest::keyClick(&table(), Qt::Key_Backspace);
+  EXPECT_TRUE(stack().isMoving());
+}
+
+TEST_F(KestroAppTest, AMouseGoesBackWithASlide) {
+  launchConnected();
+  show(display("-70"));
+  for (QWidget* widget : {static_cast<QWidget*>(&stack()),
+                          static_cast<QWidget*>(&stack().navigationBar().backButton())}) {
+    open(0);
+    QTest::mouseClick(widget, widget == &stack() ? Qt::BackButton : Qt::LeftButton);
+    EXPECT_EQ(depth(), 1);
+    EXPECT_TRUE(stack().isMoving());
+    settle();
+  }
+}
+
+TEST_F(KestroAppTest, APaneWhosePathIsGoneSlidesOut) {
+  launchConnected();
+  show(display("-70"));
+  open(1);
+  show(Dictionary{{"Serving", Dictionary{{"RSCP", "-70"}, {"Band", "1"}}}});
+  EXPECT_EQ(depth(), 1);
+  EXPECT_TRUE(stack().isMoving());
+}
+
+TEST_F(KestroAppTest, TheSaveScreenSlidesInAndOut) {
+  launchConnected();
+  app().showSaveView();
+  EXPECT_TRUE(stack().isMoving());
+  settle();
+  app().closeSaveView();
+  EXPECT_TRUE(stack().isMoving());
+}
 
 TEST_F(KestroAppTest, ASecondTapOnARowOpensNothingMore) {
   launchConnected();

@@ -284,6 +284,25 @@ TEST_F(KestroModelTest, ShowsNothingBetweenTicks) {
   EXPECT_EQ(redraws, 1);
 }
 
+TEST_F(KestroModelTest, PostsTheRedraw) {
+  model->restartMonitor();
+  sendLog(Dictionary{{"A", "1"}});
+  model->refresh();
+  EXPECT_EQ(redraws, 0);
+  queue().runReady();
+  EXPECT_EQ(redraws, 1);
+}
+
+TEST_F(KestroModelTest, RepliesToNoMessage) {
+  model->restartMonitor();
+  const auto port = platform.messagePorts().createRemotePort(channelRequests.back());
+  for (const std::int32_t id : {0, 1}) {
+    const auto reply = port->request(id, *coding->xml(Dictionary{{"A", "1"}}), 1s, 1s);
+    EXPECT_EQ(reply.error, SendError::None);
+    EXPECT_FALSE(reply.data);
+  }
+}
+
 TEST_F(KestroModelTest, AsksForOneRedrawHoweverManyMessagesArrived) {
   model->restartMonitor();
   for (int i = 0; i < 10; ++i) sendLog(Dictionary{{"A", "1"}});
@@ -493,6 +512,17 @@ class StateKeysGenerator : public LogGenerator {
   }
 };
 
+/// A generator that shows which one it is.
+class NumberedGenerator : public StateKeysGenerator {
+ public:
+  NumberedGenerator(const GeneratorServices& services, int number)
+      : StateKeysGenerator(services), _number(number) {}
+  Value generateLogUsingState(Dictionary& /*state*/) override { return std::to_string(_number); }
+
+ private:
+  int _number;
+};
+
 class TechnologyChangeTest : public ModelFixture {
  protected:
   TechnologyChangeTest() {
@@ -524,6 +554,22 @@ class TechnologyChangeTest : public ModelFixture {
 TEST_F(TechnologyChangeTest, KeepsTheStateForTheSameTechnology) {
   connectTo("first");
   EXPECT_THAT(shown(), ElementsAre("DisplayState", "Display", "ExtraInfo", "History", "Running"));
+}
+
+TEST_F(TechnologyChangeTest, TakesANewGeneratorThoughTheTechnologyIsTheSame) {
+  int made = 0;
+  model = KestroModel::create(
+      platform, [] {},
+      [&](const GeneratorServices& services, std::string_view) -> std::unique_ptr<LogGenerator> {
+        return std::make_unique<NumberedGenerator>(services, ++made);
+      });
+  connectTo("first");
+  model->updateWithData({});
+  EXPECT_EQ(*model->topLevelNodes()->value(), "1");
+  connectTo("first");
+  model->updateWithData({});
+  model->refresh();
+  EXPECT_EQ(*model->topLevelNodes()->value(), "2");
 }
 
 TEST_F(TechnologyChangeTest, TakesTheOldGeneratorsKeysOutOfTheState) {

@@ -2,6 +2,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <QApplication>
 #include <QClipboard>
 #include <QGuiApplication>
 #include <QScrollBar>
@@ -104,6 +105,46 @@ TEST_F(KestroPaneControllerTest, TheSaveButtonAsksTheHost) {
   ASSERT_EQ(testing::kindsOf(pane->toolbarItems()), "indicator label space button ");
   pane->toolbarItems()[3].action();
   EXPECT_EQ(host.saves, 1);
+}
+
+TEST_F(KestroPaneControllerTest, AReloadBuildsTheToolbarAnew) {
+  makePane(nullptr);
+  pane->viewWillAppear(false);
+  host.allows = true;
+  pane->reloadWithNode(nullptr);
+  EXPECT_EQ(testing::kindsOf(pane->toolbarItems()), "indicator label space button ");
+}
+
+TEST_F(KestroPaneControllerTest, ItsToolbarItemsAreSetWithAnimation) {
+  makePane(nullptr);
+  std::vector<bool> animated;
+  pane->setChangeHandler([&](bool isAnimated) { animated.push_back(isAnimated); });
+  const auto last = [&] {
+    const bool result = animated.back();
+    animated = {false};
+    return result;
+  };
+  pane->viewWillAppear(false);
+  EXPECT_TRUE(last());
+  pane->setStatus("Updated", false);
+  EXPECT_TRUE(last());
+  pane->reloadWithNode(nullptr);
+  EXPECT_TRUE(last());
+}
+
+TEST_F(KestroPaneControllerTest, APaneThatDisappearsGivesUpTheKeys) {
+  makePane(tree("Kestro", {leaf("Count", "7")}));
+  QApplication::setActiveWindow(pane.get());
+  table().setFocus();
+  ASSERT_TRUE(table().hasFocus());
+  pane->viewWillDisappear(true);
+  EXPECT_FALSE(table().hasFocus());
+}
+
+TEST_F(KestroPaneControllerTest, BothKindsOfCellsHaveOneIdentifier) {
+  makePane(tree("Kestro", {tree("A", {}), leaf("B", "1")}));
+  EXPECT_EQ(table().cellAtRow(0)->reuseIdentifier(), "KestroPaneControllerCell");
+  EXPECT_EQ(table().cellAtRow(1)->reuseIdentifier(), "KestroPaneControllerCell");
 }
 
 TEST_F(KestroPaneControllerTest, ALeafRowOpensNothingAndIsDeselected) {

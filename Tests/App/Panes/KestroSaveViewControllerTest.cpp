@@ -63,6 +63,18 @@ TEST_F(KestroSaveViewControllerTest, TheEntriesAreListedInOrderWithCheckMarks) {
   EXPECT_EQ(table.cellAtRow(0)->reuseIdentifier(), "SaveHistoryContentCell");
 }
 
+TEST_F(KestroSaveViewControllerTest, TheEntriesAreInHelveticaThirteen) {
+  open(Array{entry("first")});
+  const QFont& font = screen->saveContentTable().cellAtRow(0)->font();
+  EXPECT_EQ(font.family(), "Helvetica");
+  EXPECT_EQ(font.pixelSize(), 13);
+}
+
+TEST_F(KestroSaveViewControllerTest, EnterInTheFieldIsTaken) {
+  open(Array());
+  EXPECT_TRUE(screen->textFieldShouldReturn());
+}
+
 TEST_F(KestroSaveViewControllerTest, SavingWritesTimeDataAndDescription) {
   open(Array{entry("first")});
   screen->saveDescription().setText("in the tunnel");

@@ -32,6 +32,12 @@ TEST(CellFramesTest, AValueThatJustFitsFollowsTheKeyAndNothingScrolls) {
   EXPECT_EQ(frames.contentSize, QSizeF(200, 50));
 }
 
+TEST(CellFramesTest, AValueThatJustFitsFollowsTheKeyInAnAreaFurtherRight) {
+  const CellFrames frames = keyValueFrames(QRectF(5, 0, 200, 50), kKey, kValue);
+  EXPECT_EQ(frames.value, QRectF(145, 16, 60, 18));
+  EXPECT_EQ(frames.contentSize, QSizeF(200, 50));
+}
+
 TEST(CellFramesTest, AValueThatDoesNotFitFollowsTheKeyAndTheContainerScrolls) {
   const CellFrames frames = keyValueFrames(QRectF(0, 0, 199, 50), kKey, kValue);
   EXPECT_EQ(frames.value, QRectF(140, 16, 60, 18));

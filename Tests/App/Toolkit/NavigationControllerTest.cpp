@@ -7,6 +7,7 @@
 
 #include "App/Toolkit/ActivityIndicator.h"
 #include "App/Toolkit/NavigationController.h"
+#include "App/Toolkit/TextStyle.h"
 #include "Tests/App/Screen.h"
 
 namespace kestro {
@@ -159,6 +160,12 @@ TEST_F(NavigationControllerTest, ItemsOfTheSameKindsKeepTheirWidgets) {
   screen.setToolbarItems({ToolbarItem::activityIndicator(false), ToolbarItem::label("b")}, true);
   EXPECT_EQ(stack.toolbar().widgetOfItem(1), label);
   EXPECT_EQ(static_cast<QLabel*>(label)->text(), "b");
+}
+
+TEST_F(NavigationControllerTest, AToolbarsLabelHasRoomForItsTextInFourteenPoints) {
+  stack.topViewController().setToolbarItems({ToolbarItem::label("Updated 2012-03-04")}, false);
+  const QSize room = stack.toolbar().widgetOfItem(0)->sizeHint();
+  EXPECT_EQ(room - QSize(1, 0), systemTextStyle(14).size("Updated 2012-03-04").toSize());
 }
 
 TEST_F(NavigationControllerTest, AButtonsShortcutPressesIt) {
