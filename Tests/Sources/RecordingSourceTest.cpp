@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-// Captures as sources.
+// Recordings as sources.
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
