@@ -90,7 +90,8 @@ struct NamedValue {
 
 /// The rows of a table of such values, borrowed. Two are equal when their rows are.
 struct NamedValues : std::span<const NamedValue> {
-  using std::span<const NamedValue>::span;
+  // The check takes the inherited constructors for a written one.
+  using std::span<const NamedValue>::span;  // NOLINT(modernize-use-equals-default)
 
   friend constexpr bool operator==(const NamedValues& left, const NamedValues& right) {
     return std::ranges::equal(left, right);
