@@ -10,8 +10,6 @@
 namespace kestro {
 namespace {
 
-constexpr std::string_view kSpaces = " \t\r\n";
-
 struct Utf16 {
   QStringConverter::Encoding encoding;
   std::size_t markSize;
@@ -28,7 +26,7 @@ std::optional<Utf16> utf16Of(std::string_view list) {
 
 /// The XML declaration without its end, if the list begins with one.
 std::string_view declarationOf(std::string_view list) {
-  const std::size_t start = list.find_first_not_of(kSpaces);
+  const std::size_t start = list.find_first_not_of(kXmlSpaces);
   if (start == std::string_view::npos || !list.substr(start).starts_with("<?xml")) return {};
   return list.substr(start, list.substr(start).find("?>"));
 }

@@ -15,10 +15,9 @@ namespace kestro {
 namespace {
 
 std::string_view trimmed(std::string_view text) {
-  constexpr std::string_view kSpaces = " \t\r\n";
-  const std::size_t start = text.find_first_not_of(kSpaces);
+  const std::size_t start = text.find_first_not_of(kXmlSpaces);
   if (start == std::string_view::npos) return {};
-  return text.substr(start, text.find_last_not_of(kSpaces) + 1 - start);
+  return text.substr(start, text.find_last_not_of(kXmlSpaces) + 1 - start);
 }
 
 /// The number that is all of `digits`.

@@ -9,6 +9,9 @@
 
 namespace kestro {
 
+/// What XML takes for blank.
+inline constexpr std::string_view kXmlSpaces = " \t\r\n";
+
 struct LeafVerdict {
   std::string_view problem;     ///< empty when the element is in order; else lives for ever
   bool isLargeInteger = false;  ///< an integer above 2^63 - 1
