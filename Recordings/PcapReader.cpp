@@ -5,7 +5,9 @@
 #include <fmt/format.h>
 #include <pcap/pcap.h>
 
-#include <filesystem>
+#include <cerrno>
+#include <cstdio>
+#include <cstring>
 #include <utility>
 
 #include "Recordings/PcapFormat.h"
@@ -13,12 +15,15 @@
 namespace kestro {
 
 struct PcapReader::Handle {
-  explicit Handle(pcap_t* opened) : pcap(opened) {}
+  explicit Handle(RecordedFile opened) : file(std::move(opened)) {}
   Handle(const Handle&) = delete;
   Handle& operator=(const Handle&) = delete;
-  ~Handle() { pcap_close(pcap); }
+  ~Handle() {
+    if (pcap != nullptr) pcap_close(pcap);
+  }
 
-  pcap_t* pcap;
+  RecordedFile file;  ///< what the stream that the library owns reads from
+  pcap_t* pcap = nullptr;
 };
 
 namespace {
@@ -38,38 +43,57 @@ Result<Moment> momentOf(const timeval& time) {
   return Moment(std::chrono::seconds(seconds) + std::chrono::microseconds(microseconds));
 }
 
-bool isEmptyFile(const std::string& path) {
-  std::error_code error;
-  return std::filesystem::is_regular_file(path, error) &&
-         std::filesystem::file_size(path, error) == 0;
+/// The library reads a stream, which reads the file, a pipe too, from the first byte that is
+/// unread.
+ssize_t readForStream(void* file, char* target, size_t size) {
+  const auto count =
+      static_cast<RecordedFile*>(file)->read({reinterpret_cast<std::uint8_t*>(target), size});
+  return count ? static_cast<ssize_t>(*count) : -1;  // errno is the system's still
+}
+
+std::FILE* streamOf(RecordedFile& file) {
+  constexpr std::size_t kBufferSize = std::size_t{64} * 1024;
+  const cookie_io_functions_t functions = {
+      .read = readForStream, .write = nullptr, .seek = nullptr, .close = nullptr};
+  std::FILE* stream = ::fopencookie(&file, "r", functions);
+  if (stream != nullptr) std::setvbuf(stream, nullptr, _IOFBF, kBufferSize);
+  return stream;
 }
 
 }  // namespace
 
 Result<PcapReader> PcapReader::open(const std::string& path) {
-  if (isEmptyFile(path)) return failure(fmt::format("{}: the file is empty", path));
+  auto file = RecordedFile::open(path);
+  if (!file) return tl::unexpected(file.error());
+  return open(*std::move(file));
+}
+
+Result<PcapReader> PcapReader::open(RecordedFile file) {
+  const auto head = file.ahead(1);
+  if (!head) return tl::unexpected(head.error());
+  const std::string path = file.path();
+  if (head->empty()) return failure(fmt::format("{}: the file is empty", path));
+  auto handle = std::make_unique<Handle>(std::move(file));
+  std::FILE* stream = streamOf(handle->file);
+  if (stream == nullptr) return failure(fmt::format("{}: {}", path, std::strerror(errno)));
   char reason[PCAP_ERRBUF_SIZE] = "";
-  pcap_t* pcap =
-      pcap_open_offline_with_tstamp_precision(path.c_str(), PCAP_TSTAMP_PRECISION_MICRO, reason);
-  if (pcap == nullptr) {
-    // Only some of the library's reasons name the file.
-    const std::string_view text = reason;
-    if (text.starts_with(path)) return failure(std::string(text));
-    return failure(fmt::format("{}: {}", path, text));
+  handle->pcap =
+      pcap_fopen_offline_with_tstamp_precision(stream, PCAP_TSTAMP_PRECISION_MICRO, reason);
+  if (handle->pcap == nullptr) {
+    static_cast<void>(std::fclose(stream));  // the library takes it over only when it succeeds
+    return failure(fmt::format("{}: {}", path, reason));
   }
-  auto handle = std::make_unique<Handle>(pcap);
-  const int linkType = pcap_datalink(pcap);
+  const int linkType = pcap_datalink(handle->pcap);
   const auto technology = technologyOfLinkType(linkType);
   if (!technology) {
     return failure(
         fmt::format("{}: link type {} stands for no technology (147 to 151 do)", path, linkType));
   }
-  return PcapReader(path, std::move(handle), *technology);
+  return PcapReader(std::move(handle), *technology);
 }
 
-PcapReader::PcapReader(std::string path, std::unique_ptr<Handle> handle,
-                       std::string_view technology)
-    : _path(std::move(path)), _handle(std::move(handle)), _technology(technology) {}
+PcapReader::PcapReader(std::unique_ptr<Handle> handle, std::string_view technology)
+    : _handle(std::move(handle)), _technology(technology) {}
 
 PcapReader::PcapReader(PcapReader&&) noexcept = default;
 PcapReader& PcapReader::operator=(PcapReader&&) noexcept = default;
@@ -84,16 +108,19 @@ Result<std::optional<RecordedMessage>> PcapReader::next() {
   if (outcome != 1) return damaged(pcap_geterr(_handle->pcap));
   const Result<Moment> time = momentOf(header->ts);
   if (!time) return damaged(time.error().message);
-  RecordedMessage message{.time = *time,
-                          .bytes = {bytes, header->caplen},
-                          .number = ++_messageCount,
-                          .originalLength = header->len};
-  if (message.isCut()) ++_cutMessageCount;
-  return message;
+  return counted({.time = *time,
+                  .technology = _technology,
+                  .bytes = {bytes, header->caplen},
+                  .originalLength = header->len});
+}
+
+std::optional<double> PcapReader::fractionRead() const noexcept {
+  return _handle->file.fractionRead();
 }
 
 tl::unexpected<Error> PcapReader::damaged(std::string_view reason) {
-  _error = Error{fmt::format("{}: record {}: {}", _path, _messageCount + 1, reason)};
+  _error =
+      Error{fmt::format("{}: record {}: {}", _handle->file.path(), messageCount() + 1, reason)};
   return tl::unexpected(*_error);
 }
 
