@@ -2,17 +2,23 @@
 #include "Options/ArgumentParser.h"
 
 #include <fmt/format.h>
+#include <fmt/ranges.h>
 
 #include <CLI/CLI.hpp>
 #include <algorithm>
+#include <charconv>
 #include <cstdio>
 #include <optional>
+#include <span>
 #include <sstream>
 #include <stdexcept>
+#include <string_view>
+#include <system_error>
 #include <type_traits>
 #include <vector>
 
 #include "Options/HelpText.h"
+#include "Options/ValueCheck.h"
 
 namespace kestro {
 namespace {
@@ -48,11 +54,25 @@ std::optional<Number> numberIn(const std::string& text) {
   return number;
 }
 
+/// What a row is called where it has a short name, too.
+std::string longName(const std::string& name) { return name.substr(name.find(',') + 1); }
+
+/// Whether a text is a whole number that the type cannot hold. (CLI11 reads the largest instead.)
+template <class Number>
+bool isTooLarge(const std::string& text) {
+  Number number{};
+  return std::from_chars(text.data(), text.data() + text.size(), number).ec ==
+         std::errc::result_out_of_range;
+}
+
 /// Looks whether a text is a number in range; "nan" is in none.
 template <class Number>
 CLI::Validator rangeCheck(const NumberRange& range) {
   return {[range](const std::string& text) {
             const auto number = numberIn<Number>(text);
+            if (std::is_integral_v<Number> && isTooLarge<Number>(text)) {
+              return text + " is too large";
+            }
             const auto value = static_cast<double>(number.value_or(0));
             if (number && value >= range.least && value <= range.most) return std::string();
             return fmt::format("{} is not {}", text, rangeText(std::is_integral_v<Number>, range));
@@ -69,6 +89,16 @@ CLI::Option* declareTarget(CLI::App& app, const OptionRow& row, const Answer& an
       .add_flag_callback(
           row.name, [answer] { throw CLI::CallForVersion(answer(), 0); }, row.help)
       ->configurable(false);
+}
+
+CLI::Option* declareTarget(CLI::App& app, const OptionRow& row, const ValueReader& read) {
+  const auto take = [&row, read](const std::string& text) {
+    if (const auto problem = read(text); !problem.empty()) {
+      throw CLI::ValidationError(longName(row.name), problem);
+    }
+  };
+  return app.add_option_function<std::string>(row.name, take, row.help)
+      ->option_text(valueText(row));
 }
 
 template <class Target>
@@ -130,6 +160,34 @@ const CommandRow& chosenOf(const CLI::App& app, const CommandRow& command) {
   return command;
 }
 
+std::string listOf(const std::vector<CommandRow>& commands) {
+  std::vector<std::string_view> names(commands.size());
+  std::ranges::transform(commands, names.begin(), &CommandRow::name);
+  return fmt::format("{}", fmt::join(names, ", "));
+}
+
+/// What is wrong where something that is required is missing: that comes from a word that nobody
+/// knows, if there is one.
+std::string missingText(const CLI::App& app, const CommandRow& command, const std::string& said) {
+  for (const CommandRow& inner : command.commands) {
+    const CLI::App* declared = app.get_subcommand(inner.name);
+    if (declared->parsed()) return missingText(*declared, inner, said);
+  }
+  const auto unknown = app.remaining();
+  if (command.commands.empty()) {
+    return unknown.empty() ? said : fmt::format("'{}' was not expected", unknown.front());
+  }
+  const std::string known = listOf(command.commands);
+  if (unknown.empty()) return fmt::format("{} needs a command: {}", command.name, known);
+  const bool isOption = unknown.front().starts_with('-');
+  return isOption ? fmt::format("'{}' was not expected", unknown.front())
+                  : fmt::format("there is no command '{}'; there are {}", unknown.front(), known);
+}
+
+OptionsText wrongUsage(std::string_view line) {
+  return {fmt::format("{}\nRun with --help for more information.\n", line), kWrongUsage};
+}
+
 }  // namespace
 
 std::variant<const CommandRow*, OptionsText> parseArguments(const CommandRow& program,
@@ -137,8 +195,15 @@ std::variant<const CommandRow*, OptionsText> parseArguments(const CommandRow& pr
                                                             const char* const* arguments) {
   CLI::App app(program.help, program.name);
   declareCommand(app, program);
+  const std::span<const char* const> given(arguments, static_cast<std::size_t>(argumentCount));
+  if (const auto problem = valueProblem(program, given.subspan(given.empty() ? 0 : 1));
+      !problem.empty()) {
+    return wrongUsage(problem);
+  }
   try {
     app.parse(argumentCount, arguments);
+  } catch (const CLI::RequiredError& error) {
+    return wrongUsage(missingText(app, program, error.what()));
   } catch (const CLI::ParseError& error) {  // help and the version are such, too, of status 0
     std::ostringstream text;
     const int status = app.exit(error, text, text);

@@ -30,11 +30,14 @@ struct NumberRange {
 /// What is printed instead of running; the exit status is 0.
 using Answer = std::function<std::string()>;
 
+/// Takes a value whose form only its owner knows; says what is wrong with it, or nothing.
+using ValueReader = std::function<std::string(const std::string& text)>;
+
 /// Where an option's value goes; until the arguments are read it holds the default. A bool makes a
 /// flag, which takes no value.
 using OptionTarget = std::variant<std::string*, bool*, double*, std::uint64_t*, std::optional<int>*,
                                   std::optional<std::uint32_t>*, std::optional<std::uint64_t>*,
-                                  LogPriority*, Answer>;
+                                  LogPriority*, Answer, ValueReader>;
 
 /// One row. What the target points to must live until the arguments are read.
 struct OptionRow {

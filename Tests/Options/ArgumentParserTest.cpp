@@ -82,7 +82,7 @@ TEST(ArgumentParserTest, WhatIsRequiredMustBeThere) {
                  {.name = "-o,--output", .target = &output, .isRequired = true}});
   EXPECT_EQ(refusal(program, {"-o", "a"}), "FILE is required");
   EXPECT_EQ(refusal(program, {"a"}), "--output is required");
-  EXPECT_EQ(refusal(program, {"a", "-o"}), "--output: 1 required TEXT missing");
+  EXPECT_EQ(refusal(program, {"a", "-o"}), "-o: a value is missing");
 }
 
 TEST(ArgumentParserTest, AnImpliedValueStandsWhereNoneIsGiven) {
@@ -219,9 +219,47 @@ TEST(ArgumentParserTest, TheInnermostCommandIsChosen) {
 
 TEST(ArgumentParserTest, OneOfTheCommandsMustBeGiven) {
   const CommandRow program{.name = "program", .commands = {{.name = "show"}, {.name = "save"}}};
-  EXPECT_EQ(refusal(program, {}), "A subcommand is required");
-  EXPECT_EQ(refusal(program, {"other"}), "A subcommand is required");
+  EXPECT_EQ(refusal(program, {}), "program needs a command: show, save");
   EXPECT_THAT(refusal(program, {"show", "save"}), HasSubstr("not expected"));
+}
+
+TEST(ArgumentParserTest, AWordThatNobodyKnowsIsNamed) {
+  std::string file;
+  const CommandRow program{
+      .name = "program",
+      .commands = {
+          {.name = "show", .options = {{.name = "FILE", .target = &file, .isRequired = true}}},
+          {.name = "snapshot", .commands = {{.name = "save"}, {.name = "load"}}}}};
+  EXPECT_EQ(refusal(program, {"shwo", "a"}),
+            "there is no command 'shwo'; there are show, snapshot");
+  EXPECT_EQ(refusal(program, {"snapshot", "bogus"}),
+            "there is no command 'bogus'; there are save, load");
+  EXPECT_EQ(refusal(program, {"snapshot"}), "snapshot needs a command: save, load");
+  EXPECT_EQ(refusal(program, {"--bogus"}), "'--bogus' was not expected");
+  EXPECT_EQ(refusal(program, {"show", "--bogus"}), "'--bogus' was not expected");
+  EXPECT_EQ(refusal(program, {"show"}), "FILE is required");
+}
+
+TEST(ArgumentParserTest, ANumberThatNoNumberHoldsIsTooLarge) {
+  std::optional<std::uint64_t> count;
+  const CommandRow program =
+      programOf({{.name = "--count", .target = &count, .range = NumberRange{1}}});
+  chosen(program, {"--count=18446744073709551615"});
+  EXPECT_EQ(count, 18446744073709551615U);
+  EXPECT_EQ(refusal(program, {"--count=18446744073709551616"}),
+            "--count: 18446744073709551616 is too large");
+}
+
+TEST(ArgumentParserTest, ARowMayReadItsValueItself) {
+  std::string read;
+  const CommandRow program =
+      programOf({{.name = "-s,--span", .value = "A-B", .target = [&read](const std::string& text) {
+                    read = text;
+                    return text == "1-2" ? std::string() : "'" + text + "' is no span";
+                  }}});
+  chosen(program, {"--span=1-2"});
+  EXPECT_EQ(read, "1-2");
+  EXPECT_EQ(refusal(program, {"-s", "x"}), "--span: 'x' is no span");
 }
 
 TEST(ArgumentParserTest, HelpTellsAllRowsButTheHidden) {
