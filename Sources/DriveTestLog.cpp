@@ -8,6 +8,7 @@
 #include <cerrno>
 #include <charconv>
 #include <cmath>
+#include <istream>
 #include <system_error>
 #include <utility>
 
@@ -137,7 +138,32 @@ std::optional<std::chrono::sys_seconds> parsedTime(std::string_view text) {
          std::chrono::seconds(seconds);
 }
 
+constexpr std::array<std::string_view, kDriveTestFamilyCount> kFamilyNames = {"GSM", "UMTS", "LTE"};
+
+constexpr const char* kInUtf16 = "the file is in UTF-16: save it in UTF-8";
+
+/// Whether a text begins with the byte order mark of UTF-16, either way.
+bool beginsInUtf16(std::istream& text) { return text.peek() == 0xFF || text.peek() == 0xFE; }
+
+/// Why a first line names none of the columns, where it shows: what it was saved as.
+std::string formHint(const std::vector<std::string>& fields) {
+  const std::string& first = fields.front();
+  if (first.find('\0') != std::string::npos) return fmt::format("; {}", kInUtf16);
+  const bool isOneField = fields.size() == 1;
+  if (isOneField && first.find(';') != std::string::npos) {
+    return "; its columns are separated by semicolons: save it with commas";
+  }
+  if (isOneField && first.find('\t') != std::string::npos) {
+    return "; its columns are separated by tabs: save it with commas";
+  }
+  return "";
+}
+
 }  // namespace
+
+std::string_view nameOf(DriveTestFamily family) noexcept {
+  return kFamilyNames[static_cast<std::size_t>(family)];
+}
 
 std::optional<DriveTestFamily> familyOfNetworkMode(std::string_view mode) noexcept {
   const auto* found = std::ranges::find(kNetworkModes, mode, &NetworkMode::name);
@@ -161,6 +187,7 @@ DriveTestLog::DriveTestLog(std::string path, std::unique_ptr<std::ifstream> file
     : _path(std::move(path)), _file(std::move(file)), _csv(std::make_unique<CsvReader>(*_file)) {}
 
 Result<void> DriveTestLog::readFirstLine() {
+  if (beginsInUtf16(*_file)) return failure(kInUtf16);
   const auto names = _csv->next();
   if (!names) return tl::unexpected(names.error());
   if (_csv->readFailed()) return failure("the file cannot be read");
@@ -173,7 +200,8 @@ Result<void> DriveTestLog::readFirstLine() {
       _fieldOfColumn[static_cast<std::size_t>(column.column)] =
           static_cast<std::size_t>(found - fields.begin());
     } else if (column.isRequired) {
-      return failure(fmt::format("no drive-test log: there is no column \"{}\"", column.name));
+      return failure(fmt::format("no drive-test log: there is no column \"{}\"{}", column.name,
+                                 formHint(fields)));
     } else {
       _missingColumns.emplace_back(column.name);
     }

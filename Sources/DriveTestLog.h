@@ -48,6 +48,9 @@ inline constexpr std::size_t kDriveTestColumnCount = 21;
 enum class DriveTestFamily : std::uint8_t { GSM, UMTS, LTE };
 inline constexpr std::size_t kDriveTestFamilyCount = 3;
 
+/// What people call the family: "GSM", "UMTS", "LTE".
+[[nodiscard]] std::string_view nameOf(DriveTestFamily family) noexcept;
+
 /// The family of a network mode as the logs name it ("HSPA+"); absent for an unknown name. 5G
 /// counts as LTE: it is anchored there.
 [[nodiscard]] std::optional<DriveTestFamily> familyOfNetworkMode(std::string_view mode) noexcept;

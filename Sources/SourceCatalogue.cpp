@@ -80,43 +80,60 @@ std::unique_ptr<DriveTestEncoder> autoEncoder(const PropertyListCoding& coding,
   return std::make_unique<AutoDriveTestEncoder>(coding, first);
 }
 
-/// What a drive-test log can be written as, and by whom, given the family of its first row.
+bool takesAll(DriveTestFamily /*family*/) { return true; }
+bool takesLTE(DriveTestFamily family) { return family == DriveTestFamily::LTE; }
+bool takesGsmUmts(DriveTestFamily family) { return !takesLTE(family); }
+
+/// What a drive-test log can be written as, of which rows, and by whom, given the family of its
+/// first row.
 struct DriveTestWriter {
   std::string_view technology;
+  bool (*takes)(DriveTestFamily family);
   std::unique_ptr<DriveTestEncoder> (*make)(const PropertyListCoding& coding,
                                             DriveTestFamily first);
 };
 constexpr std::array kDriveTestWriters = {
-    DriveTestWriter{kTqLogChannelTechnology_IFX, encoder<IFXDriveTestEncoder>},
-    DriveTestWriter{kTqLogChannelTechnology_Ondrel_GSM, encoder<GsmUmtsDriveTestEncoder>},
-    DriveTestWriter{kTqLogChannelTechnology_Ondrel_LTE, encoder<LTEDriveTestEncoder>},
-    DriveTestWriter{kAutomaticTechnology, autoEncoder},
+    DriveTestWriter{kTqLogChannelTechnology_IFX, takesAll, encoder<IFXDriveTestEncoder>},
+    DriveTestWriter{kTqLogChannelTechnology_Ondrel_GSM, takesGsmUmts,
+                    encoder<GsmUmtsDriveTestEncoder>},
+    DriveTestWriter{kTqLogChannelTechnology_Ondrel_LTE, takesLTE, encoder<LTEDriveTestEncoder>},
+    DriveTestWriter{kAutomaticTechnology, takesAll, autoEncoder},
 };
 
-/// The refusal of a technology that a source does not speak, with those that it does.
+/// Refuses a technology that no row makes, and names those that there are.
 template <class Rows>
-tl::unexpected<Error> notMade(const SourceRequest& request, std::string_view technology,
-                              const Rows& rows) {
+Result<void> checkMade(const SourceRequest& request, std::string_view technology,
+                       const Rows& rows) {
   std::vector<std::string_view> made;
   made.reserve(rows.size());
   for (const auto& row : rows) made.push_back(row.technology);
+  if (std::ranges::find(made, technology) != made.end()) return {};
   return failure(fmt::format("the source \"{}\" cannot make {} messages, only {}", request.kind,
                              technology, fmt::join(made, ", ")));
 }
 
+std::string_view technologyOfSimulation(const SourceRequest& request) {
+  if (!request.technology.empty()) return request.technology;
+  const auto technology = technologyNamed(request.argument);
+  return technology.empty() ? kTqLogChannelTechnology_Ondrel_LTE : technology;
+}
+
+Result<void> checkSimulation(const SourceRequest& request) {
+  return checkMade(request, technologyOfSimulation(request), kSimulations);
+}
+
 OpenedSource openSimulation(const SourceRequest& request, Platform& platform,
                             const SourceReporter& /*report*/) {
-  std::string_view technology = request.technology;
-  if (technology.empty()) technology = technologyNamed(request.argument);
-  if (technology.empty()) technology = kTqLogChannelTechnology_Ondrel_LTE;
-  const auto* row = std::ranges::find(kSimulations, technology, &Simulation::technology);
-  if (row == kSimulations.end()) return notMade(request, technology, kSimulations);
+  const auto* row =
+      std::ranges::find(kSimulations, technologyOfSimulation(request), &Simulation::technology);
   return row->make(platform.propertyListCoding());
 }
 
+// A capture says itself what it speaks.
+Result<void> checkCapture(const SourceRequest& /*request*/) { return {}; }
+
 OpenedSource openCapture(const SourceRequest& request, Platform& /*platform*/,
                          const SourceReporter& report) {
-  // A capture says itself what it speaks.
   const bool followsFile = request.technology == kAutomaticTechnology;
   return RecordingSource::open(request.argument, followsFile ? "" : request.technology, report);
 }
@@ -130,22 +147,33 @@ Result<DriveTestFamily> firstFamily(const std::string& path) {
   return row->has_value() ? (*row)->family : DriveTestFamily::LTE;
 }
 
+Result<void> checkDriveTest(const SourceRequest& request) {
+  return checkMade(request, orDefault(request.technology), kDriveTestWriters);
+}
+
 OpenedSource openDriveTest(const SourceRequest& request, Platform& platform,
                            const SourceReporter& report) {
   const auto technology = orDefault(request.technology);
   const auto* row = std::ranges::find(kDriveTestWriters, technology, &DriveTestWriter::technology);
-  if (row == kDriveTestWriters.end()) return notMade(request, technology, kDriveTestWriters);
   const auto first = firstFamily(request.argument);
   if (!first) return tl::unexpected(first.error());
+  if (!row->takes(*first)) {
+    report(
+        fmt::format("{}: it begins with {} rows, which are passed over: they are no {} "
+                    "messages (with --technology={} each row is what it was measured in)",
+                    request.argument, nameOf(*first), technology, kAutomaticTechnology));
+  }
   return DriveTestSource::open(request.argument, row->make(platform.propertyListCoding(), *first),
                                report);
 }
 
+Result<void> checkStream(const SourceRequest& request) {
+  if (request.technology != kAutomaticTechnology) return {};
+  return failure("a stream does not say what it speaks; --technology must");
+}
+
 OpenedSource openStream(const SourceRequest& request, Platform& platform,
                         const SourceReporter& /*report*/) {
-  if (request.technology == kAutomaticTechnology) {
-    return failure("a stream does not say what it speaks; --technology must");
-  }
   return StreamSource::open(platform.inputStreams(), request.argument,
                             orDefault(request.technology));
 }
@@ -161,11 +189,11 @@ constexpr std::array kKinds = {
                "A made-up drive, the same in every run: cells, path loss, fading,\n"
                "handovers, data transfers. Technology: LTE (unless given), IFX,\n"
                "Ondrel_GSM, Ondrel_CDMA or UTRAN2.",
-               true, openSimulation},
+               true, checkSimulation, openSimulation},
     SourceKind{"capture", isGiven, "capture:FILE",
                "A recorded capture, with the pauses that it was recorded with. The\n"
                "file names the technology.",
-               false, openCapture},
+               false, checkCapture, openCapture},
     SourceKind{"drive-test", isGiven, "drive-test:FILE.csv",
                "A drive-test log as phone apps write it, one row a second: columns\n"
                "Timestamp, NetworkMode, RSRP, and what else there is of RSRQ, SNR,\n"
@@ -178,12 +206,12 @@ constexpr std::array kKinds = {
                "states, SIM, contexts; auto follows the log from one to the other. A\n"
                "value that was not measured (\"-\") keeps the last one; before there\n"
                "is one, it is left out, with the packets that need it.",
-               true, openDriveTest},
+               true, checkDriveTest, openDriveTest},
     SourceKind{"stream", isGiven, "stream:PATH",
                "Messages from a file, a pipe or standard input (\"-\") as they arrive,\n"
                "each behind its length (32 bits, little-endian). --technology says\n"
                "what they are; IFX unless given. --speed does not apply.",
-               false, openStream},
+               false, checkStream, openStream},
 };
 
 }  // namespace
@@ -219,7 +247,9 @@ Result<SourceRequest> parseSource(std::string_view text, std::string_view techno
   if (!kind->accepts(argument)) {
     return failure(fmt::format("\"{}\" is no source; the form is {}", text, kind->form));
   }
-  return SourceRequest{std::string(name), std::string(argument), technology};
+  SourceRequest request{std::string(name), std::string(argument), technology};
+  if (auto spoken = kind->checkTechnology(request); !spoken) return tl::unexpected(spoken.error());
+  return request;
 }
 
 LogSourceState stateOf(const SourceRequest& request) {
@@ -234,6 +264,7 @@ Result<std::unique_ptr<LogSource>> openSource(const SourceRequest& request, Plat
                                               const SourceReporter& report) {
   const auto* kind = std::ranges::find(kKinds, request.kind, &SourceKind::name);
   if (kind == kKinds.end()) return failure(fmt::format("no source \"{}\"", request.kind));
+  if (auto spoken = kind->checkTechnology(request); !spoken) return tl::unexpected(spoken.error());
   return kind->open(request, platform, report);
 }
 

@@ -33,6 +33,8 @@ struct SourceKind {
   std::string_view form;         ///< as a person types it
   std::string_view description;  ///< for the help, in lines of at most 70 characters
   bool isSimulated;              ///< no baseband has sent its messages
+  /// The error says why it cannot yield messages of the technology that is asked for.
+  Result<void> (*checkTechnology)(const SourceRequest& request);
   Result<std::unique_ptr<LogSource>> (*open)(const SourceRequest& request, Platform& platform,
                                              const SourceReporter& report);
 };
@@ -52,8 +54,8 @@ struct SourceKind {
 /// The technology of that name as a constant text; empty when there is none.
 [[nodiscard]] std::string_view technologyNamed(std::string_view name) noexcept;
 
-/// Takes "KIND[:ARGUMENT]" apart; the error says that there is no such kind, or that its argument
-/// is missing or too much. `technology` as in SourceRequest.
+/// Takes "KIND[:ARGUMENT]" apart; the error says that there is no such kind, that its argument is
+/// missing or too much, or that it cannot speak the technology. `technology` as in SourceRequest.
 [[nodiscard]] Result<SourceRequest> parseSource(std::string_view text, std::string_view technology);
 
 /// What a server can tell of the source that was asked for.

@@ -21,8 +21,6 @@ struct Shown {
   std::string_view unit;
 };
 
-constexpr std::array<std::string_view, kDriveTestFamilyCount> kFamilyNames = {"GSM", "UMTS", "LTE"};
-
 constexpr std::array<std::string_view, kDriveTestFamilyCount> everywhere(std::string_view name) {
   return {name, name, name};
 }
@@ -93,7 +91,7 @@ std::vector<Bytes> IFXDriveTestEncoder::messages(const DriveTestRow& row) {
   auto servingCell = message.addSection("Serving Cell");
   fill(servingCell, kServingCell, row);
   auto quality = message.addSection("Radio Quality");
-  quality.set("Technology", kFamilyNames[static_cast<std::size_t>(row.family)]);
+  quality.set("Technology", nameOf(row.family));
   fill(quality, kRadioQuality, row);
   addNeighbours(message, row);
   auto throughput = message.addSection("Throughput");

@@ -16,6 +16,7 @@ namespace {
 using std::chrono::sys_days;
 using ::testing::Contains;
 using ::testing::ElementsAre;
+using ::testing::EndsWith;
 using ::testing::Not;
 using testing::TemporaryDirectory;
 
@@ -81,6 +82,30 @@ TEST_F(DriveTestLogTest, AMissingRequiredColumnIsAnError) {
     EXPECT_EQ(log.error().message,
               path + ": no drive-test log: there is no column \"" + name + "\"");
   }
+}
+
+TEST_F(DriveTestLogTest, AHintNamesWhatALogWasSavedAs) {
+  const std::string names = "Timestamp,NetworkMode,RSRP";
+  const auto problem = [this](const std::string& contents) {
+    return open(contents).error().message;
+  };
+  const auto inUtf16 = [](std::string_view text, bool isBigEndian) {
+    std::string result = isBigEndian ? "\xFE\xFF" : "\xFF\xFE";
+    for (const char c : text) result += isBigEndian ? std::string{'\0', c} : std::string{c, '\0'};
+    return result;
+  };
+  for (const std::string& text : {names, "\"" + names + "\""}) {
+    EXPECT_THAT(problem(inUtf16(text, true)),
+                EndsWith(": the file is in UTF-16: save it in UTF-8"));
+    EXPECT_THAT(problem(inUtf16(text, false)),
+                EndsWith(": the file is in UTF-16: save it in UTF-8"));
+  }
+  EXPECT_THAT(problem(inUtf16(names, false).substr(2)),
+              EndsWith("no column \"Timestamp\"; the file is in UTF-16: save it in UTF-8"));
+  EXPECT_THAT(problem("Timestamp;NetworkMode;RSRP\n"),
+              EndsWith("; its columns are separated by semicolons: save it with commas"));
+  EXPECT_THAT(problem("Timestamp\tNetworkMode\tRSRP\n"),
+              EndsWith("; its columns are separated by tabs: save it with commas"));
 }
 
 TEST_F(DriveTestLogTest, WhatIsNoLogIsRefused) {

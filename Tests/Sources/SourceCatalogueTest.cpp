@@ -5,6 +5,8 @@
 
 #include <memory>
 #include <string>
+#include <string_view>
+#include <vector>
 
 #include "Platform/Linux/LinuxPlatform.h"
 #include "Platform/Virtual/VirtualPlatform.h"
@@ -16,21 +18,24 @@
 namespace kestro {
 namespace {
 
+using ::testing::Contains;
 using ::testing::HasSubstr;
+using ::testing::Not;
 using testing::TemporaryDirectory;
 
 class SourceCatalogueTest : public ::testing::Test {
  protected:
   Result<std::unique_ptr<LogSource>> open(std::string_view text, std::string_view technology = "") {
     const auto request = parseSource(text, technology);
-    EXPECT_TRUE(request.has_value()) << request.error().message;
+    if (!request) return tl::unexpected(request.error());
     return openSource(*request, platform, report);
   }
 
   TemporaryDirectory directory;
   std::unique_ptr<PropertyListCoding> coding = createPropertyListCoding();
   VirtualPlatform platform{*coding};
-  SourceReporter report = [](std::string_view) {};
+  std::vector<std::string> reports;
+  SourceReporter report = [this](std::string_view line) { reports.emplace_back(line); };
 };
 
 TEST_F(SourceCatalogueTest, TheKindEndsAtTheFirstColon) {
@@ -121,6 +126,34 @@ TEST_F(SourceCatalogueTest, AutomaticMeansWhatASourceSaysItself) {
   EXPECT_EQ((*open("capture:" + capture, kAutomaticTechnology))->technology(), "UTRAN2");
   EXPECT_FALSE(open("stream:pipe", kAutomaticTechnology).has_value());
   EXPECT_FALSE(open("simulation", kAutomaticTechnology).has_value());
+}
+
+TEST_F(SourceCatalogueTest, ATechnologyThatAKindCannotSpeakIsWrongUsage) {
+  EXPECT_EQ(parseSource("simulation", kAutomaticTechnology).error().message,
+            "the source \"simulation\" cannot make auto messages, only IFX, Ondrel_GSM, "
+            "Ondrel_CDMA, LTE, UTRAN2");
+  EXPECT_EQ(parseSource("drive-test:x", "UTRAN2").error().message,
+            "the source \"drive-test\" cannot make UTRAN2 messages, only IFX, Ondrel_GSM, LTE, "
+            "auto");
+  EXPECT_EQ(parseSource("stream:-", kAutomaticTechnology).error().message,
+            "a stream does not say what it speaks; --technology must");
+  EXPECT_TRUE(parseSource("capture:x", kAutomaticTechnology));
+}
+
+TEST_F(SourceCatalogueTest, ADriveTestOfAnotherTechnologySaysSoAtOnce) {
+  const auto log = directory.write("a.csv", std::string_view("Timestamp,NetworkMode,RSRP\n"
+                                                             "2020.01.02_03.04.05,EDGE,-90\n"));
+  const std::string rest = "(with --technology=auto each row is what it was measured in)";
+  ASSERT_TRUE(open("drive-test:" + log, "LTE"));
+  EXPECT_THAT(reports, Contains(log +
+                                ": it begins with GSM rows, which are passed over: they are no "
+                                "LTE messages " +
+                                rest));
+  reports.clear();
+  for (const auto* technology : {"Ondrel_GSM", "IFX", "auto"}) {
+    ASSERT_TRUE(open("drive-test:" + log, technology));
+    EXPECT_THAT(reports, Not(Contains(HasSubstr("it begins with")))) << technology;
+  }
 }
 
 TEST_F(SourceCatalogueTest, FilesThatCannotBeUsedAreNamed) {

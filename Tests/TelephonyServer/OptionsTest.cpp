@@ -85,6 +85,10 @@ TEST(OptionsTest, WrongUsageIsStatusTwo) {
   EXPECT_EQ(refusal({"--source=film"}).exitStatus, 2);
   EXPECT_EQ(refusal({"--source=capture"}).exitStatus, 2);
   EXPECT_EQ(refusal({"--technology=5G"}).exitStatus, 2);
+  EXPECT_EQ(refusal({"--technology=auto"}).exitStatus, 2);
+  EXPECT_EQ(refusal({"--source=drive-test:a.csv", "--technology=UTRAN2"}).exitStatus, 2);
+  EXPECT_EQ(refusal({"--loop=5"}).exitStatus, 2);
+  EXPECT_EQ(refusal({"--name="}).exitStatus, 2);
   EXPECT_EQ(refusal({"--speed=0"}).exitStatus, 2);
   EXPECT_EQ(refusal({"--speed=-1"}).exitStatus, 2);
   EXPECT_EQ(refusal({"--speed=nan"}).exitStatus, 2);
