@@ -3,6 +3,10 @@
 
 #include <fmt/format.h>
 
+#include <QByteArray>
+#include <QFileInfo>
+#include <QImageWriter>
+#include <QList>
 #include <QString>
 #include <QStringList>
 #include <utility>
@@ -47,6 +51,15 @@ std::string sizeProblem(const std::string& text) {
                      kLargestSide);
 }
 
+/// A picture's form is its file's ending.
+std::string pictureProblem(const std::string& path) {
+  const QByteArray ending = QFileInfo(QString::fromStdString(path)).suffix().toLower().toLatin1();
+  const QList<QByteArray> endings = QImageWriter::supportedImageFormats();
+  if (endings.contains(ending)) return "";
+  return fmt::format("'{}' does not end as a picture's file does ({})", path,
+                     endings.join(", ").toStdString());
+}
+
 std::vector<OptionRow> windowOptions(Options& options) {
   return {
       {.name = "--size",
@@ -58,7 +71,8 @@ std::vector<OptionRow> windowOptions(Options& options) {
       {.name = "--screenshot",
        .value = "FILE",
        .help = "Write a picture of the window, end",
-       .target = &options.screenshot},
+       .target = &options.screenshot,
+       .problem = pictureProblem},
       {.name = "--after",
        .value = "SECONDS",
        .help = "How long to wait for the picture",

@@ -18,10 +18,12 @@
 #include "App/KestroApp.h"
 #include "App/Options.h"
 #include "Model/LastWords.h"
+#include "Options/ArgumentParser.h"
 #include "Platform/Bundle.h"
 #include "Platform/DemoServer.h"
 #include "Platform/Linux/LinuxPlatform.h"
 #include "Platform/TextSink.h"
+#include "Sources/SourceCatalogue.h"
 
 namespace kestro {
 namespace {
@@ -134,6 +136,12 @@ int runProgram(int argumentCount, char** arguments) {
   Options options;
   if (const auto status = Options::parse(*createBundle(), argumentCount, arguments, options))
     return *status;
+  if (!options.live.demoSource.empty()) {
+    if (const auto source = parseSource(options.live.demoSource, ""); !source) {
+      complain("--demo: " + source.error().message);
+      return kWrongUsage;
+    }
+  }
   if (!hasDisplay()) {
     complain("there is no display here; `kestro-cli watch` shows the same on a terminal");
     return kNothingDone;

@@ -3,9 +3,13 @@
 #pragma once
 
 #include <chrono>
+#include <cstdint>
+#include <limits>
+#include <optional>
 #include <string>
 #include <vector>
 
+#include "LogGenerator/Packets/PacketKind.h"
 #include "Options/CommandRow.h"
 
 namespace kestro {
@@ -19,6 +23,22 @@ inline constexpr const char* kTimesAndNumbers =
 
 /// A recorded capture, which must be given.
 [[nodiscard]] OptionRow captureArgument(std::string& path);
+
+/// Numbers of messages, both ends included.
+struct MessageNumbers {
+  std::uint64_t first = 1;
+  std::uint64_t last = std::numeric_limits<std::uint64_t>::max();
+
+  [[nodiscard]] bool contains(std::uint64_t number) const noexcept {
+    return number >= first && number <= last;
+  }
+};
+
+/// --message, which takes a number or two with a hyphen between them: "12", "3-7".
+[[nodiscard]] OptionRow messageOption(std::optional<MessageNumbers>& numbers);
+
+/// --code, which takes a log code in hexadecimal, with or without 0x.
+[[nodiscard]] OptionRow codeOption(std::optional<LogCode>& code);
 
 /// The names and explanations in a list of formats.
 template <class Formats>

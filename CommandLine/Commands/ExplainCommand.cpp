@@ -23,8 +23,6 @@
 namespace kestro {
 namespace {
 
-constexpr LogCode kHighestCode = 0xFFFFFF;
-
 constexpr const char* kExplainText =
     R"(For every packet: time, log code, name and length; then for every value the section that takes it,
 its row in a list, its key, the bytes that it was read from with their offset, the bits of the
@@ -41,7 +39,7 @@ constexpr const char* kExplainExamples =
 
 struct ExplainOptions {
   std::string capture;
-  std::optional<std::uint64_t> message;  ///< absent: every one
+  std::optional<MessageNumbers> messages;  ///< absent: every one
   std::optional<LogCode> code;
   std::string format;
 };
@@ -73,11 +71,11 @@ class Explanation {
  private:
   [[nodiscard]] bool isWanted(std::uint64_t nextMessage) const {
     if (!_output.failureMessage().empty()) return false;
-    return !_options.message || nextMessage <= *_options.message;
+    return !_options.messages || nextMessage <= _options.messages->last;
   }
 
   void explain(const RecordedMessage& message) {
-    if (_options.message && message.number != _options.message) return;
+    if (_options.messages && !_options.messages->contains(message.number)) return;
     PacketHead head{
         .message = message.number, .time = message.time, .packet = packetOfMessage(message.bytes)};
     head.prefixLength = message.bytes.size() - head.packet.size();
@@ -108,7 +106,7 @@ class Explanation {
 
   [[nodiscard]] int finish() {
     if (_feed.status() == kExitNothingDone) return kExitNothingDone;
-    const bool isChosen = _options.message || _options.code;
+    const bool isChosen = _options.messages || _options.code;
     if (isChosen && !_hasBegun && _output.failureMessage().empty()) return fail(nothingFound());
     begin();
     _writer->finish();
@@ -119,7 +117,10 @@ class Explanation {
 
   [[nodiscard]] std::string nothingFound() const {
     std::string what = "no message";
-    if (_options.message) what += fmt::format(" {}", *_options.message);
+    if (const auto& numbers = _options.messages) {
+      what += fmt::format(" {}", numbers->first);
+      if (numbers->last != numbers->first) what += fmt::format(" to {}", numbers->last);
+    }
     if (_options.code) what += fmt::format(" of log code {}", logCodeText(*_options.code));
     return fmt::format("{}: there is {}", _options.capture, what);
   }
@@ -158,17 +159,8 @@ CommandRow explainCommand() {
   const auto options = std::make_shared<ExplainOptions>();
   return {.name = "explain",
           .help = "Tell which bytes every value of a recorded packet comes from",
-          .options = {captureArgument(options->capture),
-                      {.name = "--message",
-                       .value = "N",
-                       .help = "Only the message of this number",
-                       .target = &options->message,
-                       .range = NumberRange{1}},
-                      {.name = "--code",
-                       .value = "CODE",
-                       .help = "Only packets of this log code",
-                       .target = &options->code,
-                       .range = NumberRange{0, kHighestCode}},
+          .options = {captureArgument(options->capture), messageOption(options->messages),
+                      codeOption(options->code),
                       formatOption(options->format, formatRows(explainFormats()))},
           .sections = {{.text = kExplainText},
                        {.title = "Formats",

@@ -14,6 +14,7 @@
 #include "Platform/DemoServer.h"
 #include "Platform/MainQueue.h"
 #include "Platform/SystemLog.h"
+#include "Sources/SourceCatalogue.h"
 
 namespace kestro {
 namespace {
@@ -95,6 +96,10 @@ int runLive(const LiveOptions& options, const LiveTaskMaker& makeTask) {
   // behind.
   std::signal(SIGPIPE, SIG_IGN);
   if (options.demoSource.empty()) return Run(options, makeTask, nullptr).untilFinished();
+  if (const auto source = parseSource(options.demoSource, ""); !source) {
+    complain("--demo: " + source.error().message);
+    return kExitWrongUsage;
+  }
   const auto demo = startDemoServer(options.demoSource);
   if (!demo) {
     complain(demo.error().message);

@@ -114,6 +114,15 @@ TEST_F(ProgramTest, APictureThatCannotBeWrittenSaysSo) {
   EXPECT_THAT(kestro->errors(), EndsWith("kestro: cannot write the picture /nowhere/a.png\n"));
 }
 
+TEST_F(ProgramTest, WrongUsageIsRefusedAtOnce) {
+  for (const char* wrong : {"--screenshot=/tmp/a.bogus", "--screenshot=/tmp/a", "--demo=nonsense:x",
+                            "--after=nan", "--server="}) {
+    const auto kestro = startKestro({"--screenshot=" + folder("a.png"), wrong});
+    EXPECT_EQ(kestro->wait(), 2) << wrong;
+    EXPECT_THAT(kestro->errors(), HasSubstr(std::string(wrong).substr(0, 6)));
+  }
+}
+
 TEST_F(ProgramTest, ADemoThatCannotStartSaysWhy) {
   const auto kestro = startKestro({"--demo=capture:/nowhere.pcap"});
   EXPECT_EQ(kestro->wait(), 1);

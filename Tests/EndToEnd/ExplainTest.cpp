@@ -194,9 +194,18 @@ TEST_F(ExplainTest, ChoosesOneMessage) {
   EXPECT_THAT(outcome.output, Not(HasSubstr("Message 3")));
 }
 
+TEST_F(ExplainTest, ChoosesSeveralMessages) {
+  write({packet(0xB0C1), packet(0xB0C2), packet(0xB0C1), packet(0xB0C2)});
+  const Outcome outcome = explain({"--message=2-3"});
+  EXPECT_EQ(outcome.status, 0);
+  EXPECT_THAT(outcome.output, StartsWith("Message 2  "));
+  EXPECT_THAT(outcome.output, HasSubstr("Message 3  "));
+  EXPECT_THAT(outcome.output, Not(HasSubstr("Message 4")));
+}
+
 TEST_F(ExplainTest, ChoosesOneCode) {
   write({packet(0xB0C1), packet(0xB0C2), packet(0xB0C1)});
-  for (const char* code : {"--code=0xB0C1", "--code=45249"}) {
+  for (const char* code : {"--code=0xB0C1", "--code=b0c1"}) {
     const Outcome outcome = explain({code, "--format=json"});
     EXPECT_EQ(outcome.status, 0);
     const Json messages = Json::parse(outcome.output)["messages"];
@@ -207,8 +216,9 @@ TEST_F(ExplainTest, ChoosesOneCode) {
 
 TEST_F(ExplainTest, WhatIsNotThereIsAnError) {
   write({packet(0xB0C1)});
-  for (const auto& [option, what] : {std::pair("--message=2", "no message 2"),
-                                     std::pair("--code=7", "no message of log code 0x0007")}) {
+  for (const auto& [option, what] :
+       {std::pair("--message=2", "no message 2"), std::pair("--message=2-3", "no message 2 to 3"),
+        std::pair("--code=7", "no message of log code 0x0007")}) {
     const Outcome outcome = explain({option, "--format=json"});
     EXPECT_EQ(outcome.status, 1);
     EXPECT_THAT(outcome.output, IsEmpty());
