@@ -72,6 +72,8 @@ void LogGenerator::explainMessage(ByteView /*message*/, const ExplainVisitor& /*
 
 void LogGenerator::catalogue(const CatalogueVisitor& /*visit*/) const {}
 
+void LogGenerator::outline(const OutlineVisitor& /*visit*/) const {}
+
 std::span<const std::string_view> LogGenerator::technologies() { return kTechnologyNames; }
 
 std::unique_ptr<LogGenerator> LogGenerator::generatorFromTechnology(

@@ -10,6 +10,7 @@
 #include "LogGenerator/GeneratorServices.h"
 #include "LogGenerator/Packets/Catalogue.h"
 #include "LogGenerator/Packets/Explain.h"
+#include "LogGenerator/Packets/Outline.h"
 #include "Platform/Bytes.h"
 #include "Platform/PropertyList.h"
 
@@ -70,6 +71,11 @@ class LogGenerator {
   /// Visits what the generator's sections take from each log code, code by code in the order of the
   /// start command. Nothing for channels without log codes.
   virtual void catalogue(const CatalogueVisitor& visit) const;
+
+  /// Visits what `explainMessage` finds in packets of each log code, code by code in the order of
+  /// the start command, and taker by taker in the order in which a packet is explained. Nothing for
+  /// channels without log codes. Names are valid as long as the generator.
+  virtual void outline(const OutlineVisitor& visit) const;
 
   /// What a snapshot stores: an array that the caller owns, beginning with the history's entries.
   [[nodiscard]] virtual Array getSaveContentsFromState(const Dictionary& state) = 0;

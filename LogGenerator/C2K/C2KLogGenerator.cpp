@@ -4,6 +4,8 @@
 #include <algorithm>
 #include <array>
 #include <iterator>
+#include <utility>
+#include <variant>
 
 #include "LogGenerator/C2K/C2KState.h"
 #include "LogGenerator/C2K/EVDOPilots.h"
@@ -47,6 +49,25 @@ void visitAtPlaces(const TemplatePlaces& places, ExplainedValue value,
     visit(value);
   }
   if (shownAt.empty()) visit(value);
+}
+
+std::string_view& lookupNameOf(OutlinedValue& value) { return value.key; }
+std::string_view& lookupNameOf(OutlinedTable& table) { return table.list; }
+std::string_view& lookupNameOf(OutlinedSizedRecords& records) { return records.list; }
+
+/// The part as the display shows it: once for each place of its name.
+void appendAtPlaces(const TemplatePlaces& places, const OutlinedPart& part,
+                    std::vector<OutlinedPart>& parts) {
+  const auto append = [&](auto known) {
+    const std::span<const DisplayPlace> shownAt = places.of(lookupNameOf(known));
+    for (const DisplayPlace& place : shownAt) {
+      known.section = place.section;
+      lookupNameOf(known) = place.key;
+      parts.emplace_back(known);
+    }
+    if (shownAt.empty()) parts.emplace_back(known);
+  };
+  std::visit(append, part);
 }
 
 /// What the catalogue knows of a lookup name that the display shows as `key`: the rows of the list
@@ -162,6 +183,16 @@ void C2KLogGenerator::catalogue(const CatalogueVisitor& visit) const {
   for (const auto& parser : _parsers) {
     const CodeEntries found(*parser, places());
     for (const CatalogueEntry& entry : found.entries()) visit(entry);
+  }
+}
+
+void C2KLogGenerator::outline(const OutlineVisitor& visit) const {
+  for (const auto& parser : _parsers) {
+    OutlinedReading reading = parser->outline();
+    std::vector<OutlinedPart> parts;
+    for (const OutlinedPart& part : reading.parts) appendAtPlaces(places(), part, parts);
+    reading.parts = std::move(parts);
+    visit({.code = parser->reading().packet.code, .readings = {std::move(reading)}});
   }
 }
 

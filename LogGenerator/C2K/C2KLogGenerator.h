@@ -33,6 +33,7 @@ class C2KLogGenerator : public OndrelLogGenerator {
   [[nodiscard]] std::span<const std::string_view> stateKeys() const override;
   void explainMessage(ByteView message, const ExplainVisitor& visit) const override;
   void catalogue(const CatalogueVisitor& visit) const override;
+  void outline(const OutlineVisitor& visit) const override;
 
   /// The state's display, built from the template and stored with its lookup table when there is
   /// none; null when there is no template either.

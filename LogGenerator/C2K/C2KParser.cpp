@@ -27,6 +27,20 @@ void C2KParser::explainTaken(const TakenPacket& packet, const ExplainVisitor& vi
   Explainer(reading().packet.name, packet.bytes, visit).reading(reading());
 }
 
+OutlinedReading C2KParser::outline() const {
+  OutlinedReading outlined{
+      .packetName = reading().packet.name,
+      .requirements = _rules.requirements,
+      .requiredRecords = reading().lists.empty() ? nullptr : &reading().lists[0].table};
+  // The least length is one of the requirements, where it is one.
+  outlineTaken(outlined.parts);
+  return outlined;
+}
+
+void C2KParser::outlineTaken(std::vector<OutlinedPart>& parts) const {
+  appendReading(reading().packet.name, reading(), parts);
+}
+
 StoredFields::StoredFields(std::span<const Field> fields) {
   for (const Field& field : fields) {
     if (field.text.kind == TextRule::Kind::Hidden) continue;

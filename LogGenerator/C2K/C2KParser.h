@@ -10,6 +10,7 @@
 #include "LogGenerator/C2K/PacketCheck.h"
 #include "LogGenerator/Packets/Decode.h"
 #include "LogGenerator/Packets/Explain.h"
+#include "LogGenerator/Packets/Outline.h"
 #include "LogGenerator/Packets/Requirement.h"
 #include "LogGenerator/Packets/Section.h"
 #include "Platform/PropertyList.h"
@@ -47,6 +48,9 @@ class C2KParser {
   /// and the lookup name as its key or, for a row, its list. Nothing for a packet that is refused.
   void explain(PacketView packet, const ExplainVisitor& visit) const;
 
+  /// What `explain` visits, under the same names.
+  [[nodiscard]] OutlinedReading outline() const;
+
   /// The names of all values that it may store, in that order.
   [[nodiscard]] virtual std::vector<std::string_view> lookupNames() const;
 
@@ -57,6 +61,8 @@ class C2KParser {
   /// explained is the reading.
   virtual void take(const TakenPacket& packet, C2KOutput& output) = 0;
   virtual void explainTaken(const TakenPacket& packet, const ExplainVisitor& visit) const;
+  /// What `explainTaken` visits.
+  virtual void outlineTaken(std::vector<OutlinedPart>& parts) const;
 
  private:
   PacketRules _rules;

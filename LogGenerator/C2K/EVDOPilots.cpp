@@ -14,7 +14,7 @@ void writeEnergy(std::span<const std::int64_t> raw, TextBuffer& text) {
 
 constexpr Field kActivePilot[] = {
     {kPilotPNOffset, u16(0), decimal()},
-    {kPilotEnergy, u16(2), computed(writeEnergy)},
+    {kPilotEnergy, u16(2), computed(writeEnergy, "writeEnergy")},
 };
 static_assert(isLayout(kActivePilot));
 
@@ -34,7 +34,7 @@ constexpr std::int64_t kUnusedFinger = 0xFFFF;
 
 constexpr Field kFinger[] = {
     {kPilotPNOffset, kFingerPN, decimal()},
-    {kPilotEnergy, u16(6), computed(writeEnergy)},
+    {kPilotEnergy, u16(6), computed(writeEnergy, "writeEnergy")},
 };
 static_assert(isLayout(kFinger));
 

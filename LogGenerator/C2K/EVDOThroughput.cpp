@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <array>
 #include <string>
+#include <utility>
 
 namespace kestro {
 namespace {
@@ -155,6 +156,13 @@ void EVDOThroughput::explainTaken(const TakenPacket& packet, const ExplainVisito
   }
   rate.text = kSinceLastPacket;
   visit(rate);
+}
+
+void EVDOThroughput::outlineTaken(std::vector<OutlinedPart>& parts) const {
+  const Field rate(_layout.rateName, _layout.sequenceNumber, named({}, kSinceLastPacket));
+  OutlinedValue value = outlinedValue(reading().packet.name, rate.key, rate);
+  for (const SentCounter& counter : _layout.counters) value.places.push_back(counter.place());
+  parts.emplace_back(std::move(value));
 }
 
 }  // namespace kestro

@@ -55,6 +55,7 @@ class EVDOThroughput : public C2KParser {
  protected:
   void take(const TakenPacket& packet, C2KOutput& output) override;
   void explainTaken(const TakenPacket& packet, const ExplainVisitor& visit) const override;
+  void outlineTaken(std::vector<OutlinedPart>& parts) const override;
 
  private:
   /// One value of a packet: its keys in the state, and in the extra information as the newest and

@@ -18,7 +18,8 @@ Value percentText(const NumberFormat& format, float rate) {
 }
 
 /// The average depends on all frames.
-constexpr std::string_view kWithEarlierPackets = "(with the packets before)";
+constexpr Field kExplainedRate[] = {
+    {kFrameErrorRateName, kIsBadFrame, named({}, "(with the packets before)")}};
 
 constexpr Requirement kTrafficFrameRequirements[] = {
     kMinimumLength,
@@ -69,12 +70,13 @@ void TrafficFrame::take(const TakenPacket& packet, C2KOutput& output) {
 }
 
 void TrafficFrame::explainTaken(const TakenPacket& packet, const ExplainVisitor& visit) const {
-  const std::string_view section = reading().packet.name;
-  const Explainer explainer(section, packet.bytes, visit);
-  visit({.section = section,
-         .key = kFrameErrorRateName,
-         .sources = {explainer.source(kIsBadFrame, {.here = packet.subPackets[0]})},
-         .text = kWithEarlierPackets});
+  Explainer(reading().packet.name, packet.bytes, visit)
+      .fields(kExplainedRate, {.here = packet.subPackets[0]});
+}
+
+void TrafficFrame::outlineTaken(std::vector<OutlinedPart>& parts) const {
+  parts.emplace_back(outlinedValue(reading().packet.name, kFrameErrorRateName, kExplainedRate[0],
+                                   {.here = kTrafficDemodulationId}));
 }
 
 }  // namespace kestro

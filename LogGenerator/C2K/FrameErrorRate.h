@@ -52,6 +52,7 @@ class TrafficFrame : public C2KParser {
  protected:
   void take(const TakenPacket& packet, C2KOutput& output) override;
   void explainTaken(const TakenPacket& packet, const ExplainVisitor& visit) const override;
+  void outlineTaken(std::vector<OutlinedPart>& parts) const override;
 
  private:
   LookupName _rate;

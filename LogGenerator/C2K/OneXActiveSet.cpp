@@ -2,6 +2,7 @@
 #include "LogGenerator/C2K/OneXActiveSet.h"
 
 #include <cmath>
+#include <utility>
 
 #include "LogGenerator/Packets/NumberFormat.h"
 
@@ -25,12 +26,14 @@ constexpr Field kActiveSetFields[] = {
 };
 static_assert(isLayout(kActiveSetFields));
 
-/// A pilot's record: so many bytes, and so many for each of its values before the energy, then
-/// filled up to a multiple of the alignment.
-constexpr std::size_t kFixedPilotSize = 12;
-constexpr std::size_t kSizePerValue = 6;
-constexpr std::size_t kEnergyOffsetPerValue = 4;
-constexpr std::size_t kPilotAlignment = 4;
+constexpr Field kPilot[] = {
+    {kPilotPNOffset, kOneXPilotPN, decimal()},
+    {kPilotEnergy,
+     {kOneXPilotEnergy.ofTwin(), kOneXPilotPN.shared(), kAccumulationLength.ofPacket(),
+      kFactor.ofPacket(), kExponent.ofPacket(), kReferencePN.ofPacket()},
+     computed(nullptr, "energyText")},
+};
+static_assert(isLayout(kPilot));
 
 /// Whatever is weaker, or no number at all, shows as this: -50 dB.
 constexpr double kWeakestEnergy = 0.00001;
@@ -39,15 +42,23 @@ constexpr double kWeakestEnergy = 0.00001;
 
 constinit const std::span<const Field> kOneXActiveSetFields = kActiveSetFields;
 
+constexpr SizedRecords kOneXPilots = {.count = kPilotCount,
+                                      .valueCount = kPerPilotCount,
+                                      .fixedSize = 12,
+                                      .sizePerValue = 6,
+                                      .shiftPerValue = 4,
+                                      .alignment = 4,
+                                      .fields = kPilot};
+
 OneXActiveSet::OneXActiveSet(PacketView packet, std::size_t start)
     : _packet(packet),
       _position{.here = start},
       _pilotCount(readBits(kPilotCount, packet, _position)),
       _referencePN(readBits(kReferencePN, packet, _position)) {
   const std::size_t values = readBits(kPerPilotCount, packet, _position);
-  _variableSize = kEnergyOffsetPerValue * values;
-  const std::size_t size = kFixedPilotSize + kSizePerValue * values;
-  _stride = (size + kPilotAlignment - 1) / kPilotAlignment * kPilotAlignment;
+  _variableSize = kOneXPilots.shiftPerValue * values;
+  const std::size_t size = kOneXPilots.fixedSize + kOneXPilots.sizePerValue * values;
+  _stride = (size + kOneXPilots.alignment - 1) / kOneXPilots.alignment * kOneXPilots.alignment;
   const double length = readBits(kAccumulationLength, packet, _position);
   const double factor = readBits(kFactor, packet, _position);
   const int exponent = static_cast<int>(readBits(kExponent, packet, _position));
@@ -98,18 +109,25 @@ void OneXActiveSet::explain(std::string_view section, std::string_view list,
 void OneXActiveSet::explainPilot(const Explainer& explainer, ExplainedValue value,
                                  const ExplainVisitor& visit) const {
   const std::size_t index = *value.row;
-  const ExplainedSource pn = explainer.source(kOneXPilotPN, pilotAt(index));
   value.key = kPilotPNOffset;
-  value.sources = {pn};
+  value.sources = sources(explainer, kPilot[0], index);
   value.text = std::to_string(pnOffset(index));
   visit(value);
   value.key = kPilotEnergy;
-  value.sources = {explainer.source(kOneXPilotEnergy, pilotEnergyAt(index)), pn};
-  for (const Place& place : {kAccumulationLength, kFactor, kExponent, kReferencePN}) {
-    value.sources.push_back(explainer.source(place, _position));
-  }
+  value.sources = sources(explainer, kPilot[1], index);
   value.text = energyText(index);
   visit(value);
+}
+
+std::vector<ExplainedSource> OneXActiveSet::sources(const Explainer& explainer, const Field& field,
+                                                    std::size_t index) const {
+  std::vector<ExplainedSource> sources;
+  for (Place place : field.allPlaces()) {
+    const RecordPosition origins[] = {pilotAt(index), _position, pilotEnergyAt(index)};
+    const auto origin = static_cast<std::size_t>(std::exchange(place.origin, Origin::Here));
+    sources.push_back(explainer.source(place, origins[origin]));
+  }
+  return sources;
 }
 
 }  // namespace kestro

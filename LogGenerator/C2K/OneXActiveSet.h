@@ -5,10 +5,13 @@
 #include <cstddef>
 #include <cstdint>
 #include <span>
+#include <string_view>
+#include <vector>
 
 #include "LogGenerator/C2K/PilotList.h"
 #include "LogGenerator/Packets/Explain.h"
 #include "LogGenerator/Packets/Field.h"
+#include "LogGenerator/Packets/Outline.h"
 #include "LogGenerator/Packets/Walk.h"
 #include "Platform/PropertyList.h"
 
@@ -20,6 +23,9 @@ extern const std::span<const Field> kOneXActiveSetFields;
 // In each pilot's record.
 inline constexpr Place kOneXPilotPN = u16(12);
 inline constexpr Place kOneXPilotEnergy = u16(24);  ///< behind the record's variable part
+
+/// The pilots' records. Energies are not made by a rule, but by `OneXActiveSet::energyText`.
+extern const SizedRecords kOneXPilots;
 
 /// The pilots of a sub-packet at a place in its packet. The packet is borrowed; whatever lies past
 /// its end reads as 0.
@@ -48,6 +54,9 @@ class OneXActiveSet {
   [[nodiscard]] double energy(std::size_t index) const noexcept;
   void explainPilot(const Explainer& explainer, ExplainedValue value,
                     const ExplainVisitor& visit) const;
+  /// Where the places of one of the pilots' fields lie.
+  [[nodiscard]] std::vector<ExplainedSource> sources(const Explainer& explainer, const Field& field,
+                                                     std::size_t index) const;
 
   PacketView _packet;
   RecordPosition _position;

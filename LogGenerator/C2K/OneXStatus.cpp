@@ -42,8 +42,15 @@ static_assert(isLayout(kOneXFields));
 
 constexpr std::string_view kActiveSetName = "k1xActiveSetInfo";
 
-/// What was in the traffic that ended is not in this packet.
-constexpr std::string_view kFromEarlierPackets = "(from the packets before)";
+/// What was in the traffic that ended is not in this packet. One of these fields, or none, is
+/// shown: in traffic there is no such rate.
+constexpr TextRule kFromEarlierPackets = named({}, "(from the packets before)");
+constexpr Field kOldErrorRate[] = {
+    {kFrameErrorRateName, kOneXState, kFromEarlierPackets, when(between(kOneXState, 0, 7))},
+    {kFrameErrorRateName, kOneXState, kFromEarlierPackets, when(between(kOneXState, 9, 255))},
+};
+static_assert(isLayout(kOldErrorRate) && excludeEachOther(kInTraffic, kOldErrorRate[0].condition) &&
+              excludeEachOther(kInTraffic, kOldErrorRate[1].condition));
 
 constexpr std::uint8_t kOneXSubPackets[] = {kOneXStateId, kOneXRadioId, kOneXActiveSetId,
                                             kOneXFingersId};
@@ -99,11 +106,27 @@ void OneXStatus::explainTaken(const TakenPacket& packet, const ExplainVisitor& v
   const Explainer explainer(section, packet.bytes, visit);
   explainer.fields(kOneXFields, positionIn(packet));
   OneXActiveSet(packet.bytes, activeSetIn(packet)).explain(section, kActiveSetName, visit);
-  if (holds(kInTraffic, packet.bytes, positionIn(packet))) return;
-  visit({.section = section,
-         .key = kFrameErrorRateName,
-         .sources = {explainer.source(kOneXState, positionIn(packet))},
-         .text = kFromEarlierPackets});
+  for (const Field& rate : kOldErrorRate) {
+    if (!holds(rate.condition, packet.bytes, positionIn(packet))) continue;
+    explainer.fields({&rate, 1}, positionIn(packet));
+  }
+}
+
+void OneXStatus::outlineTaken(std::vector<OutlinedPart>& parts) const {
+  const std::string_view section = reading().packet.name;
+  const OutlineAnchor radioAndState{.here = kOneXRadioId, .twin = kOneXStateId};
+  const auto append = [&](std::span<const Field> fields, const OutlineAnchor& anchor) {
+    for (const Field& field : fields) {
+      parts.emplace_back(outlinedValue(section, field.key, field, anchor));
+    }
+  };
+  append(kOneXFields, radioAndState);
+  append(kOneXActiveSetFields, {.here = kOneXActiveSetId});
+  parts.emplace_back(OutlinedSizedRecords{.section = section,
+                                          .list = kActiveSetName,
+                                          .records = &kOneXPilots,
+                                          .subPacket = kOneXActiveSetId});
+  append(kOldErrorRate, radioAndState);
 }
 
 }  // namespace kestro

@@ -35,6 +35,7 @@ class OneXStatus : public C2KParser {
  protected:
   void take(const TakenPacket& packet, C2KOutput& output) override;
   void explainTaken(const TakenPacket& packet, const ExplainVisitor& visit) const override;
+  void outlineTaken(std::vector<OutlinedPart>& parts) const override;
 
  private:
   void storeOldErrorRate(C2KOutput& output);

@@ -38,8 +38,8 @@ void writeIdentity(std::span<const std::int64_t> raw, TextBuffer& text) {
 constexpr Field kSystemParametersFields[] = {
     {"Version", kVersion, hidden()},
     {"k1xRoamingHome", s32(42), namedElse(kRoamingIndicators, "ERI - %d")},
-    {"kSystemId", {kSystemType, u16(50)}, computed(writeIdentity)},
-    {"kNetworkId", {kSystemType, u16(52)}, computed(writeIdentity)},
+    {"kSystemId", {kSystemType, u16(50)}, computed(writeIdentity, "writeIdentity")},
+    {"kNetworkId", {kSystemType, u16(52)}, computed(writeIdentity, "writeIdentity")},
     {"kPacketZoneId", u8(131), decimal()},
     {"kBaseId", u16(184), decimal()},
     {"kProtocolRevision", u8(133), decimal()},

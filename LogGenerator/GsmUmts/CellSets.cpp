@@ -43,10 +43,10 @@ constexpr Field kSetCell[] = {
     {"Set Type", kSetType, hidden()},
     {"RSCP",
      {kReceiveLevel.ofPacket(), kFirstEnergy, kSecondEnergy, kThirdEnergy},
-     decimal("%d dB").of(receivedCodePower)},
+     decimal("%d dB").of(receivedCodePower, "receivedCodePower")},
     {"Energy Per Chip",
      {kFirstEnergy, kSecondEnergy, kThirdEnergy},
-     decimal("%d dB").of(energyPerChip)},
+     decimal("%d dB").of(energyPerChip, "energyPerChip")},
 };
 static_assert(isLayout(kSetCell));
 

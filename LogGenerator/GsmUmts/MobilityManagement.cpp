@@ -131,8 +131,12 @@ constexpr Place highDigit(unsigned offset) { return u8(offset).bits(4, 7); }
 
 // The service type, the packet's first, is the display's last.
 constexpr Field kServingPLMN[] = {
-    {"Mobile Country Code", {lowDigit(15), highDigit(15), highDigit(16)}, computed(writeDigits)},
-    {"Mobile Network Code", {lowDigit(17), highDigit(17), lowDigit(16)}, computed(writeDigits)},
+    {"Mobile Country Code",
+     {lowDigit(15), highDigit(15), highDigit(16)},
+     computed(writeDigits, "writeDigits")},
+    {"Mobile Network Code",
+     {lowDigit(17), highDigit(17), lowDigit(16)},
+     computed(writeDigits, "writeDigits")},
     {"Location Area Code", u16(18).bigEndian(), decimal()},
     {"Routing Area Code", u8(20), decimal()},
     {"Service Type", u8(14), named(kServiceTypes, kUnknown)},
@@ -152,8 +156,8 @@ static_assert(isLayout(kEquivalentPLMNCount));
 
 // Entries stand three bytes apart, yet each is read over six: it reaches into the next one.
 constexpr Field kEquivalentPLMN[] = {
-    {"Mobile Country Code", {u8(0), u8(2), u8(4)}, decimal().of(numberOfDigits)},
-    {"Mobile Network Code", {u8(1), u8(3), u8(5)}, decimal().of(numberOfDigits)},
+    {"Mobile Country Code", {u8(0), u8(2), u8(4)}, decimal().of(numberOfDigits, "numberOfDigits")},
+    {"Mobile Network Code", {u8(1), u8(3), u8(5)}, decimal().of(numberOfDigits, "numberOfDigits")},
 };
 static_assert(isLayout(kEquivalentPLMN));
 

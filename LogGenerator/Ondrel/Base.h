@@ -13,6 +13,7 @@
 #include "LogGenerator/GeneratorServices.h"
 #include "LogGenerator/Packets/Catalogue.h"
 #include "LogGenerator/Packets/Explain.h"
+#include "LogGenerator/Packets/Outline.h"
 #include "LogGenerator/Packets/Packet.h"
 #include "LogGenerator/Packets/Section.h"
 #include "Platform/PropertyList.h"
@@ -68,14 +69,15 @@ class Base {
                              const ExplainVisitor& visit) const = 0;
   /// What the decoder takes from a code that it subscribes to.
   [[nodiscard]] virtual CatalogueEntry catalogueCode(LogCode code) const = 0;
+  /// What `explainPacket` visits in packets of a code that it subscribes to.
+  [[nodiscard]] virtual Outline outlineCode(LogCode code) const = 0;
 
   /// Makes `section` the container that the decoder writes into.
   void updateSectionRef(const Value& section);
   /// Appends the decoder to the list of each of its codes.
   void updateLogCodeDict(CodeDictionary& codes);
 
-  /// Whole dB of a linear Ec/N0 as the baseband reports it. A table, not a formula: its irregular
-  /// steps, the two rows of -31 and the 0 for very small values are the table's own.
+  /// Whole dB of a linear Ec/N0, by the table in EcnoTable.h.
   [[nodiscard]] static std::int16_t lookUpECNO(std::uint32_t linear) noexcept;
 
   /// Removes all elements, under the array lock.

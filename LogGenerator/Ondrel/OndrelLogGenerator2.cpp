@@ -91,6 +91,14 @@ void OndrelLogGenerator2::catalogue(const CatalogueVisitor& visit) const {
   }
 }
 
+void OndrelLogGenerator2::outline(const OutlineVisitor& visit) const {
+  if (!_cIndex) return;
+  for (const std::string& key : _cIndex->getAllLogCodes()) {
+    const LogCode code = codeOfKey(key);
+    for (const Base* subscriber : subscribersOf(code)) visit(subscriber->outlineCode(code));
+  }
+}
+
 Dictionary OndrelLogGenerator2::getStartCommand() const {
   Array logCodes;
   Array extraCodes;

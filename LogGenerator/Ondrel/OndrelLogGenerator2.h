@@ -28,6 +28,7 @@ class OndrelLogGenerator2 : public OndrelLogGenerator {
   [[nodiscard]] std::span<const std::string_view> stateKeys() const override;
   void explainMessage(ByteView message, const ExplainVisitor& visit) const override;
   void catalogue(const CatalogueVisitor& visit) const override;
+  void outline(const OutlineVisitor& visit) const override;
 
   /// Frames one message and calls the subscribers of its code. Messages of fewer than 13 bytes are
   /// ignored, those of an unknown type dropped with a line.

@@ -25,6 +25,9 @@ class SectionDecoder : public Base, protected FieldSupplier {
   void explainPacket(const Packet& packet, LogCode code,
                      const ExplainVisitor& visit) const override;
   [[nodiscard]] CatalogueEntry catalogueCode(LogCode code) const override;
+  [[nodiscard]] Outline outlineCode(LogCode code) const override {
+    return outlineSection(_section, code);
+  }
 
  protected:
   /// Decodes a code that has no reading; false when the code is unknown to the decoder too.

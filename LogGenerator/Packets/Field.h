@@ -127,16 +127,20 @@ struct TextRule {
   std::string_view otherName{};  ///< for values outside `names`; empty: `format` shows them
   ComputedText computed = nullptr;
   ComputedNumber number = nullptr;
+  /// What readers of packets in other languages call their own `computed` or `number`.
+  std::string_view functionName{};
   bool hasAbsentValue = false;
   std::int64_t absentValue = 0;
   std::string_view absentText{};
 
   bool operator==(const TextRule&) const = default;
 
-  /// Shows what `function` makes of all the field's places, as if it were the raw value.
-  [[nodiscard]] constexpr TextRule of(ComputedNumber function) const {
+  /// Shows what `function` makes of all the field's places, as if it were the raw value. `name` is
+  /// the function's.
+  [[nodiscard]] constexpr TextRule of(ComputedNumber function, std::string_view name = {}) const {
     TextRule rule = *this;
     rule.number = function;
+    rule.functionName = name;
     return rule;
   }
 
@@ -177,9 +181,9 @@ struct TextRule {
   return {.kind = TextRule::Kind::Named, .format = other, .names = names};
 }
 
-/// What `function` makes of all the field's places.
-[[nodiscard]] constexpr TextRule computed(ComputedText function) {
-  return {.kind = TextRule::Kind::Computed, .computed = function};
+/// What `function` makes of all the field's places. `name` is the function's.
+[[nodiscard]] constexpr TextRule computed(ComputedText function, std::string_view name = {}) {
+  return {.kind = TextRule::Kind::Computed, .computed = function, .functionName = name};
 }
 
 /// An array: each place as a decimal number.

@@ -137,6 +137,7 @@ TextCache* TextCache::forField(const Field& field) {
   if (!place) return nullptr;
   CacheKey key{.rule = field.text, .bitCount = place->bitCount, .isSigned = place->isSigned};
   key.rule.number = nullptr;
+  key.rule.functionName = {};
   static std::deque<KnownCache> caches;
   const auto known = std::ranges::find(caches, key, &KnownCache::key);
   if (known != caches.end()) return &known->cache;
