@@ -12,6 +12,9 @@ KINDS = (
     ("system log", r"syslog\.h"),
     ("sockets", r"sys/(socket|un)\.h|netinet/.*|arpa/.*|netdb\.h|linux/.*"),
     ("pcap", r"pcap(/.*)?(\.h)?"),
+    ("xml", r"expat\.h"),
+    ("databases", r"sqlite3\.h"),
+    ("digests", r"sha2\.h"),
     ("command lines", r"CLI/.*"),
     ("json", r"nlohmann/.*"),
     ("tests", r"(gtest|gmock)/.*"),
@@ -42,7 +45,7 @@ class Room:
 _SOURCES = ("LogGenerator", "Recordings", "Platform")
 _MODEL = ("LogGenerator", "Recordings", "Platform")
 _SERVER = ("Sources", "Options", *_SOURCES)
-_COMMAND_LINE = ("Model", "Options", *_SERVER)
+_COMMAND_LINE = ("Measurements", "Model", "Options", *_SERVER)
 _FORMATS = ("CommandLine", "CommandLine/Formats", *_COMMAND_LINE)
 _TERMINAL = ("CommandLine/Terminal", *_FORMATS)
 _APP = ("Model", "Options", *_SOURCES, "Sources")
@@ -61,6 +64,9 @@ ROOMS = {
     ),
     "LogGenerator": Room(("Platform",), CORE),
     "Recordings": Room(("Platform",), HOSTED | {"pcap"}),
+    "Measurements": Room(
+        ("LogGenerator", "Platform"), HOSTED | {"xml", "databases", "digests"}
+    ),
     "Model": Room(_MODEL, CORE),
     "Sources": Room(_SOURCES, HOSTED),
     "TelephonyServer": Room(_SERVER, HOSTED),
