@@ -8,6 +8,7 @@
 #include <utility>
 
 #include "Recordings/PcapReader.h"
+#include "Recordings/PcapngReader.h"
 
 namespace kestro {
 namespace {
@@ -27,6 +28,17 @@ constexpr std::array kBeginnings = {
     Beginning{0x0A0D0D0A, RecordingForm::Pcapng},  // the same in both byte orders
 };
 
+Result<std::unique_ptr<RecordingReader>> asReader(Result<PcapReader> reader) {
+  if (!reader) return tl::unexpected(reader.error());
+  return std::make_unique<PcapReader>(*std::move(reader));
+}
+
+template <class Reader>
+Result<std::unique_ptr<RecordingReader>> asReader(Result<std::unique_ptr<Reader>> reader) {
+  if (!reader) return tl::unexpected(reader.error());
+  return *std::move(reader);
+}
+
 }  // namespace
 
 std::optional<RecordingForm> formOfRecording(ByteView head) noexcept {
@@ -40,12 +52,11 @@ Result<std::unique_ptr<RecordingReader>> openRecording(RecordedFile file,
                                                        const RecordingContext& /*context*/) {
   const auto head = file.ahead(kRecordingHeadSize);
   if (!head) return tl::unexpected(head.error());
-  if (!head->empty() && !formOfRecording(*head)) {
-    return failure(fmt::format("{}: unknown file format", file.path()));
-  }
-  auto reader = PcapReader::open(std::move(file));
-  if (!reader) return tl::unexpected(reader.error());
-  return std::make_unique<PcapReader>(*std::move(reader));
+  if (head->empty()) return failure(fmt::format("{}: the file is empty", file.path()));
+  const auto form = formOfRecording(*head);
+  if (form == RecordingForm::Pcap) return asReader(PcapReader::open(std::move(file)));
+  if (form == RecordingForm::Pcapng) return asReader(PcapngReader::open(std::move(file)));
+  return failure(fmt::format("{}: unknown file format", file.path()));
 }
 
 Result<std::unique_ptr<RecordingReader>> openRecording(const std::string& path,

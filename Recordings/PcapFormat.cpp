@@ -2,6 +2,8 @@
 // The table of link types.
 #include "Recordings/PcapFormat.h"
 
+#include <fmt/format.h>
+
 #include <algorithm>
 #include <array>
 
@@ -36,6 +38,11 @@ std::optional<std::string_view> technologyOfLinkType(int linkType) noexcept {
   const auto* found = std::ranges::find(kLinkTypes, linkType, &LinkType::number);
   if (found == kLinkTypes.end()) return std::nullopt;
   return found->technology;
+}
+
+std::string linkTypeRefusal(int linkType) {
+  return fmt::format("link type {} stands for no technology ({} to {} do)", linkType,
+                     kLinkTypes.front().number, kLinkTypes.back().number);
 }
 
 }  // namespace kestro

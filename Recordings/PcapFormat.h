@@ -4,6 +4,7 @@
 
 #include <cstddef>
 #include <optional>
+#include <string>
 #include <string_view>
 
 namespace kestro {
@@ -18,5 +19,8 @@ inline constexpr std::size_t kMaximumPcapMessageSize = 262'144;
 /// The technology that a link type stands for; absent when it stands for none. The text is a
 /// constant.
 [[nodiscard]] std::optional<std::string_view> technologyOfLinkType(int linkType) noexcept;
+
+/// Why a recording of another link type is refused.
+[[nodiscard]] std::string linkTypeRefusal(int linkType);
 
 }  // namespace kestro

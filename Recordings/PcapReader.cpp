@@ -86,8 +86,7 @@ Result<PcapReader> PcapReader::open(RecordedFile file) {
   const int linkType = pcap_datalink(handle->pcap);
   const auto technology = technologyOfLinkType(linkType);
   if (!technology) {
-    return failure(
-        fmt::format("{}: link type {} stands for no technology (147 to 151 do)", path, linkType));
+    return failure(fmt::format("{}: {}", path, linkTypeRefusal(linkType)));
   }
   return PcapReader(std::move(handle), *technology);
 }

@@ -66,7 +66,7 @@ RecordedFile& RecordedFile::operator=(RecordedFile&& other) noexcept {
 RecordedFile::~RecordedFile() { close(); }
 
 void RecordedFile::close() noexcept {
-  if (_descriptor > STDIN_FILENO) ::close(_descriptor);
+  if (_descriptor >= 0 && _path != kStandardInput) ::close(_descriptor);
 }
 
 Result<ByteView> RecordedFile::fillTo(std::size_t count) {

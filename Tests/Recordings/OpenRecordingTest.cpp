@@ -10,6 +10,7 @@
 #include "Platform/Linux/LinuxPlatform.h"
 #include "Recordings/OpenRecording.h"
 #include "Tests/Recordings/PcapBytes.h"
+#include "Tests/Recordings/PcapngBytes.h"
 #include "Tests/Support/TemporaryDirectory.h"
 
 namespace kestro {
@@ -51,6 +52,15 @@ TEST_F(OpenRecordingTest, PcapIsReadWithItsTechnology) {
   EXPECT_EQ(message.number, 1U);
   EXPECT_THAT(message.bytes, ::testing::ElementsAre('a', 'b', 'c'));
   EXPECT_TRUE(message.comments.empty());
+}
+
+TEST_F(OpenRecordingTest, PcapngIsKnownByItsFirstFourBytesAndRead) {
+  EXPECT_EQ(formOfRecording(Bytes{0x0A, 0x0D, 0x0D, 0x0A}), RecordingForm::Pcapng);
+  EXPECT_EQ(formOfRecording(Bytes{0x0A, 0x0D, 0x0D, 0x0B}), std::nullopt);
+  const auto reader = open(smallestPcapng());
+  ASSERT_TRUE(reader.has_value()) << reader.error().message;
+  EXPECT_EQ(reader.value()->form(), RecordingForm::Pcapng);
+  EXPECT_EQ(reader.value()->next().value().value().technology, "LTE");
 }
 
 TEST_F(OpenRecordingTest, WhatIsOfNoFormIsRefused) {
