@@ -96,8 +96,8 @@ configure() {  # configure PRESET [CMAKE ARGUMENT...]
 }
 
 # A tree for what takes only the packages to run. The programs are compiled in it as they are with
-# tests, so that nothing of them is built anew when those are configured in. A tree that has tests keeps them: configuring them away would
-# remove what was built of them.
+# tests, so that nothing of them is built anew when those are configured in. A tree that has tests
+# keeps them: configuring them away would remove what was built of them.
 configure_programs() {  # configure_programs PRESET
   if grep -qs '^KESTRO_BUILD_TESTS:.*=ON$' "$root/build/$1/CMakeCache.txt"; then
     configure "$1"

@@ -39,7 +39,10 @@ int serve(LinuxPlatform& platform, const ServerOptions& options) {
   (*server)->setSource(stateOf(options.source));
   Playback playback(std::move(*source), options.playback, platform.mainQueue(), platform.clock(),
                     **server, report);
-  platform.setTerminationHandler([&platform] { platform.quit(0); });
+  platform.setTerminationHandler([&platform] {
+    ignoreParentsEnd();
+    platform.quit(0);
+  });
   playback.start();
   return platform.run();
 }
