@@ -15,4 +15,14 @@ namespace kestro {
 [[nodiscard]] Result<void> checkOutputIsNoInput(const std::string& output,
                                                 std::span<const std::string> inputs);
 
+/// The path that means standard output.
+inline constexpr const char* kStandardOutputPath = "-";
+
+/// What messages call an output.
+[[nodiscard]] std::string outputName(const std::string& path);
+
+/// Refuses an output that could not be created now: its folder is missing or may not be written to,
+/// it is a folder, or an existing file may not be written to. Creates nothing.
+[[nodiscard]] Result<void> checkOutputCanBeCreated(const std::string& path);
+
 }  // namespace kestro

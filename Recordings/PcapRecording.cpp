@@ -45,6 +45,12 @@ PcapRecording::PcapRecording(const std::string& path, std::string_view technolog
 
 Result<void> PcapRecording::setTechnology(std::string_view technology) {
   if (technology == _technology) return {};
+  if (_files.front() == kStandardOutputPath) {
+    return failure(
+        fmt::format("{}: the technology has changed from {} to {}, and a pcap capture "
+                    "holds one",
+                    outputName(_files.front()), _technology, technology));
+  }
   const auto path = numberedPath(_files.front(), _files.size() + 1);
   auto writer = createWriter(path, technology, _inputs);
   if (!writer) return tl::unexpected(writer.error());

@@ -19,14 +19,15 @@ namespace kestro {
 /// are replaced.
 class PcapRecording {
  public:
-  /// Creates the first file. None of the files may be one of `inputs`. The error says why that is
-  /// not possible; a technology that has no link type is refused.
+  /// Creates the first file; "-" is standard output, which is the only one. None of the files may
+  /// be one of `inputs`. The error says why that is not possible; a technology that has no link
+  /// type is refused.
   [[nodiscard]] static Result<PcapRecording> create(const std::string& path,
                                                     std::string_view technology,
                                                     std::vector<std::string> inputs = {});
 
   /// Says which technology the following messages have. A change starts the next file; the error of
-  /// creating it leaves the recording on the file before.
+  /// creating it leaves the recording on the file before. On standard output a change is an error.
   [[nodiscard]] Result<void> setTechnology(std::string_view technology);
 
   /// Appends one message. A message that is too long for a capture is counted and left out; that is

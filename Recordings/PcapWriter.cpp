@@ -2,9 +2,11 @@
 // Writing captures with libpcap.
 #include "Recordings/PcapWriter.h"
 
+#include <fcntl.h>
 #include <fmt/format.h>
 #include <pcap/pcap.h>
 #include <stdio_ext.h>
+#include <unistd.h>
 
 #include <algorithm>
 #include <cerrno>
@@ -14,6 +16,7 @@
 #include <utility>
 #include <vector>
 
+#include "Recordings/OutputPath.h"
 #include "Recordings/PcapFormat.h"
 
 namespace kestro {
@@ -27,7 +30,14 @@ timeval timevalOf(Moment time) {
 }
 
 Error writeError(const std::string& path) {
-  return Error{fmt::format("{}: cannot write: {}", path, std::strerror(errno))};
+  return Error{fmt::format("{}: cannot write: {}", outputName(path), std::strerror(errno))};
+}
+
+/// Opens a file, or a descriptor of its own for standard output; null, with errno, when it fails.
+std::FILE* openOutput(const std::string& path) {
+  if (path != kStandardOutputPath) return std::fopen(path.c_str(), "wbe");
+  const int descriptor = ::fcntl(STDOUT_FILENO, F_DUPFD_CLOEXEC, 0);
+  return descriptor < 0 ? nullptr : ::fdopen(descriptor, "wb");
 }
 
 }  // namespace
@@ -54,7 +64,7 @@ Result<PcapWriter> PcapWriter::create(const std::string& path, std::string_view 
   }
   auto handle = std::make_unique<Handle>();
   handle->pcap.reset(pcap_open_dead(*linkType, static_cast<int>(kMaximumPcapMessageSize)));
-  std::FILE* file = std::fopen(path.c_str(), "wbe");
+  std::FILE* file = openOutput(path);
   if (file == nullptr) {
     return failure(fmt::format("{}: cannot create: {}", path, std::strerror(errno)));
   }

@@ -17,8 +17,8 @@ namespace kestro {
 /// `write` returns, so that a file whose writer was killed can be read up to its last message.
 class PcapWriter {
  public:
-  /// Creates the file, or empties an existing one, and writes its header. The error says why that
-  /// was not possible; an unknown technology is refused.
+  /// Creates the file, or empties an existing one, and writes its header; "-" is standard output.
+  /// The error says why that was not possible; an unknown technology is refused.
   [[nodiscard]] static Result<PcapWriter> create(const std::string& path,
                                                  std::string_view technology);
 

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "CommandLine/Commands/RecordCommand.h"
 
+#include <unistd.h>
+
 #include <memory>
 #include <string>
 #include <utility>
@@ -12,6 +14,7 @@
 #include "CommandLine/ExitStatus.h"
 #include "CommandLine/Output.h"
 #include "Platform/MainQueue.h"
+#include "Recordings/OutputPath.h"
 
 namespace kestro {
 namespace {
@@ -19,7 +22,7 @@ namespace {
 constexpr const char* kRecordText =
     R"(Nothing is decoded. The recording ends with Ctrl-C or after its duration, and goes on over lost
 connections; when the baseband changes its technology it goes on in FILE-2.pcap, FILE-3.pcap and
-so on. Existing files are replaced. Messages of more than 262,144 bytes are dropped and counted.
+so on (on standard output it ends there). Existing files are replaced. Messages of more than 262,144 bytes are dropped and counted.
 When a lost connection has cost messages, the last line says how many, and the exit status is 3.)";
 
 constexpr const char* kRecordExamples = R"(  kestro-cli record -o drive.pcap
@@ -38,6 +41,16 @@ std::vector<std::string> demoFiles(const std::string& source) {
   return {source.substr(colon + 1)};
 }
 
+/// Looks at the output before anything is started.
+Result<void> checkOutput(const RecordOptions& options) {
+  if (options.path == kStandardOutputPath && ::isatty(STDOUT_FILENO) == 1) {
+    return failure("standard output is a terminal, which shows no capture: redirect it");
+  }
+  const auto inputs = demoFiles(options.live.demoSource);
+  if (auto checked = checkOutputIsNoInput(options.path, inputs); !checked) return checked;
+  return checkOutputCanBeCreated(options.path);
+}
+
 class RecordTask : public LiveTask {
  public:
   RecordTask(const RecordOptions& options, Platform& platform, Finish finish)
@@ -52,6 +65,7 @@ class RecordTask : public LiveTask {
       _durationTimer = _platform.mainQueue().scheduleRepeating(
           durationOfSeconds(_options.durationSeconds), [this] { stop(); });
     }
+    if (::isatty(STDERR_FILENO) == 1) _session.tellEveryMinute();
     _session.start();
   }
 
@@ -81,13 +95,17 @@ CommandRow recordCommand() {
       .help = "Record the log channel as a capture",
       .options = {{.name = "-o,--output",
                    .value = "FILE.pcap",
-                   .help = "The capture to write",
+                   .help = "The capture to write; - is standard output",
                    .target = &options->path,
                    .isRequired = true},
                   secondsOption("--duration", "End after so long; 0: only with Ctrl-C",
                                 options->durationSeconds)},
       .sections = {{.text = kRecordText}, {.title = "Examples", .text = kRecordExamples}},
-      .run = [options] {
+      .run = [options]() -> int {
+        if (const auto checked = checkOutput(*options); !checked) {
+          complain(checked.error().message);
+          return kExitNothingDone;
+        }
         return runLive(options->live, [&](LinuxPlatform& platform, Finish finish) {
           return std::make_unique<RecordTask>(*options, platform, std::move(finish));
         });

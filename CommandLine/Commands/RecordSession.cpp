@@ -4,15 +4,23 @@
 #include <fmt/format.h>
 #include <fmt/ranges.h>
 
+#include <algorithm>
 #include <utility>
 
 #include "Platform/Clock.h"
 #include "Platform/TelephonyProtocol.h"
+#include "Recordings/OutputPath.h"
 
 namespace kestro {
 namespace {
 
 constexpr const char* kConnectingRemark = "connecting...";
+
+std::string namesOf(const std::vector<std::string>& files) {
+  std::vector<std::string> names(files.size());
+  std::ranges::transform(files, names.begin(), outputName);
+  return fmt::format("{}", fmt::join(names, ", "));
+}
 
 }  // namespace
 
@@ -30,6 +38,19 @@ void RecordSession::start() {
   if (!_client.isConnected()) _remark(kConnectingRemark);
 }
 
+void RecordSession::tellEveryMinute() {
+  _minutes =
+      _platform.mainQueue().scheduleRepeating(std::chrono::minutes(1), [this] { tellProgress(); });
+}
+
+void RecordSession::tellProgress() {
+  if (_isOver || !_recording) return;
+  const std::uint64_t count = _recording->messageCount();
+  const bool isSilent = std::exchange(_toldCount, count) == count;
+  _remark(fmt::format("so far {} messages, {} bytes{}", count, _byteCount,
+                      isSilent ? "; none in the last minute" : ""));
+}
+
 void RecordSession::stop() {
   if (const auto gap = _client.gap()) channelFollowed(*gap, std::nullopt);
   _isOver = true;
@@ -38,7 +59,7 @@ void RecordSession::stop() {
 std::optional<std::string> RecordSession::summary() const {
   if (!_recording) return std::nullopt;
   return fmt::format("{} messages, {} bytes, {} dropped, in {}{}", _recording->messageCount(),
-                     _byteCount, _recording->leftOutCount(), fmt::join(_recording->files(), ", "),
+                     _byteCount, _recording->leftOutCount(), namesOf(_recording->files()),
                      lossesText());
 }
 
@@ -65,7 +86,7 @@ void RecordSession::channelFollowed(std::chrono::microseconds gap,
 void RecordSession::technologyAnswered(std::string_view technology) {
   if (_isOver) return;
   if (const auto opened = openFile(technology); !opened) return fail(opened.error().message);
-  _remark(fmt::format("recording {} to {}", technology, _recording->files().back()));
+  _remark(fmt::format("recording {} to {}", technology, outputName(_recording->files().back())));
 }
 
 /// Without lists of codes everything is streamed.

@@ -5,12 +5,14 @@
 #include <chrono>
 #include <cstdint>
 #include <functional>
+#include <memory>
 #include <optional>
 #include <string>
 #include <string_view>
 #include <vector>
 
 #include "Model/LogChannelClient.h"
+#include "Platform/MainQueue.h"
 #include "Platform/Platform.h"
 #include "Recordings/PcapRecording.h"
 
@@ -30,6 +32,8 @@ class RecordSession : private LogChannelUser {
                 Remark remark, std::function<void(const std::string& reason)> failed);
 
   void start();
+  /// Remarks every minute from now on how much has come.
+  void tellEveryMinute();
   /// Records nothing from now on: what still comes while the program ends is in neither the file
   /// nor the summary.
   void stop();
@@ -59,6 +63,7 @@ class RecordSession : private LogChannelUser {
   [[nodiscard]] std::string lossesText() const;
   [[nodiscard]] Result<void> openFile(std::string_view technology);
   void fail(const std::string& reason);
+  void tellProgress();
 
   Platform& _platform;
   std::string _path;
@@ -67,6 +72,8 @@ class RecordSession : private LogChannelUser {
   std::function<void(const std::string& reason)> _failed;
   std::optional<PcapRecording> _recording;
   std::uint64_t _byteCount = 0;
+  std::unique_ptr<Timer> _minutes;
+  std::uint64_t _toldCount = 0;  ///< of messages, a minute ago
   Losses _losses;
   bool _isOver = false;  ///< stopped or failed: nothing is recorded any more
   LogChannelClient _client;

@@ -98,6 +98,31 @@ TEST_F(LiveTest, RecordWithoutAServerHasDoneNothing) {
             "kestro-cli: nothing was recorded: no telephony server could be connected to\n");
 }
 
+TEST_F(LiveTest, RecordLooksAtItsOutputBeforeItConnects) {
+  const auto record = start({"kestro-cli", "record", "-o", "/nowhere/drive.pcap"});
+  EXPECT_EQ(record->wait(), 1);
+  EXPECT_EQ(record->errors(),
+            "kestro-cli: /nowhere/drive.pcap: cannot create: No such file or directory\n");
+}
+
+TEST_F(LiveTest, RecordWritesToStandardOutput) {
+  startServer();
+  const auto record = start({"kestro-cli", "record", "-o", "-", "--duration=0.5"});
+  EXPECT_EQ(record->wait(), 0);
+  EXPECT_THAT(record->errors(), HasSubstr(" 0 dropped, in standard output"));
+  const std::string recording = source.directory() + "/recording.pcap";
+  std::ofstream(recording, std::ios::binary) << record->output();
+  const Outcome decoded = run({"kestro-cli", "decode", recording});
+  EXPECT_EQ(decoded.status, 0);
+  EXPECT_THAT(decoded.output, HasSubstr("Count  "));
+}
+
+TEST_F(LiveTest, RecordWritesToNoTerminal) {
+  const auto record = start({"kestro-cli", "record", "-o", "-"}, Process::Terminal::Own);
+  EXPECT_EQ(record->wait(), 1);
+  EXPECT_THAT(record->output(), HasSubstr("standard output is a terminal"));
+}
+
 TEST_F(LiveTest, AKilledServerIsReconnectedToAndTheDisplayGoesOn) {
   startServer();
   const auto watch = start({"kestro-cli", "watch"});

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include <gtest/gtest.h>
+#include <unistd.h>
 
 #include <filesystem>
 #include <fstream>
@@ -50,6 +51,37 @@ TEST_F(OutputPathTest, OtherFilesAndNewOnesAreOutputs) {
 }
 
 TEST_F(OutputPathTest, ADeviceMayBeBoth) { EXPECT_FALSE(isRefused("/dev/null", {"/dev/null"})); }
+
+TEST_F(OutputPathTest, WhatCouldNotBeCreatedIsRefused) {
+  const auto problem = [](const std::string& output) {
+    const auto checked = checkOutputCanBeCreated(output);
+    return checked ? "" : checked.error().message;
+  };
+  EXPECT_EQ(problem(path("none/b.pcap")),
+            path("none/b.pcap") + ": cannot create: No such file or directory");
+  EXPECT_EQ(problem(path("a.pcap/b.pcap")),
+            path("a.pcap/b.pcap") + ": cannot create: Not a directory");
+  EXPECT_EQ(problem(path("")), path("") + ": cannot create: Is a directory");
+  EXPECT_EQ(problem(path("a.pcap")), "");
+  EXPECT_EQ(problem(path("b.pcap")), "");
+  EXPECT_EQ(problem("b.pcap"), "");
+  EXPECT_EQ(problem("-"), "");
+  EXPECT_FALSE(fs::exists(path("b.pcap")));
+}
+
+TEST_F(OutputPathTest, AnUnwritableFileOrFolderIsRefused) {
+  if (::geteuid() == 0) GTEST_SKIP() << "nothing is unwritable for root";
+  fs::permissions(path("a.pcap"), fs::perms::owner_read);
+  EXPECT_FALSE(checkOutputCanBeCreated(path("a.pcap")));
+  fs::permissions(path(""), fs::perms::owner_read | fs::perms::owner_exec);
+  EXPECT_FALSE(checkOutputCanBeCreated(path("b.pcap")));
+  fs::permissions(path(""), fs::perms::owner_all);
+}
+
+TEST(OutputNameTest, AHyphenIsStandardOutput) {
+  EXPECT_EQ(outputName("-"), "standard output");
+  EXPECT_EQ(outputName("a-"), "a-");
+}
 
 }  // namespace
 }  // namespace kestro

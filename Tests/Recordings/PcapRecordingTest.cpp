@@ -52,6 +52,20 @@ TEST_F(PcapRecordingTest, TheSameTechnologyAgainStaysInTheFile) {
   EXPECT_THAT(recording->files(), ElementsAre(_directory.pathOf("drive.pcap")));
 }
 
+TEST_F(PcapRecordingTest, StandardOutputEndsWithItsTechnology) {
+  ::testing::internal::CaptureStdout();
+  auto recording = PcapRecording::create("-", "LTE");
+  ASSERT_TRUE(recording.has_value());
+  ASSERT_TRUE(recording->write(Moment(), Bytes{'a'}));
+  const auto changed = recording->setTechnology("IFX");
+  const std::string written = ::testing::internal::GetCapturedStdout();
+  EXPECT_EQ(Bytes(written.begin(), written.end()), joined({captureHeader(150), recordAtZero('a')}));
+  ASSERT_FALSE(changed);
+  EXPECT_EQ(changed.error().message,
+            "standard output: the technology has changed from LTE to IFX, and a pcap capture "
+            "holds one");
+}
+
 TEST_F(PcapRecordingTest, TheNumberStandsBeforeTheLastExtensionOnly) {
   auto recording = PcapRecording::create(_directory.pathOf("a.b"), "LTE");
   ASSERT_TRUE(recording.has_value());

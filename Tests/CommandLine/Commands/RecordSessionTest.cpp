@@ -186,6 +186,25 @@ TEST_F(RecordSessionTest, MessagesThatAreTooLongAreDroppedAndCounted) {
   EXPECT_THAT(failures, IsEmpty());
 }
 
+TEST_F(RecordSessionTest, TellsEveryMinuteHowMuchHasCome) {
+  start(file.path());
+  session->tellEveryMinute();
+  remarks.clear();
+  send(testing::bytesOf("abc"));
+  queue().advance(59s);
+  EXPECT_THAT(remarks, IsEmpty());
+  queue().advance(1s);
+  EXPECT_THAT(remarks, ElementsAre("so far 1 messages, 3 bytes"));
+  queue().advance(60s);
+  EXPECT_EQ(remarks.back(), "so far 1 messages, 3 bytes; none in the last minute");
+  send(testing::bytesOf("de"));
+  queue().advance(60s);
+  EXPECT_EQ(remarks.back(), "so far 2 messages, 5 bytes");
+  session->stop();
+  queue().advance(60s);
+  EXPECT_THAT(remarks, ::testing::SizeIs(3));
+}
+
 TEST_F(RecordSessionTest, WithoutAServerThereIsNoFile) {
   platform.telephonyService().setReachable(false);
   start(file.path());
