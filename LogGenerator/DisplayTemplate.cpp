@@ -6,11 +6,15 @@
 
 namespace kestro {
 
-Value loadTemplate(const GeneratorServices& services, std::string_view name) {
-  const auto contents = services.bundle.resource(name, kTemplateExtension);
+Value loadTemplate(const Bundle& bundle, const PropertyListCoding& coding, std::string_view name) {
+  const auto contents = bundle.resource(name, kTemplateExtension);
   if (!contents) return {};
-  Result<Value> parsed = services.propertyListCoding.parse(*contents);
+  Result<Value> parsed = coding.parse(*contents);
   return parsed && parsed->isDictionary() ? *parsed : Value();
+}
+
+Value loadTemplate(const GeneratorServices& services, std::string_view name) {
+  return loadTemplate(services.bundle, services.propertyListCoding, name);
 }
 
 Value templateOfState(const GeneratorServices& services, std::string_view name, Dictionary& state) {

@@ -17,6 +17,8 @@ inline constexpr std::string_view kTemplateExtension = "plist";
 
 /// The dictionary in the resource `name`, which has the extension above; null when there is no such
 /// resource, or it does not parse, or it holds something else.
+[[nodiscard]] Value loadTemplate(const Bundle& bundle, const PropertyListCoding& coding,
+                                 std::string_view name);
 [[nodiscard]] Value loadTemplate(const GeneratorServices& services, std::string_view name);
 
 /// The state's template, whatever it is. When it has none, the one that `loadTemplate` finds, which

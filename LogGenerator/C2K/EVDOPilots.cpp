@@ -6,8 +6,10 @@
 namespace kestro {
 namespace {
 
-void writeEnergy(std::span<const std::int64_t> raw, TextBuffer& text) {
-  text.append("%+.2f dB", 10 * std::log10(static_cast<double>(raw[0]) / 512));
+constexpr NumberFormat kEnergyFormat = "%+.2f dB";
+
+ComputedValue writeEnergy(std::span<const std::int64_t> raw) {
+  return {.number = 10 * std::log10(static_cast<double>(raw[0]) / 512), .format = &kEnergyFormat};
 }
 
 // --- 0x12B6: active set, records of 12 bytes from byte 25 ----------------------------------------

@@ -25,13 +25,15 @@ constexpr Place kVersion = u8(13);
 constexpr Place kSystemType = u32(46).shared();
 constexpr std::int64_t kCDMA2000System = 2;
 
+constexpr NumberFormat kIdentityFormat = "%d";
+constexpr NumberFormat kNoIdentityFormat = "(unknown system type %d)";
+
 /// An identity of the system, if the system is of the type that has it: `raw` is type and identity.
-void writeIdentity(std::span<const std::int64_t> raw, TextBuffer& text) {
+ComputedValue writeIdentity(std::span<const std::int64_t> raw) {
   if (raw[0] == kCDMA2000System) {
-    text.append("%d", raw[1]);
-  } else {
-    text.append("(unknown system type %d)", raw[0]);
+    return {.number = static_cast<double>(raw[1]), .format = &kIdentityFormat};
   }
+  return {.number = static_cast<double>(raw[0]), .format = &kNoIdentityFormat, .isAbsent = true};
 }
 
 // The base station's identity lies past the minimum length.

@@ -121,9 +121,18 @@ constexpr NamedValue kServiceTypes[] = {
     {0, "NO_SERVICE"}, {1, "CS_ONLY"}, {2, "PS_ONLY"}, {3, "CS_PS_SERVICE"}, {4, "LIMITED_SERVICE"},
 };
 
+/// The digits of a code, by how many of them a filler makes longer.
+constexpr NumberFormat kCodeFormats[] = {"%03d", "%04d", "%05d", "%06d"};
+
 /// Three digits of four bits each; a filler shows as the number 15.
-void writeDigits(std::span<const std::int64_t> raw, TextBuffer& text) {
-  for (const std::int64_t digit : raw) text.append("%d", digit);
+ComputedValue writeDigits(std::span<const std::int64_t> raw) {
+  std::int64_t code = 0;
+  std::size_t fillers = 0;
+  for (const std::int64_t digit : raw) {
+    code = code * (digit < 10 ? 10 : 100) + digit;
+    if (digit >= 10) ++fillers;
+  }
+  return {.number = static_cast<double>(code), .format = &kCodeFormats[fillers]};
 }
 
 constexpr Place lowDigit(unsigned offset) { return u8(offset).bits(0, 3); }

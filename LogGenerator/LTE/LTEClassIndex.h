@@ -3,14 +3,19 @@
 #pragma once
 
 #include <memory>
+#include <span>
 
 #include "LogGenerator/LTE/Measurements.h"
 #include "LogGenerator/LTE/Reselection.h"
 #include "LogGenerator/LTE/ServingCellInfo.h"
 #include "LogGenerator/Ondrel/ClassIndex.h"
+#include "LogGenerator/Ondrel/SectionMeasurer.h"
 #include "LogGenerator/Ondrel/SharedDecoders.h"
 
 namespace kestro {
+
+/// The sections of these decoders, in the same order: what is measured.
+[[nodiscard]] std::span<const MeasuredSection> lteSections();
 
 /// Owns one decoder for each section, made in the order of the fields.
 class LTEClassIndex : public ClassIndex {

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "LogGenerator/LTE/LTELogGenerator.h"
 
+#include <string>
+
 #include "LogGenerator/GeneratorServices.h"
 #include "LogGenerator/LTE/LTEClassIndex.h"
 #include "Platform/SystemLog.h"
@@ -14,7 +16,7 @@ std::unique_ptr<LTELogGenerator> LTELogGenerator::generator(const GeneratorServi
 LTELogGenerator::LTELogGenerator(const GeneratorServices& services)
     : OndrelLogGenerator2(services) {
   services.systemLog.write(LogPriority::Error, "Creating LTELogGenerator object");
-  initWithPListNameCIndexObj("LTE", std::make_unique<LTEClassIndex>(services));
+  initWithPListNameCIndexObj(std::string(kLTETemplate), std::make_unique<LTEClassIndex>(services));
 }
 
 LTELogGenerator::~LTELogGenerator() {

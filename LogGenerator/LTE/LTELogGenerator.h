@@ -3,10 +3,14 @@
 #pragma once
 
 #include <memory>
+#include <string_view>
 
 #include "LogGenerator/Ondrel/OndrelLogGenerator2.h"
 
 namespace kestro {
+
+/// The resource that is its template.
+inline constexpr std::string_view kLTETemplate = "LTE";
 
 /// The template-driven generator with the LTE decoders and the template "LTE".
 class LTELogGenerator : public OndrelLogGenerator2 {

@@ -8,6 +8,7 @@ namespace kestro {
 namespace {
 
 constexpr std::string_view kPhysicalCellId = "Physical Cell ID";
+constexpr std::string_view kEARFCN = "E-ARFCN";
 constexpr std::string_view kNotPresent = "Not Present";
 
 constexpr NamedValue kTrueFalse[] = {{0, "False"}, {1, "True"}};
@@ -21,7 +22,7 @@ constexpr TextRule quarterDb() { return scaled("%4.2f dB", -30, 0.25); }
 // --- 0xB179: intra-frequency measurement: a header, the measured neighbours, the detected cells --
 
 constexpr Field kIntraFrequency[] = {
-    {"E-ARFCN", u16(17), decimal()},
+    {kEARFCN, u16(17), decimal()},
     {"Serving Physical Cell ID", u16(19), decimal()},
     {"Subframe Number", u16(21), decimal()},
     {"Serving Filtered RSRP", u16(23), quarterDbm()},
@@ -39,12 +40,20 @@ constexpr Field kMeasuredNeighbor[] = {
 };
 static_assert(isLayout(kMeasuredNeighbor));
 constexpr unsigned kMeasuredNeighborSize = 6;
+constexpr Field kMeasuredIdentity[] = {
+    packetFieldNamed(kIntraFrequency, kEARFCN),
+    fieldNamed(kMeasuredNeighbor, kPhysicalCellId),
+};
 
 constexpr Field kDetectedCell[] = {
     {kPhysicalCellId, u16(0), decimal()},
 };
 static_assert(isLayout(kDetectedCell));
 constexpr unsigned kDetectedCellSize = 2;
+constexpr Field kDetectedIdentity[] = {
+    packetFieldNamed(kIntraFrequency, kEARFCN),
+    fieldNamed(kDetectedCell, kPhysicalCellId),
+};
 
 constexpr ListReading kMeasuredNeighbors[] = {{.table = {
                                                    .name = "measured neighbour",
@@ -52,6 +61,7 @@ constexpr ListReading kMeasuredNeighbors[] = {{.table = {
                                                    .base = kLTEIntraFrequencyPacket.minimumLength,
                                                    .stride = kMeasuredNeighborSize,
                                                    .fields = kMeasuredNeighbor,
+                                                   .identity = kMeasuredIdentity,
                                                }}};
 
 /// The detected cells stand behind all measured neighbours.
@@ -63,6 +73,7 @@ constexpr ListReading kDetectedCells[] = {{.table = {
                                                .counted = kMeasuredCount,
                                                .stride = kDetectedCellSize,
                                                .fields = kDetectedCell,
+                                               .identity = kDetectedIdentity,
                                            }}};
 
 constexpr PacketReading kIntraFrequencyReadings[] = {
@@ -76,7 +87,7 @@ constexpr PacketReading kDetectedCellsReadings[] = {
 
 constexpr Field kServingCellMeasurement[] = {
     {"Version", u8(13), decimal()},
-    {"E-ARFCN", u16(17), decimal()},
+    {kEARFCN, u16(17), decimal()},
     {kPhysicalCellId, u16(19).bits(0, 8), decimal()},
     {"Serving Layer Priority", u16(19).bits(9, 12), decimal()},
     {"Measured RSRP", u32(21).bits(0, 8), quarterDbm()},
@@ -104,7 +115,7 @@ constexpr PacketReading kServingCellReadings[] = {
 
 constexpr Field kNeighborHeader[] = {
     {"Version", u8(13), decimal()},
-    {"E-ARFCN", u16(17), decimal()},
+    {kEARFCN, u16(17), decimal()},
     {"Qrxlevmin", u8(19).bits(0, 5), decimal("%d dBm", -140, 2)},
 };
 static_assert(isLayout(kNeighborHeader));
@@ -125,6 +136,10 @@ constexpr Field kNeighborCell[] = {
     {"Ant 1 Sample Offset", u32(12).bits(11, 29).shared(), decimal()},
 };
 static_assert(isLayout(kNeighborCell));
+constexpr Field kNeighborIdentity[] = {
+    packetFieldNamed(kNeighborHeader, kEARFCN),
+    fieldNamed(kNeighborCell, kPhysicalCellId),
+};
 
 constexpr ListReading kNeighborCells[] = {{.table = {
                                                .name = "neighbour",
@@ -133,6 +148,7 @@ constexpr ListReading kNeighborCells[] = {{.table = {
                                                .base = kLTENeighborPacket.minimumLength,
                                                .stride = 20,
                                                .fields = kNeighborCell,
+                                               .identity = kNeighborIdentity,
                                            }}};
 
 constexpr PacketReading kNeighborHeaderReadings[] = {

@@ -37,6 +37,10 @@ constexpr Field kCandidate[] = {
 };
 static_assert(isLayout(kCandidate));
 
+constexpr auto kCandidateIdentity =
+    fieldsNamed(kCandidate, "Candidate RAT Type", "E ARFCN", "Cell ID", "U ARFCN", "PSC", "ARFCN",
+                "BSIC ID", "Channel", "Pilot");
+
 // The list is as long as the count's low byte says, while an index is checked against all of it.
 // Candidates stand 4 bytes apart though their fields reach further.
 constexpr ListReading kCandidates[] = {{.table = {
@@ -46,6 +50,7 @@ constexpr ListReading kCandidates[] = {{.table = {
                                             .base = kLTEReselectionPacket.minimumLength,
                                             .stride = 4,
                                             .fields = kCandidate,
+                                            .identity = kCandidateIdentity,
                                         }}};
 
 constexpr PacketReading kHeaderReadings[] = {{.packet = kLTEReselectionPacket, .fields = kHeader}};

@@ -69,10 +69,12 @@ std::optional<std::int32_t> cellNumber(const Dictionary& cell, std::string_view 
   return static_cast<std::int32_t>(value.integerBits());
 }
 
+bool isNotMeasured(const ListedValue& value, std::int32_t number) {
+  return value.text.hasAbsentValue && (number & kComparedWithAbsent) == value.text.absentValue;
+}
+
 Value cellText(const ListedValue& value, std::int32_t number) {
-  const bool isAbsent =
-      value.text.hasAbsentValue && (number & kComparedWithAbsent) == value.text.absentValue;
-  const std::int64_t raw = isAbsent ? value.text.absentValue : number;
+  const std::int64_t raw = isNotMeasured(value, number) ? value.text.absentValue : number;
   return makeText(value.text, {&raw, 1});
 }
 

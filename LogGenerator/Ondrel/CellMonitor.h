@@ -68,6 +68,9 @@ inline constexpr std::string_view kMissingCellArrayLine = "Failed to get Cell Ar
 /// or holds anything else.
 [[nodiscard]] std::optional<std::int32_t> cellNumber(const Dictionary& cell, std::string_view key);
 
+/// Whether the number stands for a level that was not measured.
+[[nodiscard]] bool isNotMeasured(const ListedValue& value, std::int32_t number);
+
 /// The text that a section shows for a cell's number.
 [[nodiscard]] Value cellText(const ListedValue& value, std::int32_t number);
 

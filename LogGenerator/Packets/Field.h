@@ -98,8 +98,16 @@ struct NamedValues : std::span<const NamedValue> {
   }
 };
 
-/// Writes the text of a value computed from several raw values, in the order of the field's places.
-using ComputedText = void (*)(std::span<const std::int64_t> raw, TextBuffer& text);
+/// A number computed from raw values, and how it is shown.
+struct ComputedValue {
+  double number;
+  const NumberFormat* format;  ///< a constant
+  /// Whether there is no such value: the text says so, and the number is another.
+  bool isAbsent = false;
+};
+
+/// What several raw values make, in the order of the field's places.
+using ComputeValue = ComputedValue (*)(std::span<const std::int64_t> raw);
 
 /// The number that several raw values make, in the order of the field's places.
 using ComputedNumber = std::int64_t (*)(std::span<const std::int64_t> raw);
@@ -125,7 +133,7 @@ struct TextRule {
   double offset = 0;
   NamedValues names{};
   std::string_view otherName{};  ///< for values outside `names`; empty: `format` shows them
-  ComputedText computed = nullptr;
+  ComputeValue computed = nullptr;
   ComputedNumber number = nullptr;
   /// What readers of packets in other languages call their own `computed` or `number`.
   std::string_view functionName{};
@@ -182,7 +190,7 @@ struct TextRule {
 }
 
 /// What `function` makes of all the field's places. `name` is the function's.
-[[nodiscard]] constexpr TextRule computed(ComputedText function, std::string_view name = {}) {
+[[nodiscard]] constexpr TextRule computed(ComputeValue function, std::string_view name = {}) {
   return {.kind = TextRule::Kind::Computed, .computed = function, .functionName = name};
 }
 
@@ -264,6 +272,29 @@ struct Field {
   }
 };
 
+/// The field with this key, the first of several; there must be one: in a table the compiler says
+/// so.
+[[nodiscard]] constexpr Field fieldNamed(std::span<const Field> fields, std::string_view key) {
+  const auto field = std::ranges::find(fields, key, &Field::key);
+  if (field == fields.end()) throw "no field of this key";
+  return *field;
+}
+
+/// The same field of the packet, for its records.
+[[nodiscard]] constexpr Field packetFieldNamed(std::span<const Field> fields,
+                                               std::string_view key) {
+  Field field = fieldNamed(fields, key);
+  for (Place& place : field.places) place = place.ofPacket();
+  return field;
+}
+
+/// The fields with these keys.
+template <class... Keys>
+[[nodiscard]] constexpr std::array<Field, sizeof...(Keys)> fieldsNamed(
+    std::span<const Field> fields, Keys... keys) {
+  return {fieldNamed(fields, keys)...};
+}
+
 /// A repeated record. Record i starts at base + perCount × (value of `counted`) + stride × i.
 struct RecordTable {
   std::string_view name;      ///< what one record is, for people
@@ -281,6 +312,12 @@ struct RecordTable {
   unsigned twinBase = 0;   ///< the twin table, placed by the same rule
   unsigned twinPerCount = 0;
   unsigned twinStride = 0;
+  /// What tells a record from the others of its list, in packet after packet: a channel and a
+  /// cell's number there. At most `kMaximumIdentity` of the fields may be there at once, whatever
+  /// their conditions. Empty: nothing but its position does.
+  std::span<const Field> identity{};
+
+  static constexpr std::size_t kMaximumIdentity = 4;
 };
 
 /// Whether two places read a common bit from the same origin. Places of different byte order are

@@ -45,6 +45,8 @@ struct PropertyListReading {
   std::span<const ListedValue> values{};
   std::string_view
       missingListLine{};  ///< the log line when there is no array of cells; may be empty
+  /// For a list of cells: the keys of those values that tell one cell from the others.
+  std::span<const std::string_view> identity{};
 };
 
 }  // namespace kestro

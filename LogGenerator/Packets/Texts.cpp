@@ -36,6 +36,10 @@ void writeName(const TextRule& rule, std::int64_t raw, TextBuffer& text) {
   }
 }
 
+void writeComputed(const ComputedValue& value, TextBuffer& text) {
+  text.append(*value.format, value.number);
+}
+
 /// What the texts of a cache depend on.
 struct CacheKey {
   TextRule rule;
@@ -81,7 +85,7 @@ void writeText(const TextRule& rule, std::int64_t raw, TextBuffer& text) {
       writeName(rule, raw, text);
       break;
     case TextRule::Kind::Computed:
-      rule.computed({&raw, 1}, text);
+      writeComputed(rule.computed({&raw, 1}), text);
       break;
     case TextRule::Kind::Hidden:
     case TextRule::Kind::Each:
@@ -113,7 +117,7 @@ Value makeText(const TextRule& rule, std::span<const std::int64_t> raw) {
     return texts;
   }
   if (rule.kind == TextRule::Kind::Computed) {
-    rule.computed(raw, text);
+    writeComputed(rule.computed(raw), text);
   } else {
     writeText(rule, raw[0], text);
   }

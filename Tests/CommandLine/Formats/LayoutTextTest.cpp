@@ -51,13 +51,14 @@ TEST(RuleText, ListsTheTextsOfATable) {
 }
 
 std::int64_t sum(std::span<const std::int64_t> raw) { return raw[0] + raw[1]; }
-void write(std::span<const std::int64_t>, TextBuffer&) {}
+constexpr NumberFormat kFormat = "%d";
+ComputedValue value(std::span<const std::int64_t>) { return {0, &kFormat}; }
 
 TEST(RuleText, SaysWhatNoFormulaCan) {
   EXPECT_EQ(ruleText(decimal().absentAt(64, "Not Present")), "%d; 64: Not Present");
   EXPECT_EQ(ruleText(decimal().absentAt(32767, "")), "%d; 32767: nothing");
   EXPECT_EQ(ruleText(decimal("%d dB").of(sum)), "computed, %d dB");
-  EXPECT_EQ(ruleText(computed(write)), "computed");
+  EXPECT_EQ(ruleText(computed(value)), "computed");
   EXPECT_EQ(ruleText(eachDecimal()), "a list of all, each %d");
   EXPECT_EQ(ruleText(supplied()), "known from another packet");
   EXPECT_EQ(ruleText(hidden()), "as it is");

@@ -15,8 +15,10 @@ using ::testing::Each;
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 
-void sum(std::span<const std::int64_t> raw, TextBuffer& text) {
-  text.append("%d", raw[0] + raw[1]);
+constexpr NumberFormat kSumFormat = "%d";
+
+ComputedValue sum(std::span<const std::int64_t> raw) {
+  return {.number = static_cast<double>(raw[0] + raw[1]), .format = &kSumFormat};
 }
 
 constexpr Field kExplainedFields[] = {

@@ -21,10 +21,12 @@ std::string textOf(const TextRule& rule, std::int64_t raw) {
 
 std::int64_t difference(std::span<const std::int64_t> raw) { return raw[0] - raw[1]; }
 
-void sumOfSquares(std::span<const std::int64_t> raw, TextBuffer& text) {
+constexpr NumberFormat kSquared = "%d squared";
+
+ComputedValue sumOfSquares(std::span<const std::int64_t> raw) {
   std::int64_t sum = 0;
   for (const std::int64_t number : raw) sum += number * number;
-  text.append("%d squared", sum);
+  return {.number = static_cast<double>(sum), .format = &kSquared};
 }
 
 TEST(TextRuleTest, MultipliesAndAddsWholeNumbers) {
@@ -118,8 +120,8 @@ constexpr NamedValue kSameNames[] = {{0, "Off"}, {1, "On"}};
 constexpr NamedValue kOtherTexts[] = {{0, "Off"}, {1, "Up"}};
 constexpr NamedValue kOtherValues[] = {{0, "Off"}, {2, "On"}};
 
-void writeOne(std::span<const std::int64_t> /*raw*/, TextBuffer& text) { text.append("one"); }
-void writeTwo(std::span<const std::int64_t> /*raw*/, TextBuffer& text) { text.append("two"); }
+ComputedValue alwaysOne(std::span<const std::int64_t> /*raw*/) { return {1, &kSquared}; }
+ComputedValue alwaysTwo(std::span<const std::int64_t> /*raw*/) { return {2, &kSquared}; }
 
 TEST(TextCacheTest, IsSharedByRulesThatAreEqualInEveryPartOnly) {
   const auto cacheOf = [](const TextRule& rule) { return TextCache::forField({"A", u8(0), rule}); };
@@ -141,8 +143,8 @@ TEST(TextCacheTest, IsSharedByRulesThatAreEqualInEveryPartOnly) {
       scaled("%f w", 0, 1),
       scaled("%f w", 1, 1),
       scaled("%f w", 0, 2),
-      computed(writeOne),
-      computed(writeTwo),
+      computed(alwaysOne),
+      computed(alwaysTwo),
   };
   std::set<TextCache*> caches;
   for (const TextRule& rule : rules) caches.insert(cacheOf(rule));
