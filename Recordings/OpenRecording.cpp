@@ -5,10 +5,14 @@
 
 #include <algorithm>
 #include <array>
+#include <string_view>
 #include <utility>
 
+#include "Recordings/DlfFormat.h"
+#include "Recordings/DlfReader.h"
 #include "Recordings/PcapReader.h"
 #include "Recordings/PcapngReader.h"
+#include "Recordings/SnapshotReader.h"
 
 namespace kestro {
 namespace {
@@ -28,6 +32,28 @@ constexpr std::array kBeginnings = {
     Beginning{0x0A0D0D0A, RecordingForm::Pcapng},  // the same in both byte orders
 };
 
+bool isVersionReport(ByteView head) noexcept {
+  return head.size() >= kShortestDlfRecord &&
+         loadLittleEndian<std::uint16_t>(head, 0) >= kShortestDlfRecord &&
+         loadLittleEndian<std::uint16_t>(head, kDlfCodeOffset) == kDlfVersionReport;
+}
+
+/// In binary form or as XML, which may begin with a byte order mark and blanks.
+bool isPropertyList(ByteView head) noexcept {
+  using namespace std::string_view_literals;
+  constexpr std::array kMarks = {"\xEF\xBB\xBF"sv, "\xFF\xFE"sv, "\xFE\xFF\0"sv};
+  constexpr std::array kElements = {"<?xml"sv, "<!--"sv, "<!DOCTYPE"sv, "<plist"sv};
+  std::string_view text(reinterpret_cast<const char*>(head.data()), head.size());
+  if (text.starts_with("bplist"sv)) return true;
+  for (const std::string_view mark : kMarks) {
+    if (text.starts_with(mark)) text.remove_prefix(mark.size());
+  }
+  text.remove_prefix(std::min(text.find_first_not_of(" \t\r\n"sv), text.size()));
+  return text.starts_with("<\0"sv) || std::ranges::any_of(kElements, [&](std::string_view element) {
+           return text.starts_with(element);
+         });
+}
+
 Result<std::unique_ptr<RecordingReader>> asReader(Result<PcapReader> reader) {
   if (!reader) return tl::unexpected(reader.error());
   return std::make_unique<PcapReader>(*std::move(reader));
@@ -44,18 +70,29 @@ Result<std::unique_ptr<RecordingReader>> asReader(Result<std::unique_ptr<Reader>
 std::optional<RecordingForm> formOfRecording(ByteView head) noexcept {
   const auto magic = loadLittleEndian<std::uint32_t>(head, 0);
   const auto* found = std::ranges::find(kBeginnings, magic, &Beginning::magic);
-  if (found == kBeginnings.end()) return std::nullopt;
-  return found->form;
+  if (found != kBeginnings.end()) return found->form;
+  if (isVersionReport(head)) return RecordingForm::Dlf;
+  if (isPropertyList(head)) return RecordingForm::Snapshot;
+  return std::nullopt;
 }
 
 Result<std::unique_ptr<RecordingReader>> openRecording(RecordedFile file,
-                                                       const RecordingContext& /*context*/) {
+                                                       const RecordingContext& context) {
   const auto head = file.ahead(kRecordingHeadSize);
   if (!head) return tl::unexpected(head.error());
   if (head->empty()) return failure(fmt::format("{}: the file is empty", file.path()));
   const auto form = formOfRecording(*head);
-  if (form == RecordingForm::Pcap) return asReader(PcapReader::open(std::move(file)));
-  if (form == RecordingForm::Pcapng) return asReader(PcapngReader::open(std::move(file)));
+  if (!form) return failure(fmt::format("{}: unknown file format", file.path()));
+  switch (*form) {
+    case RecordingForm::Pcap:
+      return asReader(PcapReader::open(std::move(file)));
+    case RecordingForm::Pcapng:
+      return asReader(PcapngReader::open(std::move(file)));
+    case RecordingForm::Dlf:
+      return asReader(DlfReader::open(std::move(file), context));
+    case RecordingForm::Snapshot:
+      return asReader(SnapshotReader::open(std::move(file), context));
+  }
   return failure(fmt::format("{}: unknown file format", file.path()));
 }
 

@@ -2,36 +2,18 @@
 // Opening a recording, whatever its form.
 #pragma once
 
-#include <cstdint>
-#include <functional>
+#include <cstddef>
 #include <memory>
 #include <optional>
 #include <string>
-#include <string_view>
-#include <vector>
 
-#include "Platform/PropertyListCoding.h"
+#include "Platform/Bytes.h"
 #include "Platform/Result.h"
 #include "Recordings/RecordedFile.h"
+#include "Recordings/RecordingContext.h"
 #include "Recordings/RecordingReader.h"
 
 namespace kestro {
-
-/// The technologies that have a log code, as constant texts of Platform/TelephonyService.h.
-using TechnologiesOfCode = std::function<std::vector<std::string_view>(std::uint16_t logCode)>;
-
-/// What some of the forms need to be read.
-struct RecordingContext {
-  /// For snapshots. Must outlive the reader.
-  const PropertyListCoding& coding;
-  /// Decides what the packets of a form are that does not name their technology (DLF logs,
-  /// snapshots): the only technology that has all their codes. Extra packets' codes are not asked
-  /// for.
-  TechnologiesOfCode technologiesOfCode = {};
-  /// What such packets are taken for, a constant text of Platform/TelephonyService.h; empty to
-  /// decide by their codes.
-  std::string_view technology = {};
-};
 
 /// As many bytes as it takes to tell a recording's form.
 inline constexpr std::size_t kRecordingHeadSize = 512;

@@ -20,10 +20,13 @@ Error systemError(const std::string& path) {
   return Error{fmt::format("{}: {}", path, std::strerror(errno))};
 }
 
-std::optional<std::uint64_t> sizeOfFile(int descriptor) {
+/// The size of what follows `start`; absent for what is no file on a disk.
+std::optional<std::uint64_t> sizeOfFile(int descriptor, off_t start) {
   struct stat status = {};
-  if (::fstat(descriptor, &status) != 0 || !S_ISREG(status.st_mode)) return std::nullopt;
-  return static_cast<std::uint64_t>(status.st_size);
+  if (start < 0 || ::fstat(descriptor, &status) != 0 || !S_ISREG(status.st_mode)) {
+    return std::nullopt;
+  }
+  return static_cast<std::uint64_t>(std::max<off_t>(status.st_size - start, 0));
 }
 
 }  // namespace
@@ -37,11 +40,15 @@ Result<RecordedFile> RecordedFile::open(const std::string& path) {
 }
 
 RecordedFile::RecordedFile(std::string path, int descriptor)
-    : _path(std::move(path)), _descriptor(descriptor), _size(sizeOfFile(descriptor)) {}
+    : _path(std::move(path)),
+      _descriptor(descriptor),
+      _start(::lseek(descriptor, 0, SEEK_CUR)),
+      _size(sizeOfFile(descriptor, _start)) {}
 
 RecordedFile::RecordedFile(RecordedFile&& other) noexcept
     : _path(std::move(other._path)),
       _descriptor(std::exchange(other._descriptor, -1)),
+      _start(other._start),
       _size(other._size),
       _buffer(std::move(other._buffer)),
       _begin(std::exchange(other._begin, 0)),
@@ -54,6 +61,7 @@ RecordedFile& RecordedFile::operator=(RecordedFile&& other) noexcept {
   close();
   _path = std::move(other._path);
   _descriptor = std::exchange(other._descriptor, -1);
+  _start = other._start;
   _size = other._size;
   _buffer = std::move(other._buffer);
   _begin = std::exchange(other._begin, 0);
@@ -70,6 +78,7 @@ void RecordedFile::close() noexcept {
 }
 
 Result<ByteView> RecordedFile::fillTo(std::size_t count) {
+  if (_hasEnded) return buffered();
   std::copy(_buffer.begin() + static_cast<std::ptrdiff_t>(_begin),
             _buffer.begin() + static_cast<std::ptrdiff_t>(_end), _buffer.begin());
   _end -= std::exchange(_begin, 0);
@@ -105,6 +114,18 @@ Result<std::uint64_t> RecordedFile::passOver(std::uint64_t count) {
     passed += step;
   }
   return passed;
+}
+
+Result<void> RecordedFile::rewind() {
+  if (_fetched != _end) {
+    if (!isOnDisk()) return failure(fmt::format("{}: cannot be read twice", _path));
+    if (::lseek(_descriptor, _start, SEEK_SET) < 0) return tl::unexpected(systemError(_path));
+    _fetched = 0;
+    _end = 0;
+    _hasEnded = false;
+  }
+  _begin = 0;
+  return {};
 }
 
 Result<std::size_t> RecordedFile::read(std::span<std::uint8_t> target) {

@@ -49,6 +49,13 @@ class RecordedFile {
   /// Copies the next bytes to `target`, at least one unless the file has ended; how many.
   [[nodiscard]] Result<std::size_t> read(std::span<std::uint8_t> target);
 
+  /// Goes back to where the file was opened. That is possible as long as everything read is still
+  /// in memory, as it is when nothing was asked for but bytes ahead, and with a file on a disk.
+  [[nodiscard]] Result<void> rewind();
+
+  /// Whether `rewind` is possible however much is read.
+  [[nodiscard]] bool isOnDisk() const noexcept { return _size.has_value(); }
+
   /// How many bytes have been read: the offset of the next one.
   [[nodiscard]] std::uint64_t position() const noexcept { return _fetched - (_end - _begin); }
 
@@ -67,7 +74,8 @@ class RecordedFile {
 
   std::string _path;
   int _descriptor;
-  std::optional<std::uint64_t> _size;
+  std::int64_t _start = 0;             ///< where the file was opened, if it is on a disk
+  std::optional<std::uint64_t> _size;  ///< likewise, of what follows
   Bytes _buffer;
   std::size_t _begin = 0;  ///< of what is buffered and unread
   std::size_t _end = 0;

@@ -9,6 +9,7 @@
 
 #include "Platform/Linux/LinuxPlatform.h"
 #include "Recordings/OpenRecording.h"
+#include "Tests/Recordings/DlfBytes.h"
 #include "Tests/Recordings/PcapBytes.h"
 #include "Tests/Recordings/PcapngBytes.h"
 #include "Tests/Support/TemporaryDirectory.h"
@@ -61,6 +62,31 @@ TEST_F(OpenRecordingTest, PcapngIsKnownByItsFirstFourBytesAndRead) {
   ASSERT_TRUE(reader.has_value()) << reader.error().message;
   EXPECT_EQ(reader.value()->form(), RecordingForm::Pcapng);
   EXPECT_EQ(reader.value()->next().value().value().technology, "LTE");
+}
+
+TEST_F(OpenRecordingTest, ADlfLogIsKnownByItsVersionReport) {
+  Bytes log = dlfVersionReport();
+  const auto reader = open(log);
+  ASSERT_TRUE(reader.has_value()) << reader.error().message;
+  EXPECT_EQ(reader.value()->form(), RecordingForm::Dlf);
+  log[3] ^= 1;
+  EXPECT_EQ(formOfRecording(log), std::nullopt);
+}
+
+TEST_F(OpenRecordingTest, ASnapshotIsKnownAsAPropertyList) {
+  using namespace std::string_view_literals;
+  for (const std::string_view head :
+       {"<?xml version"sv, "<plist>"sv, "\n <!-- c --><plist>"sv, "\xEF\xBB\xBF<?xml"sv,
+        "bplist00"sv, "<\0?\0"sv, "\xFF\xFE<\0?\0"sv, "\xFE\xFF\0<\0?"sv}) {
+    EXPECT_EQ(formOfRecording(Bytes(head.begin(), head.end())), RecordingForm::Snapshot) << head;
+  }
+  for (const std::string_view head : {"\xEF\xBB\xBFTimestamp,"sv, "<html>"sv, "  "sv}) {
+    EXPECT_EQ(formOfRecording(Bytes(head.begin(), head.end())), std::nullopt) << head;
+  }
+  const Dictionary snapshot{{"Timestamp", "2012-03-04 13:05:09 +0100"}};
+  const auto reader = open(_coding->xml(snapshot).value());
+  ASSERT_TRUE(reader.has_value()) << reader.error().message;
+  EXPECT_EQ(reader.value()->form(), RecordingForm::Snapshot);
 }
 
 TEST_F(OpenRecordingTest, WhatIsOfNoFormIsRefused) {
