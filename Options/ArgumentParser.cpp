@@ -115,6 +115,9 @@ CLI::Option* declareTarget(CLI::App& app, const OptionRow& row, Target* target) 
   if constexpr (std::is_arithmetic_v<Value>) {
     if (row.range) option->check(rangeCheck<Value>(*row.range));
   }
+  if constexpr (std::is_same_v<Value, std::vector<std::string>>) {
+    if (!isPositional(row)) option->expected(1)->allow_extra_args(false)->take_all();
+  }
   return option->option_text(valueText(row));
 }
 

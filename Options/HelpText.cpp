@@ -25,6 +25,10 @@ std::string textOfDefault(const std::optional<Value>& value) {
   return value ? textOfDefault(*value) : "";
 }
 
+std::string textOfDefault(const std::vector<std::string>& values) {
+  return fmt::format("{}", fmt::join(values, ", "));
+}
+
 /// The value that holds unless another is given; empty when there is none.
 std::string defaultText(const OptionRow& row) {
   if (row.impliedValue) return *row.impliedValue;

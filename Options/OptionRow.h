@@ -34,10 +34,13 @@ using Answer = std::function<std::string()>;
 using ValueReader = std::function<std::string(const std::string& text)>;
 
 /// Where an option's value goes; until the arguments are read it holds the default. A bool makes a
-/// flag, which takes no value.
-using OptionTarget = std::variant<std::string*, bool*, double*, std::uint64_t*, std::optional<int>*,
-                                  std::optional<std::uint32_t>*, std::optional<std::uint64_t>*,
-                                  LogPriority*, Answer, ValueReader>;
+/// flag, which takes no value; a vector an option that may be given several times, or a positional
+/// argument that takes all that there are, in their order. (Of these "[a,b]" is two, "./[a,b]"
+/// one.)
+using OptionTarget =
+    std::variant<std::string*, std::vector<std::string>*, bool*, double*, std::uint64_t*,
+                 std::optional<int>*, std::optional<std::uint32_t>*, std::optional<std::uint64_t>*,
+                 LogPriority*, Answer, ValueReader>;
 
 /// One row. What the target points to must live until the arguments are read.
 struct OptionRow {

@@ -6,6 +6,7 @@
 #include <optional>
 #include <stdexcept>
 #include <string>
+#include <vector>
 
 #include "Options/ArgumentParser.h"
 #include "Tests/Options/Parsing.h"
@@ -13,6 +14,7 @@
 namespace kestro {
 namespace {
 
+using ::testing::ElementsAre;
 using ::testing::HasSubstr;
 using ::testing::Not;
 using ::testing::StartsWith;
@@ -57,6 +59,36 @@ TEST(ArgumentParserTest, EveryKindOfTargetIsFilled) {
   EXPECT_EQ(code, 0xB179U);
   EXPECT_EQ(message, 3U);
   EXPECT_EQ(priority, LogPriority::Debug);
+}
+
+TEST(ArgumentParserTest, APositionalListTakesAllThatThereAreInTheirOrder) {
+  std::vector<std::string> files;
+  bool flag = false;
+  const CommandRow program =
+      programOf({{.name = "FILE",
+                  .target = &files,
+                  .isRequired = true,
+                  .problem =
+                      [](const std::string& file) {
+                        return file == "bad" ? std::string("bad is no file") : std::string();
+                      }},
+                 {.name = "--flag", .target = &flag}});
+  chosen(program, {"b", "--flag", "a,[c]", "./[d,e]", "-", "b"});
+  EXPECT_THAT(files, ElementsAre("b", "a,[c]", "./[d,e]", "-", "b"));
+  EXPECT_TRUE(flag);
+  EXPECT_THAT(refusal(program, {"b", "bad"}), HasSubstr("bad is no file"));
+  EXPECT_EQ(refusal(program, {}), "FILE is required");
+  EXPECT_THAT(said(program, {"--help"}).text, HasSubstr("FILE..."));
+}
+
+TEST(ArgumentParserTest, AnOptionThatIsAListMayBeGivenAgainWithOneValueEach) {
+  std::vector<std::string> rules;
+  std::string file;
+  const CommandRow program =
+      programOf({{.name = "--rule", .target = &rules}, {.name = "FILE", .target = &file}});
+  chosen(program, {"--rule", "a < b", "drive", "--rule=c, d", "--rule=[e]"});
+  EXPECT_THAT(rules, ElementsAre("a < b", "c, d", "[e]"));
+  EXPECT_EQ(file, "drive");
 }
 
 TEST(ArgumentParserTest, AnOptionMayHaveAShortName) {
