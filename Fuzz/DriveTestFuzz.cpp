@@ -39,8 +39,9 @@ void tryInput(ByteView bytes) {
   const MemoryFile file(input.rest());
   VirtualPlatform platform(propertyListCoding());
   const SourceReporter ignore = [](std::string_view) {};
-  const auto source = openSource(
-      {.kind = "drive-test", .argument = file.path(), .technology = technology}, platform, ignore);
+  const auto source =
+      openSource({.kind = "drive-test", .argument = file.path(), .technology = technology},
+                 sourceServices(platform), ignore);
   if (source) play(**source);
 }
 

@@ -5,11 +5,10 @@
 #include <fmt/format.h>
 
 #include <algorithm>
-#include <cerrno>
 #include <charconv>
 #include <cmath>
 #include <istream>
-#include <system_error>
+#include <sstream>
 #include <utility>
 
 namespace kestro {
@@ -171,20 +170,33 @@ std::optional<DriveTestFamily> familyOfNetworkMode(std::string_view mode) noexce
   return found->family;
 }
 
+bool isDriveTestLog(ByteView head) {
+  std::istringstream line(std::string(head.begin(), std::ranges::find(head, '\n')));
+  const auto names = CsvReader(line).next();
+  if (!names || !names->has_value()) return false;
+  return std::ranges::all_of(kColumns, [&](const Column& column) {
+    return !column.isRequired || std::ranges::count((*names)->fields, column.name) > 0;
+  });
+}
+
 Result<DriveTestLog> DriveTestLog::open(const std::string& path) {
-  auto file = std::make_unique<std::ifstream>(path, std::ios::binary);
-  if (!file->is_open()) {
-    return failure(fmt::format("{}: {}", path, std::generic_category().message(errno)));
-  }
-  DriveTestLog log(path, std::move(file));
+  auto file = RecordedFile::open(path);
+  if (!file) return tl::unexpected(file.error());
+  return open(*std::move(file));
+}
+
+Result<DriveTestLog> DriveTestLog::open(RecordedFile file) {
+  DriveTestLog log(std::move(file));
   if (auto read = log.readFirstLine(); !read) {
-    return failure(fmt::format("{}: {}", path, read.error().message));
+    return failure(fmt::format("{}: {}", log._path, read.error().message));
   }
   return log;
 }
 
-DriveTestLog::DriveTestLog(std::string path, std::unique_ptr<std::ifstream> file)
-    : _path(std::move(path)), _file(std::move(file)), _csv(std::make_unique<CsvReader>(*_file)) {}
+DriveTestLog::DriveTestLog(RecordedFile file)
+    : _path(file.path()),
+      _file(std::make_unique<RecordedFileStream>(std::move(file))),
+      _csv(std::make_unique<CsvReader>(*_file)) {}
 
 Result<void> DriveTestLog::readFirstLine() {
   if (beginsInUtf16(*_file)) return failure(kInUtf16);

@@ -5,15 +5,17 @@
 #include <array>
 #include <chrono>
 #include <cstdint>
-#include <fstream>
 #include <memory>
 #include <optional>
 #include <string>
 #include <string_view>
 #include <vector>
 
+#include "Platform/Bytes.h"
 #include "Platform/Result.h"
+#include "Recordings/RecordedFile.h"
 #include "Sources/CsvReader.h"
+#include "Sources/RecordedFileStream.h"
 
 namespace kestro {
 
@@ -77,12 +79,22 @@ struct DriveTestProblems {
   std::string first;
 };
 
+/// Whether what begins with `head` is a drive-test log: the first line has the required columns
+/// (time, network mode, level). `head` need not reach to that line's end.
+[[nodiscard]] bool isDriveTestLog(ByteView head);
+
+/// As many bytes as `isDriveTestLog` looks at.
+inline constexpr std::size_t kDriveTestHeadSize = 4096;
+
 /// A log that is being read from its beginning to its end, in constant memory.
 class DriveTestLog {
  public:
-  /// Opens a log and reads its first line. The error says why it cannot be used: no such file,
-  /// empty, no CSV, or a required column (time, network mode, level) is missing.
+  /// Opens a log ("-" is standard input) and reads its first line. The error says why it cannot be
+  /// used: no such file, empty, no CSV, or a required column (time, network mode, level) is
+  /// missing.
   [[nodiscard]] static Result<DriveTestLog> open(const std::string& path);
+  /// The same for a file that is unread still.
+  [[nodiscard]] static Result<DriveTestLog> open(RecordedFile file);
 
   /// The next usable row, or nothing at the end. A row that cannot be used (its number of fields
   /// differs from the first line's, its time or network mode is unreadable) is left out; a value
@@ -93,6 +105,11 @@ class DriveTestLog {
 
   [[nodiscard]] const DriveTestProblems& problems() const noexcept { return _problems; }
 
+  /// How much of it has been read, 0 to 1; absent when nobody knows.
+  [[nodiscard]] std::optional<double> fractionRead() const noexcept {
+    return _file->file().fractionRead();
+  }
+
   /// The names of the columns that the log does not have.
   [[nodiscard]] const std::vector<std::string>& missingColumns() const noexcept {
     return _missingColumns;
@@ -101,14 +118,14 @@ class DriveTestLog {
  private:
   using Values = std::array<std::optional<std::string>, kDriveTestColumnCount>;
 
-  DriveTestLog(std::string path, std::unique_ptr<std::ifstream> file);
+  explicit DriveTestLog(RecordedFile file);
   [[nodiscard]] Result<void> readFirstLine();
   [[nodiscard]] Result<DriveTestRow> rowOf(const CsvRecord& record);
   [[nodiscard]] Values measuredValues(const CsvRecord& record);
   void note(std::uint64_t& count, std::string problem);
 
   std::string _path;
-  std::unique_ptr<std::ifstream> _file;
+  std::unique_ptr<RecordedFileStream> _file;
   std::unique_ptr<CsvReader> _csv;
   std::size_t _fieldCount = 0;
   std::array<std::optional<std::size_t>, kDriveTestColumnCount> _fieldOfColumn;

@@ -9,26 +9,45 @@
 #include <iterator>
 #include <utility>
 
-namespace kestro {
+#include "Recordings/PositionComment.h"
 
-Result<std::unique_ptr<DriveTestSource>> DriveTestSource::open(
-    const std::string& path, std::unique_ptr<DriveTestEncoder> encoder, SourceReporter report) {
-  auto log = DriveTestLog::open(path);
+namespace kestro {
+namespace {
+
+std::vector<std::string> commentsOf(const DriveTestRow& row) {
+  const auto& latitude = row.text(DriveTestColumn::Latitude);
+  const auto& longitude = row.text(DriveTestColumn::Longitude);
+  if (!latitude || !longitude) return {};
+  return {positionComment(*latitude, *longitude, row.text(DriveTestColumn::Speed).value_or(""))};
+}
+
+}  // namespace
+
+Result<std::unique_ptr<DriveTestSource>> DriveTestSource::open(RecordedFile file,
+                                                               const MakeEncoder& makeEncoder,
+                                                               SourceReporter report) {
+  const std::string path = file.path();
+  auto log = DriveTestLog::open(std::move(file));
   if (!log) return tl::unexpected(log.error());
   if (const auto& missing = log->missingColumns(); !missing.empty()) {
     report(fmt::format("{}: no columns {}; their values are left out", path,
                        fmt::join(missing, ", ")));
   }
-  return std::unique_ptr<DriveTestSource>(
-      new DriveTestSource(path, std::move(*log), std::move(encoder), std::move(report)));
+  auto first = log->next();
+  if (!first) return tl::unexpected(first.error());
+  auto encoder = makeEncoder(first->has_value() ? (*first)->family : DriveTestFamily::LTE);
+  return std::unique_ptr<DriveTestSource>(new DriveTestSource(
+      path, std::move(*log), std::move(*first), std::move(encoder), std::move(report)));
 }
 
 DriveTestSource::DriveTestSource(std::string path, DriveTestLog log,
+                                 std::optional<DriveTestRow> first,
                                  std::unique_ptr<DriveTestEncoder> encoder, SourceReporter report)
     : _path(std::move(path)),
       _log(std::move(log)),
       _encoder(std::move(encoder)),
-      _report(std::move(report)) {}
+      _report(std::move(report)),
+      _rowOfNextSecond(std::move(first)) {}
 
 Result<SourceStep> DriveTestSource::next() {
   while (_messages.empty()) {
@@ -43,13 +62,17 @@ Result<SourceStep> DriveTestSource::next() {
     _rows.pop_front();
     _time = timed.time;
     _moment = timed.moment;
+    _comments = commentsOf(timed.row);
     auto messages = _encoder->messages(timed.row);
     std::ranges::move(messages, std::back_inserter(_messages));
   }
   _message = std::move(_messages.front());
   _messages.pop_front();
-  return SourceEvent{
-      .time = _time, .technology = _encoder->technology(), .message = _message, .moment = _moment};
+  return SourceEvent{.time = _time,
+                     .technology = _encoder->technology(),
+                     .message = _message,
+                     .moment = _moment,
+                     .comments = _comments};
 }
 
 Result<void> DriveTestSource::readSecond() {

@@ -3,6 +3,7 @@
 #pragma once
 
 #include <deque>
+#include <functional>
 #include <memory>
 #include <optional>
 #include <string>
@@ -38,12 +39,21 @@ class DriveTestSource : public LogSource {
   /// rows begin anew at that second.
   static constexpr std::size_t kMaximumRowsOfASecond = 1'000;
 
-  /// Opens the log. Missing columns and unusable rows are told to `report`.
-  [[nodiscard]] static Result<std::unique_ptr<DriveTestSource>> open(
-      const std::string& path, std::unique_ptr<DriveTestEncoder> encoder, SourceReporter report);
+  /// Makes the encoder of a log whose first usable row is of this family (LTE where there is none).
+  using MakeEncoder = std::function<std::unique_ptr<DriveTestEncoder>(DriveTestFamily first)>;
+
+  /// A source of the log in a file that is unread still. Missing columns and unusable rows are told
+  /// to `report`. The comment of a message is its row's position.
+  [[nodiscard]] static Result<std::unique_ptr<DriveTestSource>> open(RecordedFile file,
+                                                                     const MakeEncoder& makeEncoder,
+                                                                     SourceReporter report);
 
   [[nodiscard]] std::string_view technology() const override { return _encoder->technology(); }
   [[nodiscard]] Result<SourceStep> next() override;
+  [[nodiscard]] std::string_view madeUp() const noexcept override { return kMadeUpFromDriveTest; }
+  [[nodiscard]] std::optional<double> fractionRead() const noexcept override {
+    return _log.fractionRead();
+  }
   [[nodiscard]] Result<void> restart() override;
 
  private:
@@ -53,8 +63,8 @@ class DriveTestSource : public LogSource {
     DriveTestRow row;
   };
 
-  DriveTestSource(std::string path, DriveTestLog log, std::unique_ptr<DriveTestEncoder> encoder,
-                  SourceReporter report);
+  DriveTestSource(std::string path, DriveTestLog log, std::optional<DriveTestRow> first,
+                  std::unique_ptr<DriveTestEncoder> encoder, SourceReporter report);
   [[nodiscard]] Result<void> readSecond();
   void reportProblems();
 
@@ -69,6 +79,7 @@ class DriveTestSource : public LogSource {
   Moment _moment{};
   std::deque<Bytes> _messages;
   Bytes _message;
+  std::vector<std::string> _comments;  ///< of the row
 };
 
 }  // namespace kestro

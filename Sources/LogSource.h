@@ -5,6 +5,8 @@
 #include <chrono>
 #include <functional>
 #include <optional>
+#include <span>
+#include <string>
 #include <string_view>
 #include <variant>
 
@@ -26,6 +28,8 @@ struct SourceEvent {
   ByteView message;
   /// When the source had the message, by its own clock; absent where it has none: that is now.
   std::optional<Moment> moment = std::nullopt;
+  /// What is to be said of the message, as comments of a recording are; valid as it is.
+  std::span<const std::string> comments = {};
 };
 
 /// Nothing is there yet; the source's ready handler will say when to ask again.
@@ -52,6 +56,13 @@ class LogSource {
   /// `restart`.
   [[nodiscard]] virtual Result<SourceStep> next() = 0;
 
+  /// What made the messages up, in whole or in part: "simulation" or "drive-test"; empty for what a
+  /// baseband has sent. Valid until the next `next`.
+  [[nodiscard]] virtual std::string_view madeUp() const noexcept { return {}; }
+
+  /// How much there has been of what there will be, 0 to 1; absent when nobody knows.
+  [[nodiscard]] virtual std::optional<double> fractionRead() const noexcept { return std::nullopt; }
+
   /// Goes back to the beginning: the times of the events start again from there.
   [[nodiscard]] virtual Result<void> restart() = 0;
 
@@ -59,6 +70,10 @@ class LogSource {
   /// more. It must not destroy the source.
   virtual void setReadyHandler(std::function<void()> handler) { static_cast<void>(handler); }
 };
+
+/// What sources say of messages that they made up; see `LogSource::madeUp`.
+inline constexpr std::string_view kMadeUpBySimulation = "simulation";
+inline constexpr std::string_view kMadeUpFromDriveTest = "drive-test";
 
 /// Takes one line for the people who run the server: what a source left out, and why.
 using SourceReporter = std::function<void(std::string_view line)>;

@@ -69,6 +69,7 @@ class PacketSimulation : public LogSource {
 
   [[nodiscard]] std::string_view technology() const override { return _baseband->technology(); }
   [[nodiscard]] Result<SourceStep> next() override;
+  [[nodiscard]] std::string_view madeUp() const noexcept override { return kMadeUpBySimulation; }
   [[nodiscard]] Result<void> restart() override;
 
  private:

@@ -5,50 +5,65 @@
 
 #include <utility>
 
+#include "Platform/TelephonyService.h"
+#include "Sources/StreamSource.h"
+
 namespace kestro {
 
-Result<std::unique_ptr<RecordingSource>> RecordingSource::open(const std::string& path,
-                                                               std::string_view technology,
+Result<std::unique_ptr<RecordingSource>> RecordingSource::open(RecordedFile file,
+                                                               RecordingContext context,
                                                                SourceReporter report) {
-  auto reader = PcapReader::open(path);
-  if (!reader) return tl::unexpected(reader.error());
-  if (technology.empty()) technology = reader->technology();
-  return std::unique_ptr<RecordingSource>(
-      new RecordingSource(path, std::move(*reader), technology, std::move(report)));
+  std::unique_ptr<RecordingSource> source(
+      new RecordingSource(file.path(), std::move(context), std::move(report)));
+  if (auto begun = source->begin(openRecording(std::move(file), source->_context)); !begun) {
+    return tl::unexpected(begun.error());
+  }
+  return source;
 }
 
-RecordingSource::RecordingSource(std::string path, PcapReader reader, std::string_view technology,
-                                 SourceReporter report)
-    : _path(std::move(path)),
-      _reader(std::move(reader)),
-      _technology(technology),
-      _report(std::move(report)) {}
+Result<void> RecordingSource::begin(Result<Reader> reader) {
+  if (!reader) return tl::unexpected(reader.error());
+  _reader = *std::move(reader);
+  _first = _reader->next();
+  _technology = _context.technology;
+  if (!_technology.empty()) return {};
+  const auto& announced = _reader->technologies();
+  if (_first->has_value() && (*_first)->has_value()) {
+    _technology = (**_first)->technology;
+  } else if (!announced.empty()) {
+    _technology = announced.front();
+  } else {
+    _technology = kTqLogChannelTechnology_IFX;
+  }
+  return {};
+}
 
 Result<SourceStep> RecordingSource::next() {
   while (true) {
-    const auto message = _reader.next();
+    const auto message = _first ? *std::exchange(_first, std::nullopt) : _reader->next();
     if (!message) return tl::unexpected(message.error());
     if (!message->has_value()) break;
-    const auto time = _timeline.advanceTo((*message)->time);
-    if ((*message)->isCut()) continue;
+    const RecordedMessage& recorded = **message;
+    const auto time = _timeline.advanceTo(recorded.time);
+    if (recorded.isCut()) continue;
+    if (_context.technology.empty()) _technology = recorded.technology;
     return SourceEvent{.time = time,
                        .technology = _technology,
-                       .message = (*message)->bytes,
-                       .moment = (*message)->time};
+                       .message = recorded.bytes,
+                       .moment = recorded.time,
+                       .comments = recorded.comments};
   }
-  if (_reader.cutMessageCount() > 0) {
+  if (_reader->cutMessageCount() > 0) {
     _report(fmt::format("{}: {} of {} messages had been cut when they were recorded; left out",
-                        _path, _reader.cutMessageCount(), _reader.messageCount()));
+                        _path, _reader->cutMessageCount(), _reader->messageCount()));
   }
   return SourceEnded{};
 }
 
 Result<void> RecordingSource::restart() {
-  auto reader = PcapReader::open(_path);
-  if (!reader) return tl::unexpected(reader.error());
-  _reader = std::move(*reader);
+  if (_path == RecordedFile::kStandardInput) return cannotBeReadTwice();
   _timeline = {};
-  return {};
+  return begin(openRecording(_path, _context));
 }
 
 }  // namespace kestro

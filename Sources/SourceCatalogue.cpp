@@ -7,6 +7,8 @@
 
 #include <algorithm>
 #include <array>
+#include <string>
+#include <utility>
 #include <vector>
 
 #include "Platform/TelephonyService.h"
@@ -19,6 +21,7 @@
 #include "Sources/LTE/LTESimulation.h"
 #include "Sources/PacketSimulation.h"
 #include "Sources/RecordingSource.h"
+#include "Sources/StoredStream.h"
 #include "Sources/StreamSource.h"
 #include "Sources/UTRAN/UTRANSimulation.h"
 
@@ -102,14 +105,13 @@ constexpr std::array kDriveTestWriters = {
 
 /// Refuses a technology that no row makes, and names those that there are.
 template <class Rows>
-Result<void> checkMade(const SourceRequest& request, std::string_view technology,
-                       const Rows& rows) {
+Result<void> checkMade(std::string_view kind, std::string_view technology, const Rows& rows) {
   std::vector<std::string_view> made;
   made.reserve(rows.size());
   for (const auto& row : rows) made.push_back(row.technology);
   if (std::ranges::find(made, technology) != made.end()) return {};
-  return failure(fmt::format("the source \"{}\" cannot make {} messages, only {}", request.kind,
-                             technology, fmt::join(made, ", ")));
+  return failure(fmt::format("the source \"{}\" cannot make {} messages, only {}", kind, technology,
+                             fmt::join(made, ", ")));
 }
 
 std::string_view technologyOfSimulation(const SourceRequest& request) {
@@ -119,52 +121,59 @@ std::string_view technologyOfSimulation(const SourceRequest& request) {
 }
 
 Result<void> checkSimulation(const SourceRequest& request) {
-  return checkMade(request, technologyOfSimulation(request), kSimulations);
+  return checkMade(request.kind, technologyOfSimulation(request), kSimulations);
 }
 
-OpenedSource openSimulation(const SourceRequest& request, Platform& platform,
+OpenedSource openSimulation(const SourceRequest& request, const SourceServices& services,
                             const SourceReporter& /*report*/) {
   const auto* row =
       std::ranges::find(kSimulations, technologyOfSimulation(request), &Simulation::technology);
-  return row->make(platform.propertyListCoding());
+  return row->make(services.propertyListCoding);
 }
 
-// A capture says itself what it speaks.
+/// What is to be said of a file that is missing and looks like a kind of sources.
+std::string hintOfKinds(std::string_view file) {
+  if (file.find_first_of("./") != std::string_view::npos) return "";
+  std::vector<std::string_view> names;
+  for (const SourceKind& kind : sourceKinds()) names.push_back(kind.name);
+  return fmt::format(" (nor is it one of the sources {})", fmt::join(names, ", "));
+}
+
+// A recording says itself what it speaks.
 Result<void> checkCapture(const SourceRequest& /*request*/) { return {}; }
 
-OpenedSource openCapture(const SourceRequest& request, Platform& /*platform*/,
+OpenedSource openCapture(const SourceRequest& request, const SourceServices& services,
                          const SourceReporter& report) {
+  auto file = RecordedFile::open(request.argument);
+  if (!file) return failure(file.error().message + hintOfKinds(request.argument));
+  const auto head = file->ahead(kDriveTestHeadSize);
+  if (!head) return tl::unexpected(head.error());
+  if (isDriveTestLog(*head)) {
+    const bool isChosen = !request.technology.empty();
+    return openDriveTest(*std::move(file), isChosen ? request.technology : kAutomaticTechnology,
+                         services, report);
+  }
   const bool followsFile = request.technology == kAutomaticTechnology;
-  return RecordingSource::open(request.argument, followsFile ? "" : request.technology, report);
+  return RecordingSource::open(*std::move(file),
+                               {.coding = services.propertyListCoding,
+                                .technologiesOfCode = services.technologiesOfCode,
+                                .technology = followsFile ? "" : request.technology},
+                               report);
 }
 
-/// The family of a log's first usable row; LTE where there is none.
-Result<DriveTestFamily> firstFamily(const std::string& path) {
-  auto log = DriveTestLog::open(path);
-  if (!log) return tl::unexpected(log.error());
-  const auto row = log->next();
-  if (!row) return tl::unexpected(row.error());
-  return row->has_value() ? (*row)->family : DriveTestFamily::LTE;
+Result<void> checkDriveTestTechnology(std::string_view technology) {
+  return checkMade("drive-test", technology, kDriveTestWriters);
 }
 
 Result<void> checkDriveTest(const SourceRequest& request) {
-  return checkMade(request, orDefault(request.technology), kDriveTestWriters);
+  return checkDriveTestTechnology(orDefault(request.technology));
 }
 
-OpenedSource openDriveTest(const SourceRequest& request, Platform& platform,
-                           const SourceReporter& report) {
-  const auto technology = orDefault(request.technology);
-  const auto* row = std::ranges::find(kDriveTestWriters, technology, &DriveTestWriter::technology);
-  const auto first = firstFamily(request.argument);
-  if (!first) return tl::unexpected(first.error());
-  if (!row->takes(*first)) {
-    report(
-        fmt::format("{}: it begins with {} rows, which are passed over: they are no {} "
-                    "messages (with --technology={} each row is what it was measured in)",
-                    request.argument, nameOf(*first), technology, kAutomaticTechnology));
-  }
-  return DriveTestSource::open(request.argument, row->make(platform.propertyListCoding(), *first),
-                               report);
+OpenedSource openNamedDriveTest(const SourceRequest& request, const SourceServices& services,
+                                const SourceReporter& report) {
+  auto file = RecordedFile::open(request.argument);
+  if (!file) return tl::unexpected(file.error());
+  return openDriveTest(*std::move(file), orDefault(request.technology), services, report);
 }
 
 Result<void> checkStream(const SourceRequest& request) {
@@ -172,10 +181,11 @@ Result<void> checkStream(const SourceRequest& request) {
   return failure("a stream does not say what it speaks; --technology must");
 }
 
-OpenedSource openStream(const SourceRequest& request, Platform& platform,
+OpenedSource openStream(const SourceRequest& request, const SourceServices& services,
                         const SourceReporter& /*report*/) {
-  return StreamSource::open(platform.inputStreams(), request.argument,
-                            orDefault(request.technology));
+  const auto technology = orDefault(request.technology);
+  if (services.inputStreams == nullptr) return StoredStream::open(request.argument, technology);
+  return StreamSource::open(*services.inputStreams, request.argument, technology);
 }
 
 bool isTechnologyOrEmpty(std::string_view argument) {
@@ -189,11 +199,13 @@ constexpr std::array kKinds = {
                "A made-up drive, the same in every run: cells, path loss, fading,\n"
                "handovers, data transfers. Technology: LTE (unless given), IFX,\n"
                "Ondrel_GSM, Ondrel_CDMA or UTRAN2.",
-               true, checkSimulation, openSimulation},
-    SourceKind{"capture", isGiven, "capture:FILE",
-               "A recorded capture, with the pauses that it was recorded with. The\n"
-               "file names the technology.",
-               false, checkCapture, openCapture},
+               true, true, checkSimulation, openSimulation},
+    SourceKind{"capture", isGiven, "[capture:]FILE",
+               "A recording of any form, with the pauses that it was recorded with:\n"
+               "pcap, pcapng, a DLF log, a snapshot, or a drive-test log, which is\n"
+               "followed from technology to technology. What begins with no KIND and\n"
+               "colon is such a file.",
+               false, false, checkCapture, openCapture},
     SourceKind{"drive-test", isGiven, "drive-test:FILE.csv",
                "A drive-test log as phone apps write it, one row a second: columns\n"
                "Timestamp, NetworkMode, RSRP, and what else there is of RSRQ, SNR,\n"
@@ -206,15 +218,22 @@ constexpr std::array kKinds = {
                "states, SIM, contexts; auto follows the log from one to the other. A\n"
                "value that was not measured (\"-\") keeps the last one; before there\n"
                "is one, it is left out, with the packets that need it.",
-               true, checkDriveTest, openDriveTest},
+               true, false, checkDriveTest, openNamedDriveTest},
     SourceKind{"stream", isGiven, "stream:PATH",
                "Messages from a file, a pipe or standard input (\"-\") as they arrive,\n"
                "each behind its length (32 bits, little-endian). --technology says\n"
                "what they are; IFX unless given. --speed does not apply.",
-               false, checkStream, openStream},
+               false, false, checkStream, openStream},
 };
 
 }  // namespace
+
+SourceServices sourceServices(Platform& platform) {
+  return {.propertyListCoding = platform.propertyListCoding(),
+          .clock = platform.clock(),
+          .technologiesOfCode = {},
+          .inputStreams = &platform.inputStreams()};
+}
 
 std::span<const SourceKind> sourceKinds() noexcept { return kKinds; }
 
@@ -231,41 +250,62 @@ std::string_view technologyNamed(std::string_view name) noexcept {
   return found == kTechnologies.end() ? std::string_view() : *found;
 }
 
+const SourceKind* sourceKindNamed(std::string_view name) noexcept {
+  const auto* kind = std::ranges::find(kKinds, name, &SourceKind::name);
+  return kind == kKinds.end() ? nullptr : kind;
+}
+
 Result<SourceRequest> parseSource(std::string_view text, std::string_view technology) {
   const auto colon = text.find(':');
-  const auto name = text.substr(0, colon);
+  const auto* kind = sourceKindNamed(text.substr(0, colon));
+  if (kind == nullptr) return SourceRequest{"capture", std::string(text), technology};
   const auto argument =
       colon == std::string_view::npos ? std::string_view() : text.substr(colon + 1);
-  const auto* kind = std::ranges::find(kKinds, name, &SourceKind::name);
-  if (kind == kKinds.end()) {
-    std::vector<std::string_view> names;
-    names.reserve(kKinds.size());
-    for (const auto& known : kKinds) names.push_back(known.name);
-    return failure(
-        fmt::format("there is no source \"{}\" (there are {})", name, fmt::join(names, ", ")));
-  }
   if (!kind->accepts(argument)) {
     return failure(fmt::format("\"{}\" is no source; the form is {}", text, kind->form));
   }
-  SourceRequest request{std::string(name), std::string(argument), technology};
+  SourceRequest request{std::string(kind->name), std::string(argument), technology};
   if (auto spoken = kind->checkTechnology(request); !spoken) return tl::unexpected(spoken.error());
   return request;
 }
 
 LogSourceState stateOf(const SourceRequest& request) {
-  const auto* kind = std::ranges::find(kKinds, request.kind, &SourceKind::name);
   LogSourceState state{.kind = request.kind};
-  if (kind != kKinds.end()) state.isSimulated = kind->isSimulated;
+  if (const auto* kind = sourceKindNamed(request.kind)) state.isSimulated = kind->isSimulated;
   if (!request.argument.empty()) state.name = request.argument;
   return state;
 }
 
-Result<std::unique_ptr<LogSource>> openSource(const SourceRequest& request, Platform& platform,
+LogSourceState stateOf(const SourceRequest& request, const LogSource& source) {
+  LogSourceState state = stateOf(request);
+  if (!source.madeUp().empty()) state.isSimulated = true;
+  return state;
+}
+
+Result<std::unique_ptr<LogSource>> openSource(const SourceRequest& request,
+                                              const SourceServices& services,
                                               const SourceReporter& report) {
-  const auto* kind = std::ranges::find(kKinds, request.kind, &SourceKind::name);
-  if (kind == kKinds.end()) return failure(fmt::format("no source \"{}\"", request.kind));
+  const auto* kind = sourceKindNamed(request.kind);
+  if (kind == nullptr) return failure(fmt::format("no source \"{}\"", request.kind));
   if (auto spoken = kind->checkTechnology(request); !spoken) return tl::unexpected(spoken.error());
-  return kind->open(request, platform, report);
+  return kind->open(request, services, report);
+}
+
+Result<std::unique_ptr<LogSource>> openDriveTest(RecordedFile file, std::string_view technology,
+                                                 const SourceServices& services,
+                                                 const SourceReporter& report) {
+  if (auto made = checkDriveTestTechnology(technology); !made) return tl::unexpected(made.error());
+  const auto* row = std::ranges::find(kDriveTestWriters, technology, &DriveTestWriter::technology);
+  const auto makeEncoder = [&, path = file.path()](DriveTestFamily first) {
+    if (!row->takes(first)) {
+      report(
+          fmt::format("{}: it begins with {} rows, which are passed over: they are no {} "
+                      "messages (with --technology={} each row is what it was measured in)",
+                      path, nameOf(first), technology, kAutomaticTechnology));
+    }
+    return row->make(services.propertyListCoding, first);
+  };
+  return DriveTestSource::open(std::move(file), makeEncoder, report);
 }
 
 }  // namespace kestro

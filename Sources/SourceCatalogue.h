@@ -7,9 +7,13 @@
 #include <string>
 #include <string_view>
 
+#include "Platform/Clock.h"
+#include "Platform/InputStream.h"
 #include "Platform/LogSourceState.h"
 #include "Platform/Platform.h"
+#include "Platform/PropertyListCoding.h"
 #include "Platform/Result.h"
+#include "Recordings/OpenRecording.h"
 #include "Sources/LogSource.h"
 
 namespace kestro {
@@ -26,6 +30,20 @@ struct SourceRequest {
   std::string_view technology;
 };
 
+/// What sources are made with. What it refers to must outlive them.
+struct SourceServices {
+  const PropertyListCoding& propertyListCoding;
+  /// The time of what has none of its own.
+  const Clock& clock;
+  /// See RecordingContext; may be empty.
+  TechnologiesOfCode technologiesOfCode = {};
+  /// How streams are read; null where nobody serves them: reading waits then.
+  InputStreams* inputStreams = nullptr;
+};
+
+/// A platform's services, streams included; it must outlive the sources.
+[[nodiscard]] SourceServices sourceServices(Platform& platform);
+
 /// One kind of source.
 struct SourceKind {
   std::string_view name;
@@ -33,9 +51,11 @@ struct SourceKind {
   std::string_view form;         ///< as a person types it
   std::string_view description;  ///< for the help, in lines of at most 70 characters
   bool isSimulated;              ///< no baseband has sent its messages
+  bool isEndless;                ///< it goes on until its reader has enough
   /// The error says why it cannot yield messages of the technology that is asked for.
   Result<void> (*checkTechnology)(const SourceRequest& request);
-  Result<std::unique_ptr<LogSource>> (*open)(const SourceRequest& request, Platform& platform,
+  Result<std::unique_ptr<LogSource>> (*open)(const SourceRequest& request,
+                                             const SourceServices& services,
                                              const SourceReporter& report);
 };
 
@@ -54,17 +74,28 @@ struct SourceKind {
 /// The technology of that name as a constant text; empty when there is none.
 [[nodiscard]] std::string_view technologyNamed(std::string_view name) noexcept;
 
-/// Takes "KIND[:ARGUMENT]" apart; the error says that there is no such kind, that its argument is
-/// missing or too much, or that it cannot speak the technology. `technology` as in SourceRequest.
+/// The kind of that name; null when there is none.
+[[nodiscard]] const SourceKind* sourceKindNamed(std::string_view name) noexcept;
+
+/// Takes "KIND[:ARGUMENT]" apart; whatever begins with no kind is a file, a capture. The error says
+/// that the kind's argument is missing or too much. `technology` as in SourceRequest; a file
+/// without one is followed from technology to technology.
 [[nodiscard]] Result<SourceRequest> parseSource(std::string_view text, std::string_view technology);
 
-/// What a server can tell of the source that was asked for.
+/// What a server can tell of the source that was asked for, and of the one that was opened.
 [[nodiscard]] LogSourceState stateOf(const SourceRequest& request);
+[[nodiscard]] LogSourceState stateOf(const SourceRequest& request, const LogSource& source);
 
 /// Opens the source. The error says why that is not possible. The source tells `report` what it
-/// leaves out; both references must outlive it.
+/// leaves out.
 [[nodiscard]] Result<std::unique_ptr<LogSource>> openSource(const SourceRequest& request,
-                                                            Platform& platform,
+                                                            const SourceServices& services,
                                                             const SourceReporter& report);
+
+/// Likewise of the log in a file that is unread still.
+[[nodiscard]] Result<std::unique_ptr<LogSource>> openDriveTest(RecordedFile file,
+                                                               std::string_view technology,
+                                                               const SourceServices& services,
+                                                               const SourceReporter& report);
 
 }  // namespace kestro

@@ -3,18 +3,20 @@
 
 #include <fmt/format.h>
 
-#include <algorithm>
 #include <utility>
-
-#include "Platform/MessagePort.h"
 
 namespace kestro {
 namespace {
 
-constexpr std::size_t kLengthSize = 4;
 constexpr std::string_view kStandardInput = "-";
 
 }  // namespace
+
+tl::unexpected<Error> streamFailure(const std::string& path, std::string_view what) {
+  return failure(fmt::format("{}: {}", path == kStandardInput ? "standard input" : path, what));
+}
+
+tl::unexpected<Error> cannotBeReadTwice() { return failure("standard input cannot be read twice"); }
 
 Result<std::unique_ptr<StreamSource>> StreamSource::open(InputStreams& streams, std::string path,
                                                          std::string_view technology) {
@@ -36,79 +38,36 @@ Result<void> StreamSource::openStream() {
 }
 
 Result<SourceStep> StreamSource::next() {
-  if (!_messages.empty()) {
-    _message = std::move(_messages.front());
-    _messages.pop_front();
+  if (_framing.hasMessage()) {
+    _message = _framing.take();
     return SourceEvent{.time = std::nullopt, .technology = _technology, .message = _message};
   }
-  if (_error) return tl::unexpected(*_error);
+  if (_framing.error()) return streamFailure(_path, *_framing.error());
+  if (!_reason.empty()) return streamFailure(_path, _reason);
   if (_ended) return SourceEnded{};
   return SourceWaits{};
 }
 
 Result<void> StreamSource::restart() {
-  if (_path == kStandardInput) return failure("standard input cannot be read twice");
+  if (_path == kStandardInput) return cannotBeReadTwice();
   _stream.reset();
-  _messages.clear();
-  _lengthBytes.clear();
-  _length.reset();
-  _arriving.clear();
-  _frameOffset = 0;
+  _framing = {};
   _ended = false;
-  _error.reset();
+  _reason.clear();
   return openStream();
 }
 
 void StreamSource::receive(ByteView bytes) {
-  while (!bytes.empty() && !isStopped()) {
-    if (!_length) {
-      takeLengthByte(bytes.front());
-      bytes = bytes.subspan(1);
-      continue;
-    }
-    const auto count = std::min(bytes.size(), *_length - _arriving.size());
-    _arriving.insert(_arriving.end(), bytes.begin(),
-                     bytes.begin() + static_cast<std::ptrdiff_t>(count));
-    bytes = bytes.subspan(count);
-    if (_arriving.size() < *_length) continue;
-    _frameOffset += kLengthSize + *_length;
-    _messages.push_back(std::exchange(_arriving, {}));
-    _length.reset();
-  }
+  if (!isStopped()) _framing.receive(bytes);
   if (_ready) _ready();
-}
-
-void StreamSource::takeLengthByte(std::uint8_t byte) {
-  _lengthBytes.push_back(byte);
-  if (_lengthBytes.size() < kLengthSize) return;
-  const auto length = loadLittleEndian<std::uint32_t>(_lengthBytes, 0);
-  _lengthBytes.clear();
-  if (length > kMaximumMessageSize) {
-    fail(fmt::format("the message at byte {} would have {} bytes, more than the {} of any message",
-                     _frameOffset, length, kMaximumMessageSize));
-  } else if (length == 0) {
-    _frameOffset += kLengthSize;
-  } else {
-    _length = length;
-  }
 }
 
 void StreamSource::end(std::string_view reason) {
   if (isStopped()) return;
-  const auto arrived = _length ? kLengthSize + _arriving.size() : _lengthBytes.size();
-  if (!reason.empty()) {
-    fail(std::string(reason));
-  } else if (arrived > 0) {
-    fail(
-        fmt::format("the stream ends {} bytes into the message at byte {}", arrived, _frameOffset));
-  }
+  if (reason.empty()) _framing.end();
+  _reason = reason;
   _ended = true;
   if (_ready) _ready();
-}
-
-void StreamSource::fail(std::string message) {
-  _error = Error{fmt::format("{}: {}", _path == kStandardInput ? "standard input" : _path,
-                             std::move(message))};
 }
 
 }  // namespace kestro

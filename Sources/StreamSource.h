@@ -2,8 +2,6 @@
 // The source that reads messages from a stream, as a bridge to a live baseband writes them.
 #pragma once
 
-#include <cstdint>
-#include <deque>
 #include <functional>
 #include <memory>
 #include <optional>
@@ -12,13 +10,17 @@
 
 #include "Platform/InputStream.h"
 #include "Sources/LogSource.h"
+#include "Sources/StreamFraming.h"
 
 namespace kestro {
 
-/// Yields the messages of a stream as they arrive. Each is framed by its length in 4 bytes, least
-/// significant byte first; a length of 0 only says that the writer is still there, and yields
-/// nothing. A length above kMaximumMessageSize, or an end within a message, is an error: behind it
-/// no frame can be found.
+/// What is wrong with the stream of that path.
+[[nodiscard]] tl::unexpected<Error> streamFailure(const std::string& path, std::string_view what);
+
+/// The error of reading standard input from its beginning once more.
+[[nodiscard]] tl::unexpected<Error> cannotBeReadTwice();
+
+/// Yields the messages of a stream as they arrive; StreamFraming says how they are told apart.
 class StreamSource : public LogSource {
  public:
   /// Opens `path` ("-" is standard input). `technology` is a constant text of
@@ -38,9 +40,7 @@ class StreamSource : public LogSource {
   [[nodiscard]] Result<void> openStream();
   void receive(ByteView bytes);
   void end(std::string_view reason);
-  void takeLengthByte(std::uint8_t byte);
-  void fail(std::string message);
-  [[nodiscard]] bool isStopped() const noexcept { return _error || _ended; }
+  [[nodiscard]] bool isStopped() const noexcept { return _framing.error() || _ended; }
 
   InputStreams& _streams;
   std::string _path;
@@ -48,17 +48,10 @@ class StreamSource : public LogSource {
   std::function<void()> _ready;
   std::unique_ptr<InputStream> _stream;
 
-  /// The frame that is arriving: first its length, then that many bytes.
-  Bytes _lengthBytes;
-  std::optional<std::size_t> _length;
-  Bytes _arriving;
-  /// Where that frame begins, counted from the beginning of the stream.
-  std::uint64_t _frameOffset = 0;
-
-  std::deque<Bytes> _messages;
+  StreamFraming _framing;
   Bytes _message;
   bool _ended = false;
-  std::optional<Error> _error;
+  std::string _reason;  ///< why it ended
 };
 
 }  // namespace kestro

@@ -30,13 +30,13 @@ int serve(LinuxPlatform& platform, const ServerOptions& options) {
     platform.systemLog().write(LogPriority::Notice, line);
     platform.consoleLog().writeLine(fmt::format("kestro-telephonyd: {}", line));
   };
-  auto source = openSource(options.source, platform, report);
+  auto source = openSource(options.source, sourceServices(platform), report);
   if (!source) return fail(platform, source.error().message);
   auto server = Server::open(platform, options.portName, (*source)->technology(), [&platform] {
     platform.quit(fail(platform, "the server's port was removed"));
   });
   if (!server) return fail(platform, server.error().message);
-  (*server)->setSource(stateOf(options.source));
+  (*server)->setSource(stateOf(options.source, **source));
   Playback playback(std::move(*source), options.playback, platform.mainQueue(), platform.clock(),
                     **server, report);
   platform.setTerminationHandler([&platform] {

@@ -27,6 +27,7 @@ class IFXSimulation : public LogSource {
 
   [[nodiscard]] std::string_view technology() const override;
   [[nodiscard]] Result<SourceStep> next() override;
+  [[nodiscard]] std::string_view madeUp() const noexcept override { return kMadeUpBySimulation; }
   [[nodiscard]] Result<void> restart() override;
 
  private:

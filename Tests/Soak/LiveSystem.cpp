@@ -79,7 +79,7 @@ void LiveSystem::start() { _model->startMonitor(); }
 
 std::unique_ptr<LogSource> LiveSystem::openSimulation() {
   auto source = openSource({.kind = "simulation", .argument = {}, .technology = _technology},
-                           _platform, [](std::string_view) {});
+                           sourceServices(_platform), [](std::string_view) {});
   require(source.has_value(), "the simulation opens");
   return std::move(*source);
 }

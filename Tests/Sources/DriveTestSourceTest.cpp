@@ -34,6 +34,10 @@ class LevelEncoder : public DriveTestEncoder {
   }
 };
 
+std::unique_ptr<DriveTestEncoder> makeEncoder(DriveTestFamily) {
+  return std::make_unique<LevelEncoder>();
+}
+
 class DriveTestSourceTest : public ::testing::Test {
  protected:
   /// Opens a log with these lines; each is a second within 2019-11-21 15:38, and a level.
@@ -47,7 +51,7 @@ class DriveTestSourceTest : public ::testing::Test {
   }
   std::unique_ptr<DriveTestSource> openText(const std::string& contents) {
     auto source = DriveTestSource::open(
-        _directory.write("log.csv", contents), std::make_unique<LevelEncoder>(),
+        *RecordedFile::open(_directory.write("log.csv", contents)), makeEncoder,
         [this](std::string_view line) { _lines.emplace_back(line); });
     EXPECT_TRUE(source.has_value()) << source.error().message;
     _lines.clear();  // that most columns are missing
@@ -148,7 +152,7 @@ TEST_F(DriveTestSourceTest, MissingColumnsAreReportedAtOnce) {
   const auto path = _directory.write("log.csv", std::string_view("Timestamp,NetworkMode,RSRP\n"));
   std::vector<std::string> lines;
   const auto source =
-      DriveTestSource::open(path, std::make_unique<LevelEncoder>(),
+      DriveTestSource::open(*RecordedFile::open(path), makeEncoder,
                             [&lines](std::string_view line) { lines.emplace_back(line); });
   ASSERT_TRUE(source.has_value());
   EXPECT_THAT(lines, ElementsAre(HasSubstr("no columns RSRQ, SNR, RSSI, CQI,")));

@@ -6,6 +6,7 @@
 #include <string>
 #include <vector>
 
+#include "Platform/Linux/LinuxPlatform.h"
 #include "Sources/RecordingSource.h"
 #include "Tests/Recordings/PcapBytes.h"
 #include "Tests/Sources/SourceReading.h"
@@ -24,10 +25,12 @@ class RecordingSourceTest : public ::testing::Test {
  protected:
   Result<std::unique_ptr<RecordingSource>> open(const Bytes& contents,
                                                 std::string_view technology = "") {
-    return RecordingSource::open(_directory.write("a.pcap", contents), technology,
+    return RecordingSource::open(*RecordedFile::open(_directory.write("a.pcap", contents)),
+                                 {.coding = *_coding, .technology = technology},
                                  [this](std::string_view line) { _lines.emplace_back(line); });
   }
 
+  std::unique_ptr<PropertyListCoding> _coding = createPropertyListCoding();
   TemporaryDirectory _directory;
   std::vector<std::string> _lines;
 };

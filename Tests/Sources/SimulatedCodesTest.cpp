@@ -59,7 +59,7 @@ class SimulatedCodesTest : public ::testing::TestWithParam<std::string_view> {
   /// The codes of the simulation's messages in the course of a drive.
   [[nodiscard]] std::set<LogCode> sent() {
     const auto source = openSource({.kind = "simulation", .argument = {}, .technology = GetParam()},
-                                   platform, ignore);
+                                   sourceServices(platform), ignore);
     std::set<LogCode> codes;
     for (ReadEvent event = readEvent(**source); event.time < kDrive; event = readEvent(**source)) {
       codes.insert(logCodeOf(PacketView(event.message)));

@@ -28,7 +28,7 @@ class SourceCatalogueTest : public ::testing::Test {
   Result<std::unique_ptr<LogSource>> open(std::string_view text, std::string_view technology = "") {
     const auto request = parseSource(text, technology);
     if (!request) return tl::unexpected(request.error());
-    return openSource(*request, platform, report);
+    return openSource(*request, sourceServices(platform), report);
   }
 
   TemporaryDirectory directory;
@@ -47,14 +47,38 @@ TEST_F(SourceCatalogueTest, TheKindEndsAtTheFirstColon) {
 }
 
 TEST_F(SourceCatalogueTest, UnknownKindsAndMissingArgumentsAreWrongUsage) {
-  for (const auto* text : {"", "film", "capture", "capture:", "drive-test",
-                           "stream:", "simulation:5G", ":x", "Simulation"}) {
+  for (const auto* text : {"capture", "capture:", "drive-test", "stream:", "simulation:5G"}) {
     EXPECT_FALSE(parseSource(text, "").has_value()) << text;
   }
-  EXPECT_EQ(parseSource("film:x", "").error().message,
-            "there is no source \"film\" (there are simulation, capture, drive-test, stream)");
   EXPECT_EQ(parseSource("capture", "").error().message,
-            "\"capture\" is no source; the form is capture:FILE");
+            "\"capture\" is no source; the form is [capture:]FILE");
+}
+
+TEST_F(SourceCatalogueTest, WhatBeginsWithNoKindIsAFile) {
+  for (const std::string text : {"a.pcap", "film:x", ":x", "./capture:x", "Simulation"}) {
+    EXPECT_EQ(parseSource(text, "")->kind, "capture") << text;
+    EXPECT_EQ(parseSource(text, "")->argument, text);
+  }
+  const auto capture = directory.write("a:b", captureHeader(151));
+  EXPECT_EQ((*open(capture))->technology(), "UTRAN2");
+  EXPECT_EQ(open("film").error().message,
+            "film: No such file or directory (nor is it one of the sources simulation, capture, "
+            "drive-test, stream)");
+  EXPECT_EQ(open("/film").error().message, "/film: No such file or directory");
+}
+
+TEST_F(SourceCatalogueTest, ADriveTestLogAsAFileIsFollowedFromTechnologyToTechnology) {
+  const auto log =
+      directory.write("a", std::string_view("Timestamp,NetworkMode,RSRP,CELLHEX,LACHEX\n"
+                                            "2020.01.02_03.04.05,EDGE,-90,1,1\n"
+                                            "2020.01.02_03.04.06,LTE,-91,1,1\n"));
+  const auto source = open("capture:" + log);
+  ASSERT_TRUE(source.has_value());
+  EXPECT_EQ((*source)->technology(), "Ondrel_GSM");
+  EXPECT_EQ(readToEnd(**source).back().technology, "LTE");
+  EXPECT_EQ((*open(log, "IFX"))->technology(), "IFX");
+  EXPECT_TRUE(*stateOf(*parseSource(log, ""), **source).isSimulated);
+  EXPECT_THAT(open(log, "UTRAN2").error().message, HasSubstr("cannot make UTRAN2 messages"));
 }
 
 TEST_F(SourceCatalogueTest, OpensEveryKind) {

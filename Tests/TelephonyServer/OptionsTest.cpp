@@ -82,7 +82,7 @@ TEST(OptionsTest, TheParentNeedsNoNumber) {
 }
 
 TEST(OptionsTest, WrongUsageIsStatusTwo) {
-  EXPECT_EQ(refusal({"--source=film"}).exitStatus, 2);
+  EXPECT_EQ(refusal({"--source=simulation:film"}).exitStatus, 2);
   EXPECT_EQ(refusal({"--source=capture"}).exitStatus, 2);
   EXPECT_EQ(refusal({"--technology=5G"}).exitStatus, 2);
   EXPECT_EQ(refusal({"--technology=auto"}).exitStatus, 2);
