@@ -13,7 +13,7 @@ namespace {
 constexpr std::size_t kLongestRecord = std::numeric_limits<std::uint16_t>::max();
 /// A record with all that may stand before it, and as much of the next one as tells that it is one.
 constexpr std::size_t kAhead = 2 * (kDlfPrefixSize + 1 + kLongestRecord);
-constexpr std::uint64_t kMicrosecondsPerSecond = 1'000'000;
+constexpr std::uint64_t kMicrosecondsOfSecond = 1'000'000;
 
 std::uint16_t codeAt(ByteView bytes, std::size_t record) noexcept {
   return loadLittleEndian<std::uint16_t>(bytes, record + kDlfCodeOffset);
@@ -99,8 +99,8 @@ Result<std::optional<ByteView>> DlfRecords::next() {
     _file.take(reading.end());
     const std::uint16_t code = codeAt(record, 0);
     if (!reading.type && code == kDlfVersionReport) {
-      _lastTime = kMicrosecondsPerSecond *
-                  loadLittleEndian<std::uint32_t>(record, kDlfVersionReportSeconds);
+      _lastTime =
+          kMicrosecondsOfSecond * loadLittleEndian<std::uint32_t>(record, kDlfVersionReportSeconds);
       continue;
     }
     _lastTime = timeAt(record, 0);

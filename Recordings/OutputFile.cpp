@@ -9,32 +9,36 @@
 #include <cstring>
 #include <utility>
 
+#include "Recordings/OutputPath.h"
+
 namespace kestro {
 
 Result<OutputFile> OutputFile::create(const std::string& path) {
-  if (path == kStandardOutput) return OutputFile(path, STDOUT_FILENO);
+  if (path == kStandardOutputPath) return OutputFile(outputName(path), STDOUT_FILENO, false);
   constexpr mode_t kMode = 0666;  // the person's mask takes away from it
   // NOLINTNEXTLINE(cppcoreguidelines-pro-type-vararg): the system's interface
   const int descriptor = ::open(path.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, kMode);
   if (descriptor < 0) {
     return failure(fmt::format("{}: cannot create: {}", path, std::strerror(errno)));
   }
-  return OutputFile(path, descriptor);
+  return OutputFile(path, descriptor, true);
 }
 
-OutputFile::OutputFile(std::string path, int descriptor)
-    : _path(std::move(path)), _descriptor(descriptor) {}
+OutputFile::OutputFile(std::string name, int descriptor, bool isOwned)
+    : _name(std::move(name)), _descriptor(descriptor), _isOwned(isOwned) {}
 
 OutputFile::OutputFile(OutputFile&& other) noexcept
-    : _path(std::move(other._path)),
+    : _name(std::move(other._name)),
       _descriptor(std::exchange(other._descriptor, -1)),
+      _isOwned(other._isOwned),
       _error(std::move(other._error)) {}
 
 OutputFile& OutputFile::operator=(OutputFile&& other) noexcept {
   if (this == &other) return *this;
   close();
-  _path = std::move(other._path);
+  _name = std::move(other._name);
   _descriptor = std::exchange(other._descriptor, -1);
+  _isOwned = other._isOwned;
   _error = std::move(other._error);
   return *this;
 }
@@ -42,7 +46,7 @@ OutputFile& OutputFile::operator=(OutputFile&& other) noexcept {
 OutputFile::~OutputFile() { close(); }
 
 void OutputFile::close() noexcept {
-  if (_descriptor >= 0 && _path != kStandardOutput) ::close(_descriptor);
+  if (_descriptor >= 0 && _isOwned) ::close(_descriptor);
 }
 
 Result<void> OutputFile::write(ByteView bytes) {
@@ -52,7 +56,7 @@ Result<void> OutputFile::write(ByteView bytes) {
     if (size >= 0) {
       bytes = bytes.subspan(static_cast<std::size_t>(size));
     } else if (errno != EINTR) {
-      _error = Error{fmt::format("{}: cannot write: {}", _path, std::strerror(errno))};
+      _error = Error{fmt::format("{}: cannot write: {}", _name, std::strerror(errno))};
       return tl::unexpected(*_error);
     }
   }

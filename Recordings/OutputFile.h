@@ -13,28 +13,27 @@ namespace kestro {
 /// Where a recording goes. What was written has reached the system when `write` returns.
 class OutputFile {
  public:
-  /// The path of standard output, which is written to, but not closed.
-  static constexpr const char* kStandardOutput = "-";
-
-  /// Creates the file, or empties an existing one.
+  /// Creates the file, or empties an existing one; "-" is standard output, which is not closed.
   [[nodiscard]] static Result<OutputFile> create(const std::string& path);
 
   OutputFile(OutputFile&& other) noexcept;
   OutputFile& operator=(OutputFile&& other) noexcept;
   ~OutputFile();
 
-  [[nodiscard]] const std::string& path() const noexcept { return _path; }
+  /// What messages call the file.
+  [[nodiscard]] const std::string& name() const noexcept { return _name; }
 
   /// Appends all bytes. When the system refuses them (a full disk), some may have been written, and
   /// every later call yields the same error.
   [[nodiscard]] Result<void> write(ByteView bytes);
 
  private:
-  OutputFile(std::string path, int descriptor);
+  OutputFile(std::string name, int descriptor, bool isOwned);
   void close() noexcept;
 
-  std::string _path;
+  std::string _name;
   int _descriptor;
+  bool _isOwned;
   std::optional<Error> _error;
 };
 

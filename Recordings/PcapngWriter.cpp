@@ -41,11 +41,11 @@ Result<void> PcapngWriter::write(const RecordedMessage& message) {
   const auto linkType = linkTypeOfTechnology(message.technology);
   if (!linkType) {
     return failure(
-        fmt::format("{}: \"{}\" is no technology to record", _file.path(), message.technology));
+        fmt::format("{}: \"{}\" is no technology to record", _file.name(), message.technology));
   }
   if (message.bytes.size() > kMaximumPcapMessageSize) {
     return failure(fmt::format("{}: a message of {} bytes is longer than a capture can hold ({})",
-                               _file.path(), message.bytes.size(), kMaximumPcapMessageSize));
+                               _file.name(), message.bytes.size(), kMaximumPcapMessageSize));
   }
   _blocks.clear();
   const auto found = std::ranges::find(_interfaces, message.technology);

@@ -84,7 +84,7 @@ TEST_F(SnapshotReaderTest, AnEntrysPacketsAreMessagesAtItsDate) {
   EXPECT_EQ(reader->fractionRead(), 1.0);
 }
 
-TEST_F(SnapshotReaderTest, AMessageOfIfxIsEncodedAnew) {
+TEST_F(SnapshotReaderTest, AMessageOfIFXIsEncodedAnew) {
   const Dictionary list{{"01;Mode", Dictionary{{"Band", "GSM 900"}}}};
   const auto reader = open({entry("2012-03-04 13:05:09 +0100", list)}).value();
   EXPECT_THAT(reader->technologies(), ElementsAre("IFX"));
