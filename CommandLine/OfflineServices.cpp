@@ -17,13 +17,18 @@ namespace {
 /// Below every priority: no line is even formatted.
 constexpr LogPriority kNoPriority{-1};
 
+class NoSink : public TextSink {
+ public:
+  void writeLine(std::string_view /*line*/) override {}
+};
+
 }  // namespace
 
 struct OfflineServices::Services {
   class Log : public SystemLog {
    public:
-    explicit Log(std::optional<Output> file)
-        : SystemLog(file ? LogPriority::Debug : kNoPriority), _file(std::move(file)) {}
+    Log(std::optional<Output> file, LogPriority shown)
+        : SystemLog(file ? LogPriority::Debug : shown), _file(std::move(file)), _shown(shown) {}
 
     [[nodiscard]] Result<void> finish() {
       if (!_file) return {};
@@ -34,6 +39,7 @@ struct OfflineServices::Services {
 
    protected:
     void writeLine(LogPriority priority, std::string_view line) override {
+      if (priority <= _shown) standardErrorSink().writeLine(line);
       if (!_file) return;
       _text.clear();
       JsonWriter writer(_text);
@@ -49,11 +55,18 @@ struct OfflineServices::Services {
 
    private:
     std::optional<Output> _file;
+    LogPriority _shown;
     std::string _text;
   };
 
-  explicit Services(std::optional<Output> logFile) : log(std::move(logFile)) {}
+  Services(std::optional<Output> logFile, std::optional<LogPriority> shown)
+      : isSilent(!logFile && !shown), log(std::move(logFile), shown.value_or(kNoPriority)) {}
 
+  /// Where lines go that decoders do not give to the system log.
+  [[nodiscard]] TextSink& decodersLines() { return isSilent ? nowhere : standardErrorSink(); }
+
+  bool isSilent;
+  NoSink nowhere;
   Log log;
   std::unique_ptr<Clock> systemClock = createSystemClock();
   ReplayClock clock{*systemClock};
@@ -61,8 +74,8 @@ struct OfflineServices::Services {
   std::unique_ptr<PropertyListCoding> coding = createPropertyListCoding();
 };
 
-OfflineServices::OfflineServices(std::optional<Output> logFile)
-    : _services(std::make_unique<Services>(std::move(logFile))) {}
+OfflineServices::OfflineServices(std::optional<Output> logFile, std::optional<LogPriority> shown)
+    : _services(std::make_unique<Services>(std::move(logFile), shown)) {}
 OfflineServices::~OfflineServices() = default;
 
 SystemLog& OfflineServices::systemLog() noexcept { return _services->log; }
@@ -73,8 +86,8 @@ const PropertyListCoding& OfflineServices::propertyListCoding() const noexcept {
 
 GeneratorServices OfflineServices::forGenerator() noexcept {
   return {.systemLog = _services->log,
-          .consoleLog = standardErrorSink(),
-          .standardOutput = standardErrorSink(),
+          .consoleLog = _services->decodersLines(),
+          .standardOutput = _services->decodersLines(),
           .clock = _services->clock,
           .bundle = *_services->bundle,
           .propertyListCoding = *_services->coding};

@@ -13,13 +13,15 @@
 
 namespace kestro {
 
-/// Nothing of it touches the running system, except that texts of the console and of the decoders'
-/// standard output go to the process's standard error. Time stands still until the clock is set.
+/// Nothing of it touches the running system. Time stands still until the clock is set.
 class OfflineServices {
  public:
-  /// With `logFile`, every line of the system log becomes a line {"priority","message"} there;
-  /// without, nothing is logged.
-  explicit OfflineServices(std::optional<Output> logFile = std::nullopt);
+  /// With `logFile`, every line of the system log becomes a line {"priority","message"} there; with
+  /// `shown`, those up to this priority go to the process's standard error. With either, so do the
+  /// lines that decoders have for the console and their standard output. Without both nothing is
+  /// logged.
+  explicit OfflineServices(std::optional<Output> logFile = std::nullopt,
+                           std::optional<LogPriority> shown = std::nullopt);
   OfflineServices(const OfflineServices&) = delete;
   OfflineServices& operator=(const OfflineServices&) = delete;
   ~OfflineServices();

@@ -23,13 +23,19 @@
 namespace kestro {
 namespace {
 
-/// The type of the value that a target takes.
+/// The type of the value that a target holds in the end.
 template <class Target>
-struct Taken {
+struct Held {
   using Type = Target;
 };
 template <class Value>
-struct Taken<std::optional<Value>> {
+struct Held<std::optional<Value>> {
+  using Type = Value;
+};
+
+/// The type of the value that is read from a text.
+template <class Value>
+struct Taken {
   using Type = Value;
 };
 template <>
@@ -103,12 +109,13 @@ CLI::Option* declareTarget(CLI::App& app, const OptionRow& row, const ValueReade
 
 template <class Target>
 CLI::Option* declareTarget(CLI::App& app, const OptionRow& row, Target* target) {
-  using Value = typename Taken<Target>::Type;
+  using Kept = typename Held<Target>::Type;
+  using Value = typename Taken<Kept>::Type;
   const auto take = [target, implied = row.impliedValue](const Value& value) {
     if constexpr (std::is_same_v<Value, std::string>) {
       *target = value.empty() && implied ? *implied : value;
     } else {
-      *target = static_cast<Target>(value);
+      *target = static_cast<Kept>(value);
     }
   };
   CLI::Option* option = app.add_option_function<Value>(row.name, take, row.help);

@@ -40,7 +40,7 @@ using ValueReader = std::function<std::string(const std::string& text)>;
 using OptionTarget =
     std::variant<std::string*, std::vector<std::string>*, bool*, double*, std::uint64_t*,
                  std::optional<int>*, std::optional<std::uint32_t>*, std::optional<std::uint64_t>*,
-                 LogPriority*, Answer, ValueReader>;
+                 LogPriority*, std::optional<LogPriority>*, Answer, ValueReader>;
 
 /// One row. What the target points to must live until the arguments are read.
 struct OptionRow {

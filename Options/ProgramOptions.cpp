@@ -39,8 +39,7 @@ OptionRow logPriorityOption(LogPriority& threshold) {
               "The system log gets lines up to this priority: 3 errors, 4 warnings, 5 notices, "
               "7 everything",
           .target = &threshold,
-          .range = NumberRange{static_cast<double>(LogPriority::Error),
-                               static_cast<double>(LogPriority::Debug)}};
+          .range = kLogPriorities};
 }
 
 OptionRow portNameOption(std::string name, std::string help, std::string& portName) {

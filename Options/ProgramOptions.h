@@ -22,6 +22,10 @@ struct LiveOptions {
 /// --server, --demo, which excludes it, and --log-priority. `options` holds the defaults.
 [[nodiscard]] std::vector<OptionRow> liveOptions(LiveOptions& options);
 
+/// The numbers of the priorities that can be asked for.
+inline constexpr NumberRange kLogPriorities{static_cast<double>(LogPriority::Error),
+                                            static_cast<double>(LogPriority::Debug)};
+
 /// --log-priority: the number of a LogPriority.
 [[nodiscard]] OptionRow logPriorityOption(LogPriority& threshold);
 

@@ -3,6 +3,7 @@
 
 #include <algorithm>
 #include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -22,10 +23,11 @@ constexpr const char* kCodesExamples = R"(  kestro-cli codes --technology=LTE
 struct CodesOptions {
   std::string technology;
   std::string format;
+  std::optional<LogPriority> shownLog;
 };
 
 int runCodes(const CodesOptions& options) {
-  OfflineServices services;
+  OfflineServices services(std::nullopt, options.shownLog);
   std::vector<TechnologyCodes> technologies;
   for (const std::string_view technology : LogGenerator::technologies()) {
     if (!options.technology.empty() && options.technology != technology) continue;
@@ -50,7 +52,8 @@ CommandRow codesCommand() {
                        .help = "Only the codes of this one",
                        .target = &options->technology,
                        .choices = choicesOf(LogGenerator::technologies())},
-                      formatOption(options->format, formatRows(codesFormats()))},
+                      formatOption(options->format, formatRows(codesFormats())),
+                      shownLogOption(options->shownLog)},
           .sections = {{.title = "Formats", .rows = formatRows(codesFormats())},
                        {.title = "Examples", .text = kCodesExamples}},
           .run = [options] { return runCodes(*options); }};

@@ -9,6 +9,8 @@
 #include <system_error>
 #include <utility>
 
+#include "Options/ProgramOptions.h"
+
 namespace kestro {
 namespace {
 
@@ -79,6 +81,16 @@ OptionRow codeOption(std::optional<LogCode>& code) {
             return fmt::format("'{}' is no log code, such as 0xB179 (hexadecimal, 0 to {:X})", text,
                                kHighestCode);
           }};
+}
+
+OptionRow shownLogOption(std::optional<LogPriority>& shown) {
+  return {.name = "--log-priority",
+          .value = "N",
+          .help =
+              "Show the system log's lines up to this priority on standard error (3 errors, "
+              "4 warnings, 5 notices, 7 everything), and what decoders say besides",
+          .target = &shown,
+          .range = kLogPriorities};
 }
 
 OptionRow formatOption(std::string& format, std::vector<HelpRow> formats) {

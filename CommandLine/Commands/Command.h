@@ -11,6 +11,7 @@
 
 #include "LogGenerator/Packets/PacketKind.h"
 #include "Options/CommandRow.h"
+#include "Platform/SystemLog.h"
 
 namespace kestro {
 
@@ -39,6 +40,9 @@ struct MessageNumbers {
 
 /// --code, which takes a log code in hexadecimal, with or without 0x.
 [[nodiscard]] OptionRow codeOption(std::optional<LogCode>& code);
+
+/// --log-priority of commands that work on recordings: by default they show no line of the log.
+[[nodiscard]] OptionRow shownLogOption(std::optional<LogPriority>& shown);
 
 /// The names and explanations in a list of formats.
 template <class Formats>

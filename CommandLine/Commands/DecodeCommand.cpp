@@ -3,6 +3,7 @@
 
 #include <algorithm>
 #include <memory>
+#include <optional>
 #include <string>
 #include <utility>
 #include <vector>
@@ -29,6 +30,7 @@ struct DecodeOptions {
   std::string format;
   double refreshSeconds = 2;
   std::string logFile;
+  std::optional<LogPriority> shownLog;
 };
 
 /// One run of the command.
@@ -37,7 +39,7 @@ class Decoder {
   Decoder(const DecodeOptions& options, PcapReader reader, std::optional<Output> logFile)
       : _options(options),
         _feed(options.capture, std::move(reader)),
-        _services(std::move(logFile)) {}
+        _services(std::move(logFile), options.shownLog) {}
 
   int run() {
     // The generator is gone before the log is finished: it leaves lines when it goes.
@@ -127,7 +129,8 @@ CommandRow decodeCommand() {
                        .value = "FILE",
                        .help = "Write every line of the system log there, as "
                                "{\"priority\",\"message\"}",
-                       .target = &options->logFile}},
+                       .target = &options->logFile},
+                      shownLogOption(options->shownLog)},
           .sections = {{.title = "Formats",
                         .rows = formatRows(decodeFormats()),
                         .text = kTimesAndNumbers},

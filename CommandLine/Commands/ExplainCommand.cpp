@@ -42,13 +42,16 @@ struct ExplainOptions {
   std::optional<MessageNumbers> messages;  ///< absent: every one
   std::optional<LogCode> code;
   std::string format;
+  std::optional<LogPriority> shownLog;
 };
 
 /// One run of the command.
 class Explanation {
  public:
   Explanation(const ExplainOptions& options, PcapReader reader)
-      : _options(options), _feed(options.capture, std::move(reader)) {}
+      : _options(options),
+        _feed(options.capture, std::move(reader)),
+        _services(std::nullopt, options.shownLog) {}
 
   int run() {
     _generator = _feed.makeGenerator(_services.forGenerator());
@@ -161,7 +164,8 @@ CommandRow explainCommand() {
           .help = "Tell which bytes every value of a recorded packet comes from",
           .options = {captureArgument(options->capture), messageOption(options->messages),
                       codeOption(options->code),
-                      formatOption(options->format, formatRows(explainFormats()))},
+                      formatOption(options->format, formatRows(explainFormats())),
+                      shownLogOption(options->shownLog)},
           .sections = {{.text = kExplainText},
                        {.title = "Formats",
                         .rows = formatRows(explainFormats()),

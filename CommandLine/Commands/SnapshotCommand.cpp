@@ -5,6 +5,7 @@
 
 #include <algorithm>
 #include <memory>
+#include <optional>
 #include <string>
 #include <utility>
 #include <vector>
@@ -59,6 +60,7 @@ struct SnapshotOptions {
   std::string output;
   std::string description;
   bool reframe = false;
+  std::optional<LogPriority> shownLog;
 };
 
 int nothingDone(std::string_view why) {
@@ -92,7 +94,7 @@ int runSave(const SnapshotOptions& options) {
   auto reader = PcapReader::open(options.input);
   if (!reader) return nothingDone(reader.error().message);
   RecordingFeed feed(options.input, *std::move(reader));
-  OfflineServices services;
+  OfflineServices services(std::nullopt, options.shownLog);
   services.clock().setNow(createSystemClock()->now());  // for a capture without a message
   const auto generator = feed.makeGenerator(services.forGenerator());
   if (!generator) return kExitNothingDone;
@@ -170,7 +172,8 @@ CommandRow saveAction(const SharedOptions& options) {
                        .help = "What the snapshot shows; may be empty",
                        .target = &options->description,
                        .isRequired = true,
-                       .impliedValue = ""}},
+                       .impliedValue = ""},
+                      shownLogOption(options->shownLog)},
           .sections = {{.text = kSaveText}, {.title = "Example", .text = kSaveExample}},
           .run = [options] { return runSave(*options); }};
 }

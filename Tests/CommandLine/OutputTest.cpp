@@ -53,6 +53,41 @@ TEST(OfflineServices, WithoutALogFileNoLineIsFormatted) {
   EXPECT_FALSE(services.systemLog().accepts(LogPriority{0}));
 }
 
+/// What comes to standard error of a line of the system log and one of a decoder.
+std::string shownBy(OfflineServices& services) {
+  ::testing::internal::CaptureStderr();
+  services.systemLog().write(LogPriority::Warning, "warning");
+  services.systemLog().write(LogPriority::Notice, "notice");
+  services.forGenerator().standardOutput.writeLine("decoder");
+  services.forGenerator().consoleLog.writeLine("console");
+  return ::testing::internal::GetCapturedStderr();
+}
+
+TEST(OfflineServices, SayNothingUnlessAsked) {
+  OfflineServices services;
+  EXPECT_EQ(shownBy(services), "");
+}
+
+TEST(OfflineServices, ShowLinesUpToAPriorityAndThoseOfDecoders) {
+  OfflineServices services(std::nullopt, LogPriority::Warning);
+  EXPECT_EQ(shownBy(services), "warning\ndecoder\nconsole\n");
+}
+
+TEST(OfflineServices, WithALogFileShowThoseOfDecoders) {
+  const TemporaryFile file;
+  OfflineServices services(*Output::create(file.path()));
+  EXPECT_EQ(shownBy(services), "decoder\nconsole\n");
+}
+
+TEST(OfflineServices, AFileHasEveryLineWhateverIsShown) {
+  const TemporaryFile file;
+  OfflineServices services(*Output::create(file.path()), LogPriority::Error);
+  EXPECT_EQ(shownBy(services), "decoder\nconsole\n");
+  ASSERT_TRUE(services.finishLog());
+  EXPECT_EQ(file.contents(),
+            "{\"priority\":4,\"message\":\"warning\"}\n{\"priority\":5,\"message\":\"notice\"}\n");
+}
+
 TEST(OfflineServices, SaysWhyTheLogCannotBeWritten) {
   OfflineServices services(*Output::create("/dev/full"));
   services.systemLog().write(LogPriority::Error, "x");

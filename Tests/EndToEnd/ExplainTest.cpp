@@ -16,6 +16,7 @@ namespace kestro::testing {
 namespace {
 
 using namespace std::chrono_literals;
+using ::testing::EndsWith;
 using ::testing::HasSubstr;
 using ::testing::IsEmpty;
 using ::testing::Not;
@@ -23,8 +24,8 @@ using ::testing::SizeIs;
 using ::testing::StartsWith;
 using Json = nlohmann::ordered_json;
 
-/// The line that the library leaves on what would be its standard output.
-constexpr const char* kLibraryLines = "Deallocing LTEClassIndex\nDeallocing ClassIndex\n";
+/// What the decoders leave on what would be their standard output.
+constexpr const char* kDecodersLines = "Deallocing LTEClassIndex\nDeallocing ClassIndex\n";
 
 class ExplainTest : public ::testing::Test {
  protected:
@@ -85,7 +86,14 @@ TEST_F(ExplainTest, TableIsTheDefault) {
       "                                                                        Filtered RSRQ             33  -- --     0  -20.00 dB (past the end)\n"
       "  Detected Cells                                  detected cell         count                     28  00        0\n");
   // clang-format on
-  EXPECT_EQ(outcome.errors, kLibraryLines);
+  EXPECT_EQ(outcome.errors, "");
+}
+
+TEST_F(ExplainTest, ShowsTheDecodersLinesWhenAskedTo) {
+  write({packet(0xB0C1)});
+  const Outcome outcome = explain({"--log-priority=3"});
+  EXPECT_THAT(outcome.errors, StartsWith("Creating LTELogGenerator object\n"));
+  EXPECT_THAT(outcome.errors, EndsWith(kDecodersLines));
 }
 
 TEST_F(ExplainTest, JsonIsOneObject) {
