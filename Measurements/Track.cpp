@@ -26,7 +26,7 @@ Track::Track(std::vector<Fix> fixes) : _fixes(std::move(fixes)) {
   _fixes.erase(again.begin(), again.end());
 }
 
-std::optional<Position> Track::at(Moment time) const {
+std::optional<Coordinates> Track::at(Moment time) const {
   const auto next = std::ranges::lower_bound(_fixes, time, {}, &Fix::time);
   if (next == _fixes.end()) return std::nullopt;
   if (next->time == time) return next->position;
@@ -36,10 +36,10 @@ std::optional<Position> Track::at(Moment time) const {
   if (apart >= kGap) return std::nullopt;
   const double part =
       static_cast<double>((time - before.time).count()) / static_cast<double>(apart.count());
-  const Position& from = before.position;
-  const Position& to = next->position;
-  return Position{.latitude = std::lerp(from.latitude, to.latitude, part),
-                  .longitude = longitudeBetween(from.longitude, to.longitude, part)};
+  const Coordinates& from = before.position;
+  const Coordinates& to = next->position;
+  return Coordinates{.latitude = std::lerp(from.latitude, to.latitude, part),
+                     .longitude = longitudeBetween(from.longitude, to.longitude, part)};
 }
 
 }  // namespace kestro

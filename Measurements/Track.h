@@ -12,17 +12,17 @@
 namespace kestro {
 
 /// A place on earth, in degrees (WGS 84).
-struct Position {
+struct Coordinates {
   double latitude = 0;   ///< -90 to 90
   double longitude = 0;  ///< -180 to 180
 
-  friend bool operator==(const Position&, const Position&) = default;
+  friend bool operator==(const Coordinates&, const Coordinates&) = default;
 };
 
 /// A place at a time.
 struct Fix {
   Moment time;
-  Position position;
+  Coordinates position;
 };
 
 /// The fixes of a drive.
@@ -38,7 +38,7 @@ class Track {
 
   /// Where the drive was: at a fix, or on the straight line between two that are less than `kGap`
   /// apart, the shorter way round.
-  [[nodiscard]] std::optional<Position> at(Moment time) const;
+  [[nodiscard]] std::optional<Coordinates> at(Moment time) const;
 
   [[nodiscard]] const std::vector<Fix>& fixes() const noexcept { return _fixes; }
 

@@ -47,7 +47,7 @@ TEST(GpxReaderTest, TrackPointsBecomeFixes) {
   ASSERT_TRUE(track) << track.error().message;
   ASSERT_EQ(track->fixes().size(), 2u);
   EXPECT_EQ(track->fixes()[0].time, kGpxStart);
-  EXPECT_EQ(track->fixes()[0].position, (Position{.latitude = 51.5, .longitude = -8.25}));
+  EXPECT_EQ(track->fixes()[0].position, (Coordinates{.latitude = 51.5, .longitude = -8.25}));
   EXPECT_EQ(track->fixes()[1].time, kGpxStart + 2'500ms);
 }
 

@@ -10,7 +10,7 @@ using namespace std::chrono_literals;
 
 constexpr Moment kTrackStart{1'700'000'000s};
 
-Position place(double latitude, double longitude) {
+Coordinates place(double latitude, double longitude) {
   return {.latitude = latitude, .longitude = longitude};
 }
 
