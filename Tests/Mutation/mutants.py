@@ -6,8 +6,13 @@ import dataclasses
 # The types whose constants are tables, or rows that stand alone.
 TABLES = frozenset({
     "Place", "Condition", "Field", "NamedValue", "ListedValue", "RecordTable", "ListReading",
-    "PacketKind", "PacketReading", "Section", "EcnoRow", "SentCounter", "ThroughputLayout",
+    "PacketKind", "PacketReading", "Requirement", "Section", "EcnoRow", "SentCounter",
+    "ThroughputLayout",
 })
+
+# Requirements that differ in whether more than what is required may be there.
+STRICTER_OR_LAXER = {"MinimumLength": "ExactLength", "ExactLength": "MinimumLength",
+                     "HoldsRecords": "EndsWithRecords", "EndsWithRecords": "HoldsRecords"}
 
 
 @dataclasses.dataclass(frozen=True)
@@ -170,6 +175,17 @@ class Mutants:
     def packet_reading(self, view, path):
         pass  # a packet, and tables of their own
 
+    def requirement(self, view, path):
+        """The sub-packets that one asks for are constants of their own."""
+        kind = view["kind"]
+        if kind.value in STRICTER_OR_LAXER:
+            numbers = dict(kind.type.enumerators)
+            other = STRICTER_OR_LAXER[kind.value]
+            self.change(path, other, (kind, numbers[other]))
+        priority = view["priority"]
+        self.change(path, "priority+1", (priority, priority.unpack(priority.bytes) + 1))
+        self.condition(view["condition"], path)
+
     def section(self, view, path):
         pass  # texts, and tables of their own
 
@@ -195,6 +211,7 @@ _KINDS = {
     "ListReading": Mutants.list_reading,
     "PacketKind": Mutants.packet_kind,
     "PacketReading": Mutants.packet_reading,
+    "Requirement": Mutants.requirement,
     "Section": Mutants.section,
     "EcnoRow": Mutants.ecno_row,
     "SentCounter": Mutants.sent_counter,

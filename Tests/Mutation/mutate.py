@@ -169,6 +169,9 @@ def main():
 
     mutants_by_name = all_mutants(options.program, options.root)
     chosen = [name for name in mutants_by_name if matches(name, options.only)]
+    if not chosen:
+        sys.exit(f"mutate: none of {len(mutants_by_name)} mutants fits; is the program of this "
+                 "place, with debug symbols?")
     if options.list:
         print("\n".join(chosen))
         return 0

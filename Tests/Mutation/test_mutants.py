@@ -7,7 +7,8 @@ import unittest
 import mutants
 
 Constant = collections.namedtuple("Constant", "name view")
-Type = collections.namedtuple("Type", "kind name signed", defaults=("struct", "", False))
+Type = collections.namedtuple("Type", "kind name signed enumerators",
+                              defaults=("struct", "", False, ()))
 
 
 class Image:
@@ -20,10 +21,17 @@ class Image:
 class Number:
     """A number of 4 bytes, or an enumerator's name."""
 
-    def __init__(self, address, value, signed=False):
+    def __init__(self, address, value, signed=False, enumerators=()):
         self.address = address
         self.value = value
-        self.type = Type("integer", "", signed)
+        self.type = Type("integer", "", signed, enumerators)
+
+    @property
+    def bytes(self):
+        return dict(self.type.enumerators).get(self.value, self.value)
+
+    def unpack(self, data):
+        return data
 
     def pack(self, number):
         return number
@@ -122,6 +130,28 @@ class Packets(unittest.TestCase):
         self.assertEqual(changes(Struct("PacketKind", 8, code=0xB17F, minimumLength=33)), {
             "code+1": {8: 0xB180}, "minimumLength+1": {9: 34}, "minimumLength-1": {9: 32},
         })
+
+
+class Requirements(unittest.TestCase):
+    KINDS = (("MinimumLength", 0), ("ExactLength", 1), ("HoldsRecords", 2), ("EndsWithRecords", 3),
+             ("Number", 4))
+
+    def changes(self, kind, lowest=0, highest=-1):
+        bounds = {"lowest": Number(50, lowest, True), "highest": Number(51, highest, True)}
+        return changes(Struct("Requirement", 8, kind=Number(8, kind, enumerators=self.KINDS),
+                              priority=Number(9, "Warning", enumerators=(("Warning", 4),)),
+                              condition=Struct("Condition", 40, place=place(), **bounds)))
+
+    def test_what_is_required_becomes_stricter_or_laxer(self):
+        for kind, other in (("MinimumLength", 1), ("ExactLength", 0), ("HoldsRecords", 3),
+                            ("EndsWithRecords", 2)):
+            self.assertIn({8: other}, self.changes(kind).values())
+
+    def test_the_lines_priority_changes(self):
+        self.assertEqual(self.changes("Number"), {"priority+1": {9: 5}})
+
+    def test_a_condition_changes(self):
+        self.assertEqual(self.changes("Number", 2, 255)["lowest+1"], {50: 3})
 
 
 class Counters(unittest.TestCase):

@@ -57,6 +57,12 @@ TEST_F(ForwardThroughputTest, TheSecondPacketShowsTheRateBetweenThem) {
   EXPECT_EQ(extraNumber("FLDataSent1"), 13312);
 }
 
+TEST_F(ForwardThroughputTest, MayBeLonger) {
+  receive(forward(7, 3).length(242));
+  EXPECT_EQ(number("FLDataSent"), 3072);
+  EXPECT_THAT(takeLines(), IsEmpty());
+}
+
 TEST_F(ForwardThroughputTest, WeighsEveryCounter) {
   const std::array<std::int64_t, 56> weights = {
       128,  256,  512, 1024, 0,    128,  256,  512,  1024, 0,    128,  256,  512,  1024,
