@@ -24,6 +24,7 @@ LogChannelHandlers LogChannelClient::handlers() {
                             .notified = [this] { serverNotified(); }};
   if (_watch == ChannelWatch::ByClient) {
     result.followed = [this](std::optional<std::uint64_t> missed) { followed(missed); };
+    result.sourceTold = [this](const LogSourceState& source) { _user.sourceTold(source); };
   }
   return result;
 }

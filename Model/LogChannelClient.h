@@ -57,6 +57,10 @@ class LogChannelUser {
   virtual void channelFollowed(std::chrono::microseconds /*gap*/,
                                std::optional<std::uint64_t> /*missed*/) {}
 
+  /// What the server says of its source: with each channel, before its technology, and when it
+  /// changes. Only with `ChannelWatch::ByClient`.
+  virtual void sourceTold(const LogSourceState& /*source*/) {}
+
   /// The telephony server has something to tell; only with `ChannelWatch::ByUser`.
   virtual void serverNotified() {}
 
@@ -98,6 +102,10 @@ class LogChannelClient {
   /// How long ago the channel was last seen that is lost; absent while there is one, and before
   /// there was one. Only with `ChannelWatch::ByClient`.
   [[nodiscard]] std::optional<std::chrono::microseconds> gap() const;
+
+  /// While a message arrives: when the source had it, if the start command asked for that and the
+  /// server says so.
+  [[nodiscard]] std::optional<Moment> sourceTime() const noexcept { return _ports.sourceTime(); }
 
   /// The steps of `start`, for who takes them one by one. Opens the ports, see
   /// `LogChannelPorts::open`.

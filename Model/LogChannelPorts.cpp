@@ -19,9 +19,12 @@ constexpr std::int32_t kMessageId = messageId(TelephonyMessage::Channel);
 }  // namespace
 
 LogChannelPorts::LogChannelPorts(Platform& platform, LogChannelHandlers handlers)
-    : _platform(platform), _handlers(std::move(handlers)) {}
+    : _platform(platform), _handlers(std::move(handlers)) {
+  if (_handlers.sourceTold) _platform.telephonyService().setSourceHandler(_handlers.sourceTold);
+}
 
 LogChannelPorts::~LogChannelPorts() {
+  if (_handlers.sourceTold) _platform.telephonyService().setSourceHandler({});
   _platform.telephonyService().cancelNotifications();
   close();
 }
@@ -38,9 +41,10 @@ bool LogChannelPorts::open() {
 }
 
 void LogChannelPorts::createLocalPort(std::string_view name) {
+  _sourceTimes = {};
   _recvPort = _platform.messagePorts().createLocalPort(
       name, [this](std::int32_t messageId, ByteView message) -> std::optional<Bytes> {
-        if (messageId == kMessageId) _handlers.received(message);
+        if (_sourceTimes.isLogData(messageId, message)) _handlers.received(message);
         return std::nullopt;
       });
   // Without a port the request for a channel goes out all the same, and fails or is torn down.
@@ -70,6 +74,7 @@ bool LogChannelPorts::createRemotePort(std::string_view localPortName) {
     return false;
   }
   const bool follows = !std::exchange(_channelPort, *channel.portName).empty();
+  if (_handlers.sourceTold) _handlers.sourceTold(channel.source);
   if (follows && _handlers.followed) _handlers.followed(channel.lost);
   _sendPort = _platform.messagePorts().createRemotePort(*channel.portName);
   if (!_sendPort) logError("Could not create the remote port!");

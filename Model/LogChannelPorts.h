@@ -11,8 +11,11 @@
 #include <string_view>
 
 #include "Platform/Bytes.h"
+#include "Platform/Clock.h"
+#include "Platform/LogSourceState.h"
 #include "Platform/MessagePort.h"
 #include "Platform/Platform.h"
+#include "Platform/SourceTimes.h"
 #include "Platform/TelephonyService.h"
 
 namespace kestro {
@@ -31,6 +34,8 @@ struct LogChannelHandlers {
   /// The server has made a channel in place of the one before; how many messages that one has
   /// missed, if the server knows. Without this handler it is not asked.
   std::function<void(std::optional<std::uint64_t> missed)> followed = {};
+  /// What the server says of its source: with each channel, and when it changes.
+  std::function<void(const LogSourceState& source)> sourceTold = {};
 };
 
 /// Main thread only.
@@ -55,6 +60,9 @@ class LogChannelPorts {
   /// there.
   bool check();
 
+  /// While `received` runs: when the source had the message, if the server says so.
+  [[nodiscard]] std::optional<Moment> sourceTime() const noexcept { return _sourceTimes.time(); }
+
   /// Sends a command to the channel, the remote port of which must exist, and waits for its reply.
   [[nodiscard]] RemotePort::Reply request(ByteView command);
   /// Sends a command that has no reply.
@@ -71,6 +79,7 @@ class LogChannelPorts {
   LogChannelHandlers _handlers;
   std::shared_ptr<LocalPort> _recvPort;
   std::shared_ptr<RemotePort> _sendPort;
+  SourceTimes _sourceTimes;
   std::string _channelPort;  ///< of the last channel that there was
 };
 

@@ -62,11 +62,11 @@ Result<void> PcapRecording::setTechnology(std::string_view technology) {
 
 Result<void> PcapRecording::write(Moment time, ByteView message) {
   if (message.size() > kMaximumPcapMessageSize) {
-    ++_leftOutCount;
+    countLeftOut();
     return {};
   }
   auto written = _writer.write(time, message);
-  if (written) ++_messageCount;
+  if (written) countMessage();
   return written;
 }
 

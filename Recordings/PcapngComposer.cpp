@@ -85,7 +85,7 @@ void appendPcapngInterface(Bytes& blocks, std::uint16_t linkType, std::string_vi
 }
 
 void appendPcapngPacket(Bytes& blocks, std::uint32_t interface, const RecordedMessage& message) {
-  const Moment time = std::max(message.time, Moment());
+  const Moment time = std::clamp(message.time, Moment(), kLastPcapngTime);
   const auto microseconds = static_cast<std::uint64_t>(time.time_since_epoch().count());
   appendBlock(blocks, PcapngBlockType::EnhancedPacket, [&] {
     appendLittleEndian(blocks, interface);

@@ -3,9 +3,12 @@
 // format is described in Documentation/recordings.md.
 #pragma once
 
+#include <chrono>
 #include <cstddef>
 #include <cstdint>
 #include <string_view>
+
+#include "Platform/Clock.h"
 
 namespace kestro {
 
@@ -43,9 +46,16 @@ inline constexpr std::size_t kPcapngAlignment = 4;
 inline constexpr std::size_t kLongestPcapngBlock = std::size_t{16} * 1024 * 1024;
 /// The most interfaces of a section.
 inline constexpr std::size_t kMostPcapngInterfaces = 65'536;
-/// The most comments that wait for a message, or that one message has, and their bytes.
+/// The most comments that wait for a message, or that one message has, and their bytes: so many
+/// that they and the message fit into a block that is read.
 inline constexpr std::size_t kMostPcapngComments = 10'000;
-inline constexpr std::size_t kLongestPcapngComments = std::size_t{16} * 1024 * 1024;
+inline constexpr std::size_t kLongestPcapngComments = kLongestPcapngBlock / 2;
+
+/// Times outside the years 1 to 9999, which are those of texts and property lists, are not read;
+/// what is written lies between 1970 and the last of them.
+inline constexpr Moment kFirstPcapngTime = std::chrono::sys_days(std::chrono::year(1) / 1 / 1);
+inline constexpr Moment kLastPcapngTime =
+    Moment(std::chrono::sys_days(std::chrono::year(10'000) / 1 / 1)) - std::chrono::microseconds(1);
 
 /// Begins the comment of a section that says what in the recording is made up.
 inline constexpr std::string_view kMadeUpComment = "made-up: ";

@@ -12,14 +12,9 @@
 namespace kestro {
 namespace {
 
-using namespace std::chrono;
-
 constexpr std::uint64_t kMicrosecondsPerSecond = 1'000'000;
 constexpr unsigned kMicrosecondDigits = 6;
 constexpr std::uint8_t kBinaryResolution = 0x80;
-
-constexpr Moment kEarliest = sys_days(year(1) / January / 1);
-constexpr Moment kEnd = sys_days(year(10'000) / January / 1);
 
 /// 10^exponent, or 0 when that is more than any time has units.
 constexpr std::uint64_t powerOfTen(unsigned exponent) noexcept {
@@ -57,10 +52,11 @@ PcapngTimeScale::PcapngTimeScale(std::uint8_t resolution, std::int64_t offset) n
 std::optional<Moment> PcapngTimeScale::momentOf(std::uint64_t units) const noexcept {
   const Wide count = scaled(units, _multiplier, _divisor, _shift) +
                      Wide{_offset} * static_cast<std::int64_t>(kMicrosecondsPerSecond);
-  if (count < kEarliest.time_since_epoch().count() || count >= kEnd.time_since_epoch().count()) {
+  if (count < kFirstPcapngTime.time_since_epoch().count() ||
+      count > kLastPcapngTime.time_since_epoch().count()) {
     return std::nullopt;
   }
-  return Moment(microseconds(static_cast<std::int64_t>(count)));
+  return Moment(std::chrono::microseconds(static_cast<std::int64_t>(count)));
 }
 
 Result<PcapngInterface> pcapngInterfaceOf(PcapngBytes body) {

@@ -30,9 +30,9 @@ class PcapngWriter {
 
   /// Appends a message, whose number does not count, with its comments. One of more than
   /// kMaximumPcapMessageSize bytes, or of an unknown technology, is refused and leaves the file as
-  /// it was. Times are kept to the microsecond; one before 1970 is written as 1970-01-01. When the
-  /// system refuses the bytes (a full disk), the file may end in half a block, and every later call
-  /// yields the same error.
+  /// it was. Times are kept to the microsecond; one outside the years 1970 to 9999 is written as
+  /// the nearest one inside. When the system refuses the bytes (a full disk), the file may end in
+  /// half a block, and every later call yields the same error.
   [[nodiscard]] Result<void> write(const RecordedMessage& message);
 
   /// Appends notes that no message follows, if there are any: as the comments of a section without

@@ -10,11 +10,24 @@
 #include "Platform/Clock.h"
 #include "Platform/TelephonyProtocol.h"
 #include "Recordings/OutputPath.h"
+#include "Recordings/StorableValue.h"
+#include "Sources/LogSource.h"
 
 namespace kestro {
 namespace {
 
 constexpr const char* kConnectingRemark = "connecting...";
+constexpr const char* kLostNote = "connection lost";
+
+/// What of the messages is made up, for the recording: of a drive-test log only a part is.
+std::string_view madeUpBy(const LogSourceState& source) {
+  if (!source.isSimulated.value_or(false)) return {};
+  return source.kind == kMadeUpFromDriveTest ? kMadeUpFromDriveTest : kMadeUpBySimulation;
+}
+
+std::string countOfMissed(std::optional<std::uint64_t> missed) {
+  return missed ? fmt::format("{} messages", *missed) : "an unknown number of messages";
+}
 
 std::string namesOf(const std::vector<std::string>& files) {
   std::vector<std::string> names(files.size());
@@ -52,8 +65,20 @@ void RecordSession::tellProgress() {
 }
 
 void RecordSession::stop() {
-  if (const auto gap = _client.gap()) channelFollowed(*gap, std::nullopt);
+  if (_isOver) return;
+  if (const auto gap = _client.gap()) addGap(*gap, std::nullopt, false);
+  if (_recording) {
+    if (const auto finished = _recording->finish(); !finished) fail(finished.error().message);
+  }
   _isOver = true;
+}
+
+void RecordSession::addNote(std::string_view line) {
+  if (_isOver || line.empty()) return;
+  if (!_recording) return _remark("the recording has not begun: the note is dropped");
+  if (!_recording->addNote(storableText(line))) {
+    _remark("the note is dropped: the recording has no room for it");
+  }
 }
 
 std::optional<std::string> RecordSession::summary() const {
@@ -76,11 +101,28 @@ std::string RecordSession::lossesText() const {
 
 void RecordSession::channelFollowed(std::chrono::microseconds gap,
                                     std::optional<std::uint64_t> missed) {
-  if (_isOver || missed == 0U) return;
+  if (!_isOver && missed != 0U) addGap(gap, missed, true);
+}
+
+void RecordSession::addGap(std::chrono::microseconds gap, std::optional<std::uint64_t> missed,
+                           bool isOver) {
   ++_losses.count;
   _losses.time += gap;
   _losses.messages += missed.value_or(0);
   _losses.areMore |= !missed;
+  if (!_recording) return;
+  // Where there is no room for it, the last line tells of it all the same.
+  static_cast<void>(_recording->addNote(kLostNote));
+  if (!isOver) return;
+  static_cast<void>(_recording->addNote(
+      fmt::format("connection back after at most {:.1f} s; {} were missed",
+                  std::chrono::duration<double>(gap).count(), countOfMissed(missed))));
+}
+
+void RecordSession::sourceTold(const LogSourceState& source) {
+  _madeUp = madeUpBy(source);
+  if (_isOver || !_recording) return;
+  if (const auto told = _recording->setMadeUp(_madeUp); !told) fail(told.error().message);
 }
 
 void RecordSession::technologyAnswered(std::string_view technology) {
@@ -92,21 +134,28 @@ void RecordSession::technologyAnswered(std::string_view technology) {
 /// Without lists of codes everything is streamed.
 std::optional<Dictionary> RecordSession::startCommand() {
   if (_isOver || !_recording) return std::nullopt;
-  return Dictionary{{kTelephonySetState, kTelephonyStreaming}};
+  Dictionary command{{kTelephonySetState, kTelephonyStreaming}};
+  if (_usesSourceTimes) command.set(kTelephonyTimes, Value::boolean(true));
+  return command;
 }
 
 Result<void> RecordSession::openFile(std::string_view technology) {
   if (_recording) return _recording->setTechnology(technology);
-  auto created = PcapRecording::create(_path, technology, _inputs);
+  auto created = createRecording(_path, technology, _madeUp, _inputs);
   if (!created) return tl::unexpected(created.error());
   _recording = *std::move(created);
   return {};
 }
 
+Moment RecordSession::timeOfMessage() const {
+  const auto now = _platform.clock().now();
+  return _usesSourceTimes ? _client.sourceTime().value_or(now) : now;
+}
+
 void RecordSession::messageArrived(ByteView message) {
   if (_isOver) return;
   const std::uint64_t leftOutBefore = _recording->leftOutCount();
-  if (const auto written = _recording->write(_platform.clock().now(), message); !written) {
+  if (const auto written = _recording->write(timeOfMessage(), message); !written) {
     return fail(written.error().message);
   }
   if (_recording->leftOutCount() == leftOutBefore) {

@@ -41,6 +41,7 @@ class RecordingUser : public LogChannelUser {
                        std::optional<std::uint64_t> missed) override {
     gaps.push_back({gap, missed});
   }
+  void sourceTold(const LogSourceState& source) override { sources.push_back(source); }
   void serverNotified() override { events.emplace_back("notified"); }
   [[nodiscard]] std::shared_ptr<const void> keptByRetry() override { return kept; }
 
@@ -48,6 +49,7 @@ class RecordingUser : public LogChannelUser {
 
   using Gap = std::pair<std::chrono::microseconds, std::optional<std::uint64_t>>;
   std::vector<Gap> gaps;
+  std::vector<LogSourceState> sources;
   std::vector<std::string> events;
   std::optional<Dictionary> command = Dictionary{{"SetState", "Streaming"}};
   bool throwsAtMessages = false;
@@ -399,6 +401,45 @@ TEST_F(LogChannelClientTest, WhoWatchesItsChannelItselfIsToldNothingOfLostOnes) 
   EXPECT_TRUE(client->isConnected());
   EXPECT_THAT(user.gaps, IsEmpty());
   EXPECT_THAT(platform.telephonyService().previousPorts(), IsEmpty());
+}
+
+TEST_F(LogChannelClientTest, TellsWhatTheServerSaysOfItsSource) {
+  const LogSourceState simulation{.kind = "simulation", .isSimulated = true};
+  const LogSourceState ended{.kind = "simulation", .isSimulated = true, .hasEnded = true};
+  channelReply.source = simulation;
+  startClient();
+  EXPECT_THAT(user.sources, ElementsAre(simulation));
+  platform.telephonyService().notifySource(ended);
+  EXPECT_THAT(user.sources, ElementsAre(simulation, ended));
+  client.reset();
+  platform.telephonyService().notifySource(simulation);
+  EXPECT_THAT(user.sources, SizeIs(2));
+}
+
+TEST_F(LogChannelClientTest, WhoWatchesItsChannelItselfIsToldNothingOfTheSource) {
+  startClient(ChannelWatch::ByUser);
+  platform.telephonyService().notifySource({.isSimulated = true});
+  EXPECT_THAT(user.sources, IsEmpty());
+}
+
+TEST_F(LogChannelClientTest, KnowsTheSourcesTimeOfAMessageThatCameWithOne) {
+  startClient();
+  send(Bytes{0x2A, 0, 0, 0, 0, 0, 0, 0}, 4);
+  EXPECT_THAT(user.take(), IsEmpty());
+  send(bytesOf("a"));
+  EXPECT_THAT(user.take(), ElementsAre("message a"));
+  EXPECT_EQ(client->sourceTime(), Moment(std::chrono::microseconds(42)));
+  send(bytesOf("b"));
+  EXPECT_EQ(client->sourceTime(), std::nullopt);
+}
+
+TEST_F(LogChannelClientTest, ATimeWithoutItsMessageIsForgottenWithTheChannel) {
+  startClient();
+  send(Bytes{0x2A, 0, 0, 0, 0, 0, 0, 0}, 4);
+  client->restart();
+  queue().runReady();
+  send(bytesOf("a"));
+  EXPECT_EQ(client->sourceTime(), std::nullopt);
 }
 
 }  // namespace

@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "CommandLine/Commands/RecordSession.h"
+#include "Recordings/OpenRecording.h"
 #include "Recordings/PcapReader.h"
 #include "Tests/Support/FileSizeLimit.h"
 #include "Tests/Support/LogChannelFixture.h"
@@ -53,7 +54,21 @@ class RecordSessionTest : public testing::LogChannelFixture {
     return result;
   }
 
+  /// "technology: message [comment]..." for every message of a drive, and the closing notes.
+  [[nodiscard]] std::vector<std::string> driveIn(const std::string& path) const {
+    const auto reader = openRecording(path, {.coding = *coding}).value();
+    std::vector<std::string> result;
+    while (const auto next = *reader->next()) {
+      result.push_back(std::string(next->technology) + ": " +
+                       std::string(next->bytes.begin(), next->bytes.end()));
+      for (const std::string& comment : next->comments) result.back() += " [" + comment + "]";
+    }
+    for (const std::string& note : reader->closingNotes()) result.push_back("[" + note + "]");
+    return result;
+  }
+
   testing::TemporaryFile file{"drive.pcap"};
+  const std::string drive = file.directory() + "/drive.pcapng";
   std::vector<std::string> inputs;
   std::vector<std::string> remarks;
   std::vector<std::string> failures;
@@ -227,6 +242,124 @@ TEST_F(RecordSessionTest, AFileThatMayNotGrowIsReportedOnce) {
   for (int i = 0; i < 5; ++i) send(Bytes(30, 'x'));
   ASSERT_EQ(failures.size(), 1U);
   EXPECT_THAT(failures[0], ::testing::StartsWith(file.path() + ": "));
+}
+
+// --- Drives
+
+TEST_F(RecordSessionTest, ADriveThroughTwoTechnologiesIsOneFile) {
+  start(drive);
+  send(testing::bytesOf("a"));
+  channelReply.lost = 0;
+  changeTechnology("LTE");
+  send(testing::bytesOf("b"));
+  session->stop();
+  EXPECT_THAT(driveIn(drive), ElementsAre("IFX: a", "LTE: b"));
+  EXPECT_THAT(remarks, ElementsAre("recording IFX to " + drive, "recording LTE to " + drive));
+  EXPECT_EQ(session->summary(), "2 messages, 2 bytes, 0 dropped, in " + drive);
+}
+
+TEST_F(RecordSessionTest, NotesAreCommentsOfTheNextMessageOrCloseTheFile) {
+  start(drive);
+  send(testing::bytesOf("a"));
+  session->addNote("tunnel \xFF\x1B[1m");
+  session->addNote("");
+  session->addNote("bridge");
+  send(testing::bytesOf("b"));
+  session->addNote("parked");
+  session->stop();
+  session->addNote("too late");
+  EXPECT_THAT(driveIn(drive),
+              ElementsAre("IFX: a", "IFX: b [tunnel \uFFFD\uFFFD[1m] [bridge]", "[parked]"));
+}
+
+TEST_F(RecordSessionTest, ANoteThatCannotBeKeptIsTold) {
+  platform.telephonyService().setReachable(false);
+  start(file.path());
+  session->addNote("early");
+  EXPECT_EQ(remarks.back(), "the recording has not begun: the note is dropped");
+  platform.telephonyService().setReachable(true);
+  queue().advance(5s);
+  session->addNote("no room");
+  EXPECT_EQ(remarks.back(), "the note is dropped: the recording has no room for it");
+}
+
+TEST_F(RecordSessionTest, ALostConnectionAndItsReturnAreComments) {
+  start(drive);
+  send(testing::bytesOf("a"));
+  loseServer();
+  queue().advance(3s);
+  bringServerBack();
+  channelReply.lost = 7;
+  queue().advance(5s);
+  send(testing::bytesOf("b"));
+  channelReply.lost = std::nullopt;
+  changeTechnology("IFX");
+  send(testing::bytesOf("c"));
+  EXPECT_THAT(
+      driveIn(drive),
+      ElementsAre("IFX: a",
+                  "IFX: b [connection lost] "
+                  "[connection back after at most 7.0 s; 7 messages were missed]",
+                  "IFX: c [connection lost] [connection back after at most 2.0 s; an unknown "
+                  "number of messages were missed]"));
+}
+
+TEST_F(RecordSessionTest, AConnectionThatIsLostAtTheEndIsAClosingNote) {
+  start(drive);
+  send(testing::bytesOf("a"));
+  loseServer();
+  queue().advance(5s);
+  session->stop();
+  EXPECT_THAT(driveIn(drive), ElementsAre("IFX: a", "[connection lost]"));
+}
+
+TEST_F(RecordSessionTest, TheFileTellsThatItsSourceIsSimulated) {
+  const auto madeUp = [&] {
+    return std::string(openRecording(drive, {.coding = *coding}).value()->madeUp());
+  };
+  start(drive);
+  EXPECT_EQ(madeUp(), "");
+  session->stop();
+  channelReply.source = {.kind = "simulation", .isSimulated = true};
+  start(drive);
+  EXPECT_EQ(madeUp(), "simulation");
+  session->stop();
+  channelReply.source = {.kind = "drive-test", .isSimulated = true};
+  start(drive);
+  EXPECT_EQ(madeUp(), "drive-test");
+  session->stop();
+  channelReply.source = {.kind = "stream", .isSimulated = false};
+  start(drive);
+  EXPECT_EQ(madeUp(), "");
+  platform.telephonyService().notifySource({.kind = "simulation", .isSimulated = true});
+  EXPECT_EQ(madeUp(), "simulation") << "when the source changes";
+}
+
+TEST_F(RecordSessionTest, SourceTimesAreAskedForAndKept) {
+  session.emplace(
+      platform, file.path(), inputs, [](const std::string& /*text*/) {},
+      [](const std::string& /*reason*/) {});
+  session->useSourceTimes();
+  session->start();
+  queue().runReady();
+  ASSERT_EQ(commands.size(), 2U);
+  EXPECT_EQ(coding->parse(commands[1]).value(),
+            Value(Dictionary{{"SetState", "Streaming"}, {"Times", Value::boolean(true)}}));
+  // 1,330,866,042 s: 42 s after the virtual clock's start, in µs, the lowest byte first.
+  send(Bytes{0x80, 0x52, 0xAD, 0x65, 0x6A, 0xBA, 0x04, 0x00}, 4);
+  send(testing::bytesOf("a"));
+  queue().advance(3s);
+  send(testing::bytesOf("b"));
+  EXPECT_THAT(messagesIn(file.path()), ElementsAre("IFX: 42, a", "IFX: 3, b"));
+}
+
+TEST_F(RecordSessionTest, ClosingNotesThatCannotBeWrittenAreAFailure) {
+  start(drive);
+  session->addNote("n");
+  const FileSizeLimit limit(30);
+  session->stop();
+  ASSERT_EQ(failures.size(), 1U);
+  EXPECT_THAT(failures[0], ::testing::StartsWith(drive + ": "));
 }
 
 }  // namespace
