@@ -3,27 +3,13 @@
 
 #include <fmt/format.h>
 
-#include "CommandLine/Formats/DisplayText.h"
+#include "CommandLine/Formats/CsvField.h"
 #include "CommandLine/Formats/SiblingNames.h"
 #include "CommandLine/Formats/TimeText.h"
 #include "CommandLine/Formats/TreeLayout.h"
 
 namespace kestro {
 namespace {
-
-void appendCsvField(std::string& output, std::string_view text) {
-  if (validUtf8Prefix(text) != text.size()) return appendCsvField(output, validUtf8(text));
-  if (text.find_first_of(",\"\r\n") == std::string_view::npos) {
-    output += text;
-    return;
-  }
-  output += '"';
-  for (const char character : text) {
-    if (character == '"') output += '"';
-    output += character;
-  }
-  output += '"';
-}
 
 /// Appends a display's leaves, each after the same beginning of the line.
 class CsvLines {

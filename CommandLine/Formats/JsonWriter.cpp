@@ -53,6 +53,7 @@ void JsonWriter::text(std::string_view value) {
 
 void JsonWriter::number(std::uint64_t value) { word(fmt::format_int(value).c_str()); }
 void JsonWriter::integer(std::int64_t value) { word(fmt::format_int(value).c_str()); }
+void JsonWriter::real(double value) { word(fmt::format("{}", value)); }
 void JsonWriter::boolean(bool value) { word(value ? "true" : "false"); }
 
 void JsonWriter::word(std::string_view text) {

@@ -32,6 +32,8 @@ class JsonWriter {
   void number(std::uint64_t value);
   /// A number that may be negative.
   void integer(std::int64_t value);
+  /// A finite number, in as few digits as tell it from every other.
+  void real(double value);
   void boolean(bool value);
 
  private:

@@ -49,6 +49,15 @@ TEST(JsonWriter, WritesNumbersAndNames) {
   EXPECT_EQ(output, "[18446744073709551615,-9223372036854775808,true,false]");
 }
 
+TEST(JsonWriter, WritesFractionsInAsFewDigitsAsTheyNeed) {
+  std::string output;
+  JsonWriter writer(output);
+  writer.beginArray();
+  for (const double value : {-88.25, 0.1, 15.0, -0.5, 1e300}) writer.real(value);
+  writer.endArray();
+  EXPECT_EQ(output, "[-88.25,0.1,15,-0.5,1e+300]");
+}
+
 TEST(JsonWriter, WritesOneValueAfterTheOther) {
   std::string output;
   JsonWriter writer(output);
