@@ -4,9 +4,15 @@
 #include <algorithm>
 #include <string>
 
+#include "LogGenerator/C2K/C2KMeasurer.h"
+#include "LogGenerator/GsmUmts/Ondrel_GSMClassIndex.h"
+#include "LogGenerator/GsmUmts/Ondrel_GSMLogGenerator.h"
+#include "LogGenerator/IFX/IFXMeasurer.h"
 #include "LogGenerator/LTE/LTEClassIndex.h"
 #include "LogGenerator/LTE/LTELogGenerator.h"
 #include "LogGenerator/Ondrel/PacketMeasurer.h"
+#include "LogGenerator/UTRAN/UTRANClassIndex.h"
+#include "LogGenerator/UTRAN/UTRANLogGenerator.h"
 #include "Platform/TelephonyService.h"
 
 namespace kestro {
@@ -20,13 +26,35 @@ struct MeasuredTechnology {
   MakeMeasurer make;
 };
 
+template <class MeasurerOfTechnology>
+std::unique_ptr<TechnologyMeasurer> make(const MeasurerServices& services, SeriesTable& series) {
+  return std::make_unique<MeasurerOfTechnology>(services, series);
+}
+
+std::unique_ptr<TechnologyMeasurer> makeGsmUmts(const MeasurerServices& services,
+                                                SeriesTable& series) {
+  return std::make_unique<PacketMeasurer>(services, series, kTqLogChannelTechnology_Ondrel_GSM,
+                                          kGsmUmtsTemplate, gsmUmtsSections());
+}
+
 std::unique_ptr<TechnologyMeasurer> makeLTE(const MeasurerServices& services, SeriesTable& series) {
   return std::make_unique<PacketMeasurer>(services, series, kTqLogChannelTechnology_Ondrel_LTE,
                                           kLTETemplate, lteSections());
 }
 
+std::unique_ptr<TechnologyMeasurer> makeUTRAN(const MeasurerServices& services,
+                                              SeriesTable& series) {
+  return std::make_unique<PacketMeasurer>(services, series, kTqLogChannelTechnology_Ondrel_UTRAN2,
+                                          utranTemplateName(services.bundle).value_or(""),
+                                          utranSections());
+}
+
 constexpr MeasuredTechnology kMeasuredTechnologies[] = {
+    {kTqLogChannelTechnology_IFX, make<IFXMeasurer>},
+    {kTqLogChannelTechnology_Ondrel_GSM, makeGsmUmts},
+    {kTqLogChannelTechnology_Ondrel_CDMA, make<C2KMeasurer>},
     {kTqLogChannelTechnology_Ondrel_LTE, makeLTE},
+    {kTqLogChannelTechnology_Ondrel_UTRAN2, makeUTRAN},
 };
 
 }  // namespace

@@ -23,8 +23,6 @@
 namespace kestro {
 namespace {
 
-constexpr std::string_view kTemplateName = "C2KTemplate";
-
 std::vector<std::unique_ptr<C2KParser>> makeParsers() {
   std::vector<std::unique_ptr<C2KParser>> parsers;
   parsers.push_back(std::make_unique<EVDOFingers>());
@@ -208,7 +206,7 @@ Value C2KLogGenerator::generateLogUsingState(Dictionary& state) {
 Value C2KLogGenerator::getDisplayFromState(Dictionary& state) {
   const Value& known = _displayKey.in(state);
   if (!known.isNull()) return known;
-  const Value displayTemplate = templateOfState(services(), kTemplateName, state);
+  const Value displayTemplate = templateOfState(services(), kC2KTemplate, state);
   if (displayTemplate.isNull()) {
     services().systemLog.write(LogPriority::Error, "Cannot load C2K template for display");
     return {};
@@ -242,7 +240,7 @@ void C2KLogGenerator::processTemplateStoreDisplayIntoDictStoreLookupIntoDict(
 }
 
 const TemplatePlaces& C2KLogGenerator::places() const {
-  if (!_places) _places.emplace(loadTemplate(services(), kTemplateName).dictionary());
+  if (!_places) _places.emplace(loadTemplate(services(), kC2KTemplate).dictionary());
   return *_places;
 }
 

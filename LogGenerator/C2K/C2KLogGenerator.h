@@ -16,6 +16,9 @@
 
 namespace kestro {
 
+/// The resource that is its template.
+inline constexpr std::string_view kC2KTemplate = "C2KTemplate";
+
 /// Shows values where the template "C2KTemplate" wants them: each of its leaves names a value, and
 /// a lookup table leads from the name to all leaves that do.
 class C2KLogGenerator : public OndrelLogGenerator {

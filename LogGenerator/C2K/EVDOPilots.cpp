@@ -19,10 +19,15 @@ constexpr Field kActivePilot[] = {
     {kPilotEnergy, u16(2), computed(writeEnergy, "writeEnergy")},
 };
 static_assert(isLayout(kActivePilot));
+constexpr auto kActivePilotIdentity = fieldsNamed(kActivePilot, kPilotPNOffset);
 
-constexpr ListReading kActivePilots[] = {
-    {.table = {.name = "pilot", .count = u8(15), .base = 25, .stride = 12, .fields = kActivePilot},
-     .key = "kActiveSetPilots"}};
+constexpr ListReading kActivePilots[] = {{.table = {.name = "pilot",
+                                                    .count = u8(15),
+                                                    .base = 25,
+                                                    .stride = 12,
+                                                    .fields = kActivePilot,
+                                                    .identity = kActivePilotIdentity},
+                                          .key = "kActiveSetPilots"}};
 
 constexpr Requirement kActiveSetRequirements[] = {
     kMinimumLength,
@@ -39,13 +44,15 @@ constexpr Field kFinger[] = {
     {kPilotEnergy, u16(6), computed(writeEnergy, "writeEnergy")},
 };
 static_assert(isLayout(kFinger));
+constexpr auto kFingerIdentity = fieldsNamed(kFinger, kPilotPNOffset);
 
 constexpr ListReading kFingers[] = {{.table = {.name = "finger",
                                                .count = u8(22),
                                                .base = 23,
                                                .stride = 14,
                                                .fields = kFinger,
-                                               .keep = between(kFingerPN, 0, kUnusedFinger - 1)},
+                                               .keep = between(kFingerPN, 0, kUnusedFinger - 1),
+                                               .identity = kFingerIdentity},
                                      .key = "kFingerC2I"}};
 
 // The size shown is the header's alone, whatever the count.
@@ -59,6 +66,8 @@ constexpr Requirement kFingersRequirements[] = {
 constexpr PacketReading kEVDOActiveSetReading = {.packet = kEVDOActiveSetPacket,
                                                  .lists = kActivePilots};
 constexpr PacketReading kEVDOFingersReading = {.packet = kEVDOFingersPacket, .lists = kFingers};
+constexpr PacketRules kEVDOActiveSetRules = {kEVDOActiveSetReading, kActiveSetRequirements};
+constexpr PacketRules kEVDOFingersRules = {kEVDOFingersReading, kFingersRequirements};
 
 EVDOPilots::EVDOPilots(const PacketRules& pilotsRules)
     : C2KParser(pilotsRules), _energy(table().fields[1]), _name(pilotsRules.reading.lists[0].key) {}
@@ -75,7 +84,7 @@ void EVDOPilots::take(const TakenPacket& packet, C2KOutput& output) {
   }
 }
 
-EVDOActiveSet::EVDOActiveSet() : EVDOPilots({kEVDOActiveSetReading, kActiveSetRequirements}) {}
-EVDOFingers::EVDOFingers() : EVDOPilots({kEVDOFingersReading, kFingersRequirements}) {}
+EVDOActiveSet::EVDOActiveSet() : EVDOPilots(kEVDOActiveSetRules) {}
+EVDOFingers::EVDOFingers() : EVDOPilots(kEVDOFingersRules) {}
 
 }  // namespace kestro

@@ -15,6 +15,8 @@ inline constexpr PacketKind kEVDOFingersPacket = {
 
 extern const PacketReading kEVDOActiveSetReading;
 extern const PacketReading kEVDOFingersReading;
+extern const PacketRules kEVDOActiveSetRules;
+extern const PacketRules kEVDOFingersRules;
 
 /// Shows one list of pilots. The code decides how long a packet with so many pilots has to be.
 class EVDOPilots : public C2KParser {

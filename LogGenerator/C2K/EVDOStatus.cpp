@@ -42,6 +42,8 @@ constexpr Requirement kEVDOStatusRequirements[] = {
 constexpr PacketReading kEVDOStatusReading = {.packet = kEVDOStatusPacket,
                                               .fields = kEVDOStatusFields};
 
-EVDOStatus::EVDOStatus() : FieldParser({kEVDOStatusReading, kEVDOStatusRequirements}) {}
+constexpr PacketRules kEVDOStatusRules = {kEVDOStatusReading, kEVDOStatusRequirements};
+
+EVDOStatus::EVDOStatus() : FieldParser(kEVDOStatusRules) {}
 
 }  // namespace kestro

@@ -10,6 +10,7 @@ inline constexpr PacketKind kEVDOStatusPacket = {
     .code = 0x1183, .name = "EV-DO status", .minimumLength = 50};
 
 extern const PacketReading kEVDOStatusReading;
+extern const PacketRules kEVDOStatusRules;
 
 /// Shows where the phone's EV-DO receiver is tuned to and what state it is in.
 class EVDOStatus : public FieldParser {

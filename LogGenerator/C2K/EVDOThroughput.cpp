@@ -97,15 +97,28 @@ EVDOThroughput::EVDOThroughput(const ThroughputLayout& layout)
 
 std::vector<std::string_view> EVDOThroughput::lookupNames() const { return {_layout.rateName}; }
 
-std::int64_t EVDOThroughput::sentIn(PacketView packet) const noexcept {
-  if (packet.size() < reading().packet.minimumLength) return 0;
-  std::int64_t sent = 0;
-  for (const SentCounter& counter : _layout.counters) {
+ThroughputSample sampleOf(const ThroughputLayout& layout, PacketView packet) noexcept {
+  ThroughputSample sample{.sequence = readNumber(layout.sequenceNumber, packet, {})};
+  for (const SentCounter& counter : layout.counters) {
     // All of them lie in a packet that is long enough: a view of just four bytes need not look.
     const PacketView count(packet.bytes().subspan(counter.offset, sizeof(std::uint32_t)));
-    sent += std::int64_t{count.u32(0)} * counter.bits;
+    sample.sent += std::int64_t{count.u32(0)} * counter.bits;
   }
-  return sent;
+  return sample;
+}
+
+std::optional<double> rateBetween(const ThroughputSample& previous,
+                                  const ThroughputSample& current) noexcept {
+  // The numbers wrap at 32 bits; their distance is signed all the same.
+  const auto distance =
+      static_cast<std::int32_t>(static_cast<std::uint32_t>(current.sequence - previous.sequence));
+  if (distance < 1) return std::nullopt;
+  return static_cast<double>(current.sent - previous.sent) /
+         static_cast<double>(std::int64_t{distance} * 1024);
+}
+
+std::int64_t EVDOThroughput::sentIn(PacketView packet) const noexcept {
+  return packet.size() < reading().packet.minimumLength ? 0 : sampleOf(_layout, packet).sent;
 }
 
 EVDOThroughput::Sample EVDOThroughput::keptIn(const Dictionary& state) {
@@ -121,8 +134,8 @@ void EVDOThroughput::keep(const Sample& sample, Dictionary& state, Dictionary& e
 
 void EVDOThroughput::take(const TakenPacket& packet, C2KOutput& output) {
   const Sample previous = keptIn(output.state);
-  const Sample current{Value::integer(readNumber(_layout.sequenceNumber, packet.bytes, {})),
-                       Value::integer(sentIn(packet.bytes))};
+  const ThroughputSample said = sampleOf(_layout, packet.bytes);
+  const Sample current{Value::integer(said.sequence), Value::integer(said.sent)};
   Dictionary extraInfo = _extraInfo.in(output.state).dictionary();
   if (previous.sequence.isInteger() && previous.sent.isInteger()) {
     storeRate(previous, current, output.lookup);
@@ -136,14 +149,11 @@ void EVDOThroughput::take(const TakenPacket& packet, C2KOutput& output) {
 
 void EVDOThroughput::storeRate(const Sample& previous, const Sample& current,
                                const LookupTable& lookup) {
-  // The numbers wrap at 32 bits; their distance is signed all the same.
-  const auto distance = static_cast<std::int32_t>(
-      static_cast<std::uint32_t>(current.sequence.integerBits() - previous.sequence.integerBits()));
-  if (distance < 1) return;
-  const std::int64_t sent = current.sent.integerBits() - previous.sent.integerBits();
+  const auto rate = rateBetween({previous.sequence.integerBits(), previous.sent.integerBits()},
+                                {current.sequence.integerBits(), current.sent.integerBits()});
+  if (!rate) return;
   TextBuffer text;
-  text.append("%.2f kbps",
-              static_cast<double>(sent) / static_cast<double>(std::int64_t{distance} * 1024));
+  text.append(kDataRateFormat, *rate);
   lookup.store(_rate, text.text());
 }
 

@@ -4,6 +4,7 @@
 #pragma once
 
 #include <cstdint>
+#include <optional>
 #include <span>
 #include <string_view>
 
@@ -36,6 +37,22 @@ struct ThroughputLayout {
   std::string_view sequenceStateKey;  ///< where the state keeps the last packet's number
   std::string_view sentStateKey;      ///< and what had been sent by then
 };
+
+/// What a packet says: its number, and what its counters add up to, in bits.
+struct ThroughputSample {
+  std::int64_t sequence = 0;
+  std::int64_t sent = 0;
+};
+
+/// What a packet that is long enough says.
+[[nodiscard]] ThroughputSample sampleOf(const ThroughputLayout& layout, PacketView packet) noexcept;
+
+/// The data rate between two packets, in kbit/s of 1024; nothing when the second's number is not
+/// above the first's.
+[[nodiscard]] std::optional<double> rateBetween(const ThroughputSample& previous,
+                                                const ThroughputSample& current) noexcept;
+
+inline constexpr NumberFormat kDataRateFormat = "%.2f kbps";
 
 extern const ThroughputLayout kForwardThroughput;
 extern const ThroughputLayout kReverseThroughput;

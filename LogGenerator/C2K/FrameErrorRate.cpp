@@ -10,10 +10,9 @@ namespace {
 constexpr float kFrameWeight = 0.015625F;
 constexpr float kPreviousWeight = 0.984375F;
 
-Value percentText(const NumberFormat& format, float rate) {
-  const float percent = rate * 100.0F;
+Value textOf(const NumberFormat& format, const FrameErrorRate& rate) {
   TextBuffer text;
-  text.append(format, double{percent});
+  text.append(format, rate.percent());
   return text.text();
 }
 
@@ -50,21 +49,25 @@ void FrameErrorRate::keepIn(Dictionary& state) const {
   state.set(kStateTrafficFER, Value::real(double{_rate}));
 }
 
-Value FrameErrorRate::text() const { return percentText("%.02f%%", _rate); }
-Value FrameErrorRate::oldText() const { return percentText("%.02f%% (old)", _rate); }
+Value FrameErrorRate::text() const { return textOf(kFrameErrorRateFormat, *this); }
+Value FrameErrorRate::oldText() const { return textOf("%.02f%% (old)", *this); }
 
 // --- 0x119D --------------------------------------------------------------------------------------
 
 constexpr PacketReading kTrafficFrameReading = {.packet = kOneXTrafficFramePacket};
+constexpr PacketRules kTrafficFrameRules = {kTrafficFrameReading, kTrafficFrameRequirements};
+
+bool isBadFrame(const TakenPacket& packet) {
+  return readBits(kIsBadFrame, packet.bytes, {.here = packet.subPackets[0]}) != 0;
+}
 
 std::vector<std::string_view> TrafficFrame::lookupNames() const { return {kFrameErrorRateName}; }
 
-TrafficFrame::TrafficFrame()
-    : C2KParser({kTrafficFrameReading, kTrafficFrameRequirements}), _rate(kFrameErrorRateName) {}
+TrafficFrame::TrafficFrame() : C2KParser(kTrafficFrameRules), _rate(kFrameErrorRateName) {}
 
 void TrafficFrame::take(const TakenPacket& packet, C2KOutput& output) {
-  const bool isBad = readBits(kIsBadFrame, packet.bytes, {.here = packet.subPackets[0]}) != 0;
-  const auto rate = FrameErrorRate::after(FrameErrorRate::ofState(output.state), isBad);
+  const auto rate =
+      FrameErrorRate::after(FrameErrorRate::ofState(output.state), isBadFrame(packet));
   rate.keepIn(output.state);
   output.lookup.store(_rate, rate.text());
 }

@@ -11,6 +11,7 @@
 namespace kestro {
 
 inline constexpr std::string_view kFrameErrorRateName = "k1xTrafficFER";
+inline constexpr NumberFormat kFrameErrorRateFormat = "%.02f%%";
 
 /// A rate from 0 to 1, in single precision throughout.
 class FrameErrorRate {
@@ -24,6 +25,7 @@ class FrameErrorRate {
                                             bool isBadFrame);
   void keepIn(Dictionary& state) const;
 
+  [[nodiscard]] double percent() const noexcept { return double{_rate * 100.0F}; }
   /// In per cent; the old text says that the traffic is over.
   [[nodiscard]] Value text() const;
   [[nodiscard]] Value oldText() const;
@@ -38,10 +40,12 @@ inline constexpr PacketKind kOneXTrafficFramePacket = {
     .code = 0x119D, .name = "1x traffic frame", .minimumLength = 17};
 
 extern const PacketReading kTrafficFrameReading;
+extern const PacketRules kTrafficFrameRules;
 
 /// The identifier of its sub-packet, and where that says whether a frame was bad.
 inline constexpr std::uint8_t kTrafficDemodulationId = 11;
 inline constexpr Place kIsBadFrame = u8(24);  ///< 0 for a good frame
+[[nodiscard]] bool isBadFrame(const TakenPacket& packet);
 
 class TrafficFrame : public C2KParser {
  public:

@@ -38,6 +38,8 @@ static_assert(isLayout(kPilot));
 /// Whatever is weaker, or no number at all, shows as this: -50 dB.
 constexpr double kWeakestEnergy = 0.00001;
 
+constexpr NumberFormat kReferenceEnergyFormat = "(ref pilot) %+.2f dB";
+
 }  // namespace
 
 constinit const std::span<const Field> kOneXActiveSetFields = kActiveSetFields;
@@ -86,10 +88,16 @@ double OneXActiveSet::energy(std::size_t index) const noexcept {
   return energy >= kWeakestEnergy ? energy : kWeakestEnergy;
 }
 
+ComputedValue OneXActiveSet::energyOf(std::size_t index) const noexcept {
+  const bool isReference = pnOffset(index) == _referencePN;
+  return {.number = 10 * std::log10(energy(index)),
+          .format = isReference ? &kReferenceEnergyFormat : &kOneXEnergyFormat};
+}
+
 Value OneXActiveSet::energyText(std::size_t index) const {
+  const ComputedValue energy = energyOf(index);
   TextBuffer text;
-  if (pnOffset(index) == _referencePN) text.append("(ref pilot) ");
-  text.append("%+.2f dB", 10 * std::log10(energy(index)));
+  text.append(*energy.format, energy.number);
   return text.text();
 }
 

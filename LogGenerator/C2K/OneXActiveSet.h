@@ -24,6 +24,8 @@ extern const std::span<const Field> kOneXActiveSetFields;
 inline constexpr Place kOneXPilotPN = u16(12);
 inline constexpr Place kOneXPilotEnergy = u16(24);  ///< behind the record's variable part
 
+inline constexpr NumberFormat kOneXEnergyFormat = "%+.2f dB";  ///< of all but the reference pilot
+
 /// The pilots' records. Energies are not made by a rule, but by `OneXActiveSet::energyText`.
 extern const SizedRecords kOneXPilots;
 
@@ -41,7 +43,8 @@ class OneXActiveSet {
   [[nodiscard]] RecordPosition pilotEnergyAt(std::size_t index) const noexcept;
 
   [[nodiscard]] std::uint32_t pnOffset(std::size_t index) const noexcept;
-  /// The pilot's energy, marked when it is the reference pilot's.
+  /// The pilot's energy in dB, in a format of its own when it is the reference pilot's.
+  [[nodiscard]] ComputedValue energyOf(std::size_t index) const noexcept;
   [[nodiscard]] Value energyText(std::size_t index) const;
 
   /// Adds every pilot to the list.

@@ -40,8 +40,6 @@ constexpr Field kOneXFields[] = {
 };
 static_assert(isLayout(kOneXFields));
 
-constexpr std::string_view kActiveSetName = "k1xActiveSetInfo";
-
 /// What was in the traffic that ended is not in this packet. One of these fields, or none, is
 /// shown: in traffic there is no such rate.
 constexpr TextRule kFromEarlierPackets = named({}, "(from the packets before)");
@@ -61,37 +59,41 @@ constexpr Requirement kOneXStatusRequirements[] = {
      .priority = LogPriority::Warning,
      .subPackets = kOneXSubPackets}};
 
-/// Where the fields of the radio sub-packet lie, with the state sub-packet as its twin.
-RecordPosition positionIn(const TakenPacket& packet) {
-  return {.here = packet.subPackets[1], .twin = packet.subPackets[0]};
-}
-std::size_t activeSetIn(const TakenPacket& packet) { return packet.subPackets[2]; }
-
 }  // namespace
 
 constexpr PacketReading kOneXStatusReading = {.packet = kOneXStatusPacket};
 
+constexpr PacketRules kOneXStatusRules = {kOneXStatusReading, kOneXStatusRequirements};
+
 constinit const std::span<const Field> kOneXStatusFields = kOneXFields;
 
+RecordPosition oneXStatusFieldsIn(const TakenPacket& packet) {
+  return {.here = packet.subPackets[1], .twin = packet.subPackets[0]};
+}
+std::size_t oneXActiveSetIn(const TakenPacket& packet) { return packet.subPackets[2]; }
+bool isInTraffic(const TakenPacket& packet) {
+  return holds(kInTraffic, packet.bytes, oneXStatusFieldsIn(packet));
+}
+
 OneXStatus::OneXStatus()
-    : C2KParser({kOneXStatusReading, kOneXStatusRequirements}),
+    : C2KParser(kOneXStatusRules),
       _fields(kOneXFields),
-      _activeSet(kActiveSetName),
+      _activeSet(kOneXActiveSetName),
       _errorRate(kFrameErrorRateName) {}
 
 std::vector<std::string_view> OneXStatus::lookupNames() const {
   std::vector<std::string_view> names;
   for (const Field& field : kOneXFields) names.push_back(field.key);
-  names.push_back(kActiveSetName);
+  names.push_back(kOneXActiveSetName);
   names.push_back(kFrameErrorRateName);
   return names;
 }
 
 void OneXStatus::take(const TakenPacket& packet, C2KOutput& output) {
-  _fields.store(packet.bytes, positionIn(packet), output.lookup);
-  OneXActiveSet(packet.bytes, activeSetIn(packet)).addTo(_pilots);
+  _fields.store(packet.bytes, oneXStatusFieldsIn(packet), output.lookup);
+  OneXActiveSet(packet.bytes, oneXActiveSetIn(packet)).addTo(_pilots);
   _pilots.store(_activeSet, output.lookup);
-  if (!holds(kInTraffic, packet.bytes, positionIn(packet))) storeOldErrorRate(output);
+  if (!isInTraffic(packet)) storeOldErrorRate(output);
 }
 
 void OneXStatus::storeOldErrorRate(C2KOutput& output) {
@@ -104,11 +106,11 @@ void OneXStatus::storeOldErrorRate(C2KOutput& output) {
 void OneXStatus::explainTaken(const TakenPacket& packet, const ExplainVisitor& visit) const {
   const std::string_view section = reading().packet.name;
   const Explainer explainer(section, packet.bytes, visit);
-  explainer.fields(kOneXFields, positionIn(packet));
-  OneXActiveSet(packet.bytes, activeSetIn(packet)).explain(section, kActiveSetName, visit);
+  explainer.fields(kOneXFields, oneXStatusFieldsIn(packet));
+  OneXActiveSet(packet.bytes, oneXActiveSetIn(packet)).explain(section, kOneXActiveSetName, visit);
   for (const Field& rate : kOldErrorRate) {
-    if (!holds(rate.condition, packet.bytes, positionIn(packet))) continue;
-    explainer.fields({&rate, 1}, positionIn(packet));
+    if (!holds(rate.condition, packet.bytes, oneXStatusFieldsIn(packet))) continue;
+    explainer.fields({&rate, 1}, oneXStatusFieldsIn(packet));
   }
 }
 
@@ -123,7 +125,7 @@ void OneXStatus::outlineTaken(std::vector<OutlinedPart>& parts) const {
   append(kOneXFields, radioAndState);
   append(kOneXActiveSetFields, {.here = kOneXActiveSetId});
   parts.emplace_back(OutlinedSizedRecords{.section = section,
-                                          .list = kActiveSetName,
+                                          .list = kOneXActiveSetName,
                                           .records = &kOneXPilots,
                                           .subPacket = kOneXActiveSetId});
   append(kOldErrorRate, radioAndState);

@@ -59,7 +59,9 @@ constexpr Requirement kSystemParametersRequirements[] = {
 constexpr PacketReading kOneXSystemParametersReading = {.packet = kOneXSystemParametersPacket,
                                                         .fields = kSystemParametersFields};
 
-OneXSystemParameters::OneXSystemParameters()
-    : FieldParser({kOneXSystemParametersReading, kSystemParametersRequirements}) {}
+constexpr PacketRules kOneXSystemParametersRules = {kOneXSystemParametersReading,
+                                                    kSystemParametersRequirements};
+
+OneXSystemParameters::OneXSystemParameters() : FieldParser(kOneXSystemParametersRules) {}
 
 }  // namespace kestro

@@ -10,6 +10,7 @@ inline constexpr PacketKind kOneXSystemParametersPacket = {
     .code = 0x134F, .name = "1x system parameters", .minimumLength = 171};
 
 extern const PacketReading kOneXSystemParametersReading;
+extern const PacketRules kOneXSystemParametersRules;
 
 /// Shows which system and base station serve the phone, and whether it roams. Packets of an early
 /// version are rejected.

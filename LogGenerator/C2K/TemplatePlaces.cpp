@@ -5,24 +5,29 @@
 
 namespace kestro {
 
-TemplatePlaces::TemplatePlaces(const Dictionary& displayTemplate) { add(displayTemplate, {}); }
+TemplatePlaces::TemplatePlaces(const Dictionary& displayTemplate) {
+  add(displayTemplate, DisplayPlace());
+}
 
 std::span<const DisplayPlace> TemplatePlaces::of(std::string_view lookupName) const {
   const auto known = _places.find(lookupName);
   return known == _places.end() ? std::span<const DisplayPlace>() : known->second;
 }
 
-void TemplatePlaces::add(const Dictionary& section, const std::string& path) {
+void TemplatePlaces::add(const Dictionary& section, const DisplayPlace& place) {
   const bool isSorted = !section[kSortedMarker].isNull();
   for (const auto& [key, value] : section) {
     if (!key.isText()) continue;
     const std::string name(isSorted ? nameInSortedDictionary(key.text()) : key.text());
+    DisplayPlace inner = place;
+    inner.path.emplace_back(key.text());
     if (value.isDictionary()) {
-      std::string inner = path;
-      if (!inner.empty()) inner += '/';
-      add(value.dictionary(), inner.append(name));
+      if (!inner.section.empty()) inner.section += '/';
+      inner.section.append(name);
+      add(value.dictionary(), inner);
     } else if (value.isText() && value.text() != kSortedMarker) {
-      _places[std::string(value.text())].push_back({path, name});
+      inner.key = name;
+      _places[std::string(value.text())].push_back(std::move(inner));
     }
   }
 }

@@ -16,6 +16,8 @@ namespace kestro {
 struct DisplayPlace {
   std::string section;
   std::string key;
+  /// The keys on the way and of the entry as the template has them: "01;1x".
+  std::vector<std::string> path{};
 };
 
 /// Lookup names to the places where a template shows them.
@@ -28,7 +30,7 @@ class TemplatePlaces {
   [[nodiscard]] std::span<const DisplayPlace> of(std::string_view lookupName) const;
 
  private:
-  void add(const Dictionary& section, const std::string& path);
+  void add(const Dictionary& section, const DisplayPlace& place);
 
   std::map<std::string, std::vector<DisplayPlace>, std::less<>> _places;
 };

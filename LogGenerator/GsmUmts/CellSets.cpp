@@ -49,6 +49,7 @@ constexpr Field kSetCell[] = {
      decimal("%d dB").of(energyPerChip, "energyPerChip")},
 };
 static_assert(isLayout(kSetCell));
+constexpr auto kSetCellIdentity = fieldsNamed(kSetCell, "Scrambling Code");
 
 /// The energy records, 44 bytes each, stand behind all cell records.
 constexpr RecordTable kActiveCells = {
@@ -61,6 +62,7 @@ constexpr RecordTable kActiveCells = {
     .twinBase = 16,
     .twinPerCount = 15,
     .twinStride = 44,
+    .identity = kSetCellIdentity,
 };
 
 constexpr RecordTable withoutRows(RecordTable table) {
@@ -89,6 +91,8 @@ constexpr Field kRankedUMTSCell[] = {
     {"Ranking Value", s16(8), decimal()},
 };
 static_assert(isLayout(kRankedUMTSCell));
+constexpr auto kRankedUMTSIdentity =
+    fieldsNamed(kRankedUMTSCell, "Downlink Frequency", "Scrambling Code");
 
 constexpr ListReading kRankedUMTSCells[] = {{.table = {
                                                  .name = "UMTS cell",
@@ -96,6 +100,7 @@ constexpr ListReading kRankedUMTSCells[] = {{.table = {
                                                  .base = IdleModeRanking::kFirstCell,
                                                  .stride = 10,
                                                  .fields = kRankedUMTSCell,
+                                                 .identity = kRankedUMTSIdentity,
                                              }}};
 
 constexpr PacketReading kUMTSSetReadings[] = {
@@ -125,6 +130,8 @@ constexpr ListedValue kUMTSNeighbourValues[] = {
      .failureLine = "UMTSSet: Failed to retrieve Energy Per Chip\n"},
 };
 
+constexpr std::string_view kUMTSNeighbourIdentity[] = {"UARFCN", "Scrambling Code"};
+
 constexpr PropertyListReading kNeighbours = {
     .packet = kCellMonitorPacket,
     .part = ListedPart::EachCell,
@@ -132,6 +139,7 @@ constexpr PropertyListReading kNeighbours = {
               .type = kTqCellMonitorCellTypeNeighbor},
     .values = kUMTSNeighbourValues,
     .missingListLine = kMissingCellArrayLine,
+    .identity = kUMTSNeighbourIdentity,
 };
 
 }  // namespace

@@ -33,16 +33,17 @@ constexpr Field kNeighbourCount[] = {
 };
 static_assert(isLayout(kNeighbourCount));
 
+constexpr std::string_view kARFCN = "ARFCN";
 constexpr std::string_view kBSIC = "BSIC";
 
-constexpr Place kNeighbourARFCN = u16(0);
 constexpr Field kNeighbour[] = {
-    {"ARFCN", kNeighbourARFCN, decimal()},
+    {kARFCN, GSMMeasurements::kNeighbourARFCN, decimal()},
     {"RSSI", u8(2), decimal()},
     {"C1 Value", u32(3), decimal()},
     {kBSIC, supplied()},
 };
 static_assert(isLayout(kNeighbour));
+constexpr auto kNeighbourIdentity = fieldsNamed(kNeighbour, kARFCN, kBSIC);
 
 constexpr ListReading kMeasuredNeighbours[] = {{.table = {
                                                     .name = "neighbour",
@@ -50,6 +51,7 @@ constexpr ListReading kMeasuredNeighbours[] = {{.table = {
                                                     .base = GSMMeasurements::kFirstNeighbour,
                                                     .stride = 14,
                                                     .fields = kNeighbour,
+                                                    .identity = kNeighbourIdentity,
                                                 }}};
 
 // --- 0x51FF: neighbour BSIC list, at least 15 bytes ----------------------------------------------
@@ -57,10 +59,9 @@ constexpr ListReading kMeasuredNeighbours[] = {{.table = {
 constexpr Field kBSICCount[] = {{"Entries", u8(14), hidden()}};
 static_assert(isLayout(kBSICCount));
 
-constexpr Place kBSICEntryARFCN = u16(0);
 constexpr Field kBSICEntry[] = {
-    {"ARFCN", kBSICEntryARFCN, decimal()},
-    {kBSIC, u8(2), decimal()},
+    {kARFCN, GSMBSICList::kARFCN, decimal()},
+    {kBSIC, GSMBSICList::kBSIC, decimal()},
 };
 static_assert(isLayout(kBSICEntry));
 
@@ -79,12 +80,13 @@ static_assert(isLayout(kDedicatedChannel));
 // --- 0x4005: idle-mode cell ranking, at least 15 bytes -------------------------------------------
 
 constexpr Field kRankedGSMCell[] = {
-    {"ARFCN", u16(0), decimal()},
-    {"BSIC", u16(2), decimal()},
+    {kARFCN, u16(0), decimal()},
+    {kBSIC, u16(2), decimal()},
     {"RSSI", s8(4), decimal("%d dBm")},
     {"Ranking Value", s16(5), decimal()},
 };
 static_assert(isLayout(kRankedGSMCell));
+constexpr auto kRankedGSMIdentity = fieldsNamed(kRankedGSMCell, kARFCN, kBSIC);
 
 constexpr ListReading kRankedGSMCells[] = {{.table = {
                                                 .name = "GSM cell",
@@ -92,6 +94,7 @@ constexpr ListReading kRankedGSMCells[] = {{.table = {
                                                 .base = IdleModeRanking::kFirstCell,
                                                 .stride = 7,
                                                 .fields = kRankedGSMCell,
+                                                .identity = kRankedGSMIdentity,
                                             }}};
 
 // --- 0x51F8: mobile allocation, at least 15 bytes ------------------------------------------------
@@ -145,6 +148,8 @@ constexpr ListedValue kGSMNeighbourValues[] = {
      .failureLine = "NeighboringCells: Failed to retrieve RSSI\n"},
 };
 
+constexpr std::string_view kListedNeighbourIdentity[] = {kARFCN};
+
 constexpr PropertyListReading kListedNeighbours = {
     .packet = kCellMonitorPacket,
     .part = ListedPart::EachCell,
@@ -152,6 +157,7 @@ constexpr PropertyListReading kListedNeighbours = {
               .type = kTqCellMonitorCellTypeNeighbor},
     .values = kGSMNeighbourValues,
     .missingListLine = kMissingCellArrayLine,
+    .identity = kListedNeighbourIdentity,
 };
 
 // --- What the sections take ----------------------------------------------------------------------
@@ -217,13 +223,14 @@ void NeighboringCells::willPublish(const ListReading& list, PacketView packet,
   _arfcnToBsic.clear();
   for (std::size_t i = 0; i < rows.size(); ++i) {
     const RecordPosition entry = recordAt(list.table, packet, i);
-    _arfcnToBsic.push_back({readBits(kBSICEntryARFCN, packet, entry), rows[i].dictionary()[kBSIC]});
+    _arfcnToBsic.push_back(
+        {readBits(GSMBSICList::kARFCN, packet, entry), rows[i].dictionary()[kBSIC]});
   }
 }
 
 Value NeighboringCells::supply(const Field& /*field*/, PacketView packet,
                                const RecordPosition& position) const {
-  const std::uint32_t arfcn = readBits(kNeighbourARFCN, packet, position);
+  const std::uint32_t arfcn = readBits(GSMMeasurements::kNeighbourARFCN, packet, position);
   // Of several entries for one frequency the last counts.
   const auto known = std::find_if(_arfcnToBsic.rbegin(), _arfcnToBsic.rend(),
                                   [arfcn](const NotedCell& cell) { return cell.arfcn == arfcn; });

@@ -30,6 +30,13 @@ struct GSMMeasurements {
   static constexpr Place kServingQualitySub = u32(20);
   static constexpr Place kNeighbourCount = u8(28);
   static constexpr unsigned kFirstNeighbour = 29;
+  static constexpr Place kNeighbourARFCN = u16(0);  ///< in each neighbour's record
+};
+
+/// The list of the cells' identities by their channels: in each entry.
+struct GSMBSICList {
+  static constexpr Place kARFCN = u16(0);
+  static constexpr Place kBSIC = u8(2);
 };
 
 extern const Section kGSMServingCellSection;

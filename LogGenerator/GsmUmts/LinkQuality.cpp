@@ -19,13 +19,15 @@ constexpr Field kChannel[] = {
     {"CRC Received in Error", u32(5), decimal()},
 };
 static_assert(isLayout(kChannel));
+constexpr auto kChannelIdentity = fieldsNamed(kChannel, "Transport Channel ID");
 
 constexpr ListReading kChannels[] = {{
     .table = {.name = "transport channel",
               .count = kChannelCount,
               .base = 16,
               .stride = 9,
-              .fields = kChannel},
+              .fields = kChannel,
+              .identity = kChannelIdentity},
     .key = "Transport Channels",
 }};
 
@@ -60,6 +62,7 @@ constexpr Field kHARQProcess[] = {
     {"Block Errors", u16(7), decimal("%u")},
 };
 static_assert(isLayout(kHARQProcess));
+constexpr auto kHARQIdentity = fieldsNamed(kHARQProcess, "Process ID");
 
 // The packet reserves room for 18 records per primary process before the secondary ones.
 constexpr ListReading kHARQProcesses[] = {
@@ -68,7 +71,8 @@ constexpr ListReading kHARQProcesses[] = {
                   .count = kPrimaryCount,
                   .base = 18,
                   .stride = 9,
-                  .fields = kHARQProcess},
+                  .fields = kHARQProcess,
+                  .identity = kHARQIdentity},
         .key = "Primary HARQ Process",
         .keepsOldWhenEmpty = true,
     },
@@ -79,7 +83,8 @@ constexpr ListReading kHARQProcesses[] = {
                   .perCount = 18 * 9,
                   .counted = kPrimaryCount,
                   .stride = 9,
-                  .fields = kHARQProcess},
+                  .fields = kHARQProcess,
+                  .identity = kHARQIdentity},
         .key = "Secondary HARQ Process",
         .keepsOldWhenEmpty = true,
     },

@@ -177,6 +177,7 @@ constexpr ListReading kEquivalentPLMNs[] = {{.table = {
                                                  .base = 17,
                                                  .stride = 3,
                                                  .fields = kEquivalentPLMN,
+                                                 .identity = kEquivalentPLMN,
                                              }}};
 
 // --- The cell monitor's serving cell -------------------------------------------------------------

@@ -3,6 +3,7 @@
 #pragma once
 
 #include <memory>
+#include <span>
 
 #include "LogGenerator/GsmUmts/CellSets.h"
 #include "LogGenerator/GsmUmts/Cells.h"
@@ -11,9 +12,13 @@
 #include "LogGenerator/GsmUmts/RadioResource.h"
 #include "LogGenerator/GsmUmts/UnfilledSections.h"
 #include "LogGenerator/Ondrel/ClassIndex.h"
+#include "LogGenerator/Ondrel/SectionMeasurer.h"
 #include "LogGenerator/Ondrel/SharedDecoders.h"
 
 namespace kestro {
+
+/// The sections of these decoders, in the same order: what is measured.
+[[nodiscard]] std::span<const MeasuredSection> gsmUmtsSections();
 
 /// Owns one decoder for each section, made in the order of the fields.
 class Ondrel_GSMClassIndex : public ClassIndex {

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "LogGenerator/GsmUmts/Ondrel_GSMLogGenerator.h"
 
+#include <string>
+
 #include "LogGenerator/GeneratorServices.h"
 #include "LogGenerator/GsmUmts/Ondrel_GSMClassIndex.h"
 #include "Platform/SystemLog.h"
@@ -15,7 +17,8 @@ std::unique_ptr<Ondrel_GSMLogGenerator> Ondrel_GSMLogGenerator::generator(
 Ondrel_GSMLogGenerator::Ondrel_GSMLogGenerator(const GeneratorServices& services)
     : OndrelLogGenerator2(services) {
   services.systemLog.write(LogPriority::Error, "Creating Ondrel_GSMLogGenerator object");
-  initWithPListNameCIndexObj("Ondrel_GSM", std::make_unique<Ondrel_GSMClassIndex>(services));
+  initWithPListNameCIndexObj(std::string(kGsmUmtsTemplate),
+                             std::make_unique<Ondrel_GSMClassIndex>(services));
 }
 
 Ondrel_GSMLogGenerator::~Ondrel_GSMLogGenerator() {

@@ -3,10 +3,14 @@
 #pragma once
 
 #include <memory>
+#include <string_view>
 
 #include "LogGenerator/Ondrel/OndrelLogGenerator2.h"
 
 namespace kestro {
+
+/// The resource that is its template.
+inline constexpr std::string_view kGsmUmtsTemplate = "Ondrel_GSM";
 
 /// The template-driven generator with the GSM/UMTS decoders and the template "Ondrel_GSM".
 class Ondrel_GSMLogGenerator : public OndrelLogGenerator2 {

@@ -28,19 +28,22 @@ struct DisplayPath {
   std::string key{};
   /// Which element of an array under that key; -1: the value is no array.
   int element = -1;
+  /// Whether the container is no list but a dictionary of rows, each an entry whose key begins with
+  /// the record's number: "3;168".
+  bool rowsAreEntries = false;
 };
 
 /// What the series of one value have in common, whatever row of a list they belong to.
 struct SeriesGroup {
-  std::string technology;  ///< as the log channel names it
-  std::string section;     ///< as the display shows it; with its list: "BLER/Transport Channels"
+  std::string technology{};  ///< as the log channel names it
+  std::string section{};     ///< as the display shows it; with its list: "BLER/Transport Channels"
   std::string key;
   std::string unit{};  ///< "dBm", "%"; empty: none
   SeriesKind kind = SeriesKind::Number;
   DisplayPath path{};
 
   /// "Serving Cell Measurements/Measured RSRP"
-  [[nodiscard]] std::string name() const { return section + "/" + key; }
+  [[nodiscard]] std::string name() const { return section.empty() ? key : section + "/" + key; }
 };
 
 /// One of the values that tell a list's row from the others.

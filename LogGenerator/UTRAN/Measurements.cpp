@@ -19,13 +19,15 @@ constexpr Field kNeighbor[] = {
     {"inJDCS", u8(3).bit(7), named(kJDCSNames, "TRUE")},
 };
 static_assert(isLayout(kNeighbor));
+constexpr auto kUTRANNeighborIdentity = fieldsNamed(kNeighbor, "UARFCN", "Cell ID");
 
 constexpr ListReading kNeighbors[] = {{.table = {.name = "UTRAN neighbour",
                                                  .count = u8(16).bits(1, 7),
                                                  .isBounded = false,
                                                  .base = 168,
                                                  .stride = 16,
-                                                 .fields = kNeighbor}}};
+                                                 .fields = kNeighbor,
+                                                 .identity = kUTRANNeighborIdentity}}};
 
 // --- 0xD00E: GSM neighbours: a count, then records of 8 bytes ------------------------------------
 
@@ -56,6 +58,7 @@ constexpr Field kTRCH[] = {
     {"TRCH BLER Measurement", u8(1), decimal()},
 };
 static_assert(isLayout(kTRCH));
+constexpr auto kTRCHIdentity = fieldsNamed(kTRCH, "TRCH ID");
 
 constexpr Field kCCTRCH[] = {
     {"CCTRCH ID", u8(0), decimal()},
@@ -63,12 +66,14 @@ constexpr Field kCCTRCH[] = {
     {"SIR", {u8(2), u8(3), u8(4), u8(5), u8(6), u8(7)}, eachDecimal()},
 };
 static_assert(isLayout(kCCTRCH));
+constexpr auto kCCTRCHIdentity = fieldsNamed(kCCTRCH, "CCTRCH ID", "TSNUM");
 
 constexpr ListReading kTRCHs[] = {{.table = {.name = "transport channel",
                                              .count = kTRCHCount,
                                              .base = 17,
                                              .stride = 2,
-                                             .fields = kTRCH}}};
+                                             .fields = kTRCH,
+                                             .identity = kTRCHIdentity}}};
 
 // The packet counts 34 bytes for each transport channel here, though its record above has two.
 constexpr ListReading kCCTRCHs[] = {{.table = {.name = "coded composite transport channel",
@@ -77,7 +82,8 @@ constexpr ListReading kCCTRCHs[] = {{.table = {.name = "coded composite transpor
                                                .perCount = 34,
                                                .counted = kTRCHCount,
                                                .stride = 8,
-                                               .fields = kCCTRCH}}};
+                                               .fields = kCCTRCH,
+                                               .identity = kCCTRCHIdentity}}};
 
 constexpr PacketReading kNeighborsReadings[] = {
     {.packet = kUTRANNeighborsPacket, .lists = kNeighbors}};

@@ -3,14 +3,19 @@
 #pragma once
 
 #include <memory>
+#include <span>
 
 #include "LogGenerator/Ondrel/ClassIndex.h"
+#include "LogGenerator/Ondrel/SectionMeasurer.h"
 #include "LogGenerator/Ondrel/SharedDecoders.h"
 #include "LogGenerator/UTRAN/Measurements.h"
 #include "LogGenerator/UTRAN/RRCState.h"
 #include "LogGenerator/UTRAN/ServingCellInfo.h"
 
 namespace kestro {
+
+/// The sections of these decoders, in the same order: what is measured.
+[[nodiscard]] std::span<const MeasuredSection> utranSections();
 
 /// Owns one decoder for each section, made in the order of the fields.
 class UTRANClassIndex : public ClassIndex {

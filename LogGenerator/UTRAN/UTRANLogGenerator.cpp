@@ -30,14 +30,14 @@ std::string resourceName(std::string_view path) {
   return std::string(name.substr(0, name.rfind('.')));
 }
 
-std::optional<std::string> templateName(const Bundle& bundle) {
+}  // namespace
+
+std::optional<std::string> utranTemplateName(const Bundle& bundle) {
   const std::vector<std::string> paths = bundle.resourcesOfType(kTemplateExtension);
   const auto path = std::ranges::find_if(paths, namesTechnology);
   if (path == paths.end()) return std::nullopt;
   return resourceName(*path);
 }
-
-}  // namespace
 
 std::unique_ptr<UTRANLogGenerator> UTRANLogGenerator::generator(const GeneratorServices& services) {
   return std::make_unique<UTRANLogGenerator>(services);
@@ -45,7 +45,7 @@ std::unique_ptr<UTRANLogGenerator> UTRANLogGenerator::generator(const GeneratorS
 
 UTRANLogGenerator::UTRANLogGenerator(const GeneratorServices& services)
     : OndrelLogGenerator2(services) {
-  auto name = templateName(services.bundle);
+  auto name = utranTemplateName(services.bundle);
   if (!name) return;
   initWithPListNameCIndexObj(std::move(*name), std::make_unique<UTRANClassIndex>(services));
   services.systemLog.write(LogPriority::Error, "Created UTRANLogGenerator object");

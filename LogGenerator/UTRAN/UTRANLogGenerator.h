@@ -3,10 +3,16 @@
 #pragma once
 
 #include <memory>
+#include <optional>
+#include <string>
 
 #include "LogGenerator/Ondrel/OndrelLogGenerator2.h"
 
 namespace kestro {
+
+/// The resource that is its template: the first property list of the bundle whose path contains
+/// "UTRAN", in whatever case; nothing when there is none.
+[[nodiscard]] std::optional<std::string> utranTemplateName(const Bundle& bundle);
 
 /// The template-driven generator with the UTRAN decoders. Its template is the first property-list
 /// resource whose path contains "UTRAN", in whatever case. Without one it has no decoders: it asks
