@@ -59,11 +59,21 @@ function(kestro_library name)
   else()
     add_library(${name} STATIC ${sources})
     target_link_libraries(${name} PUBLIC KestroCompiler ${ARG_LINK} PRIVATE ${ARG_PRIVATE_LINK})
-    set_target_properties(${name} PROPERTIES UNITY_BUILD ${KESTRO_UNITY})
+    kestro_compile_together(${name} ${KESTRO_UNITY})
     kestro_precompile(${name} KestroPrecompiled ${ARG_PRECOMPILED})
   endif()
   if(KESTRO_BUILD_TESTS)
     kestro_check_headers(${name} ${headers})
+  endif()
+endfunction()
+
+# kestro_compile_together(TARGET WHETHER): several sources at one time. The compiler takes all of
+# them for headers then, and would not let their classes use what is in an unnamed namespace.
+function(kestro_compile_together target whether)
+  if(whether)
+    set_target_properties(${target} PROPERTIES UNITY_BUILD ON)
+    target_compile_options(${target} PRIVATE
+      $<$<CXX_COMPILER_ID:GNU>:-Wno-subobject-linkage>)
   endif()
 endfunction()
 
@@ -100,7 +110,7 @@ function(kestro_tests name)
   endif()
   add_executable(${name} ${sources})
   target_link_libraries(${name} PRIVATE KestroCompiler ${ARG_LINK} GTest::gmock)
-  set_target_properties(${name} PROPERTIES UNITY_BUILD ${KESTRO_UNITY_TESTS})
+  kestro_compile_together(${name} ${KESTRO_UNITY_TESTS})
   # What is tested is optimised; the tests themselves would only take twice as long to compile.
   target_compile_options(${name} PRIVATE ${unoptimised})
   kestro_precompile(${name} KestroPrecompiledTests ${ARG_PRECOMPILED})
