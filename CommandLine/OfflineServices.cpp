@@ -10,6 +10,7 @@
 #include "Platform/Bundle.h"
 #include "Platform/Linux/LinuxPlatform.h"
 #include "Platform/TextSink.h"
+#include "Sources/CodeTechnologies.h"
 
 namespace kestro {
 namespace {
@@ -91,6 +92,12 @@ GeneratorServices OfflineServices::forGenerator() noexcept {
           .clock = _services->clock,
           .bundle = *_services->bundle,
           .propertyListCoding = *_services->coding};
+}
+
+SourceServices OfflineServices::forSources() {
+  return {.propertyListCoding = *_services->coding,
+          .clock = *_services->systemClock,
+          .technologiesOfCode = technologiesByCode(forGenerator())};
 }
 
 Result<void> OfflineServices::finishLog() { return _services->log.finish(); }

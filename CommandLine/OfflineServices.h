@@ -10,6 +10,7 @@
 #include "Model/Replay.h"
 #include "Platform/PropertyListCoding.h"
 #include "Platform/SystemLog.h"
+#include "Sources/SourceCatalogue.h"
 
 namespace kestro {
 
@@ -32,6 +33,10 @@ class OfflineServices {
 
   /// All that a generator needs; valid as long as this object.
   [[nodiscard]] GeneratorServices forGenerator() noexcept;
+
+  /// What inputs are read with; valid as long as this object. What has no time of its own has that
+  /// of the system's clock.
+  [[nodiscard]] SourceServices forSources();
 
   /// Hands all log lines to the system; the error says why they could not be written.
   [[nodiscard]] Result<void> finishLog();

@@ -13,6 +13,7 @@ class Recording {
   Recording(std::string_view technology, std::chrono::microseconds interval)
       : _channel(technology), _technology(technology), _options{.refreshInterval = interval} {
     _channel.addTemplates();
+    require(_replay.begin(technology), "every technology has a generator");
   }
 
   /// Feeds the input's messages, each up to 13 s after or before the one before.
@@ -22,7 +23,8 @@ class Recording {
       _time += std::chrono::milliseconds(100) * step;
       const ByteView message = input.bytes(input.number16() % 2048);
       // A message that would end the application is an error; the next can be fed all the same.
-      static_cast<void>(_replay.feed({.number = ++_number, .time = _time, .bytes = message}));
+      static_cast<void>(_replay.feed(
+          {.number = ++_number, .time = _time, .technology = _technology, .bytes = message}));
       static_cast<void>(_channel.platform().systemLog().take());
     }
     _replay.finish();
@@ -30,7 +32,7 @@ class Recording {
 
   /// Saves the last displays; their log is that of the history.
   void save() {
-    const Array contents = _generator->getSaveContentsFromState(_replay.state());
+    const Array contents = _replay.generator()->getSaveContentsFromState(_replay.state());
     const Dictionary snapshot = checkSaving(_clock, contents, "drive");
     const Value log = dlfOfSnapshot(snapshot);
     if (log.isNull()) return;
@@ -49,10 +51,12 @@ class Recording {
   std::string_view _technology;
   ReplayOptions _options;
   ReplayClock _clock{_channel.platform().clock()};
-  std::unique_ptr<LogGenerator> _generator =
-      LogGenerator::generatorFromTechnology(generatorServices(_channel.platform()), _technology);
-  Replay _replay{*_generator, _clock, _options,
-                 [this](const ReplayRefresh& refresh) { didRefresh(refresh); }};
+  Replay _replay{
+      [this](std::string_view technology) {
+        return LogGenerator::generatorFromTechnology(generatorServices(_channel.platform()),
+                                                     technology);
+      },
+      _clock, _options, [this](const ReplayRefresh& refresh) { didRefresh(refresh); }};
   Moment _time{std::chrono::seconds(1'330'862'709)};
   std::uint64_t _number = 0;
   std::uint64_t _refreshed = 0;

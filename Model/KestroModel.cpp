@@ -53,14 +53,8 @@ void KestroModel::technologyAnswered(std::string_view technology) {
 void KestroModel::setGenerator(std::string_view technology) {
   _logGenerator = _generatorFromTechnology(generatorServices(_platform), technology);
   if (!_logGenerator) return;
-  if (technology != _technology) {
-    // A display of another technology would be neither shown right nor ever updated again.
-    for (const std::string_view key : _stateKeysOfTechnology) _state.remove(key);
-    _updated = false;  // what no tick has seen yet is gone with it
-  }
-  _technology = technology;
-  const auto keys = _logGenerator->stateKeys();
-  _stateKeysOfTechnology.assign(keys.begin(), keys.end());
+  // What no tick has seen yet is gone with the display of another technology.
+  if (_stateOwner.handTo(*_logGenerator, technology, _state)) _updated = false;
 }
 
 std::optional<Dictionary> KestroModel::startCommand() {

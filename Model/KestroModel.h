@@ -7,13 +7,12 @@
 #include <functional>
 #include <memory>
 #include <optional>
-#include <string>
 #include <string_view>
-#include <vector>
 
 #include "LogGenerator/LogGenerator.h"
 #include "Model/KestroModelNode.h"
 #include "Model/LogChannelClient.h"
+#include "Model/StateOwner.h"
 #include "Platform/MainQueue.h"
 #include "Platform/Platform.h"
 
@@ -104,8 +103,7 @@ class KestroModel : public std::enable_shared_from_this<KestroModel>, private Lo
   NodePointer _nodes;
   std::unique_ptr<NodesByPath> _nodesByPath;
   std::unique_ptr<LogGenerator> _logGenerator;
-  std::string _technology;  ///< the last one that had a generator
-  std::vector<std::string_view> _stateKeysOfTechnology;
+  StateOwner _stateOwner;
   bool _updated = false;
 };
 

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "Model/Replay.h"
 
+#include <fmt/format.h>
+
 #include <exception>
 #include <utility>
 
@@ -8,15 +10,27 @@
 
 namespace kestro {
 
-Replay::Replay(LogGenerator& generator, ReplayClock& clock, const ReplayOptions& options,
+Replay::Replay(GeneratorFactory makeGenerator, ReplayClock& clock, const ReplayOptions& options,
                RefreshHandler refreshed)
-    : _generator(generator), _clock(clock), _options(options), _refreshed(std::move(refreshed)) {}
+    : _makeGenerator(std::move(makeGenerator)),
+      _clock(clock),
+      _options(options),
+      _refreshed(std::move(refreshed)) {}
+
+bool Replay::begin(std::string_view technology) { return follow(technology); }
 
 Result<void> Replay::feed(const ReplayMessage& message) {
+  if (message.technology != _stateOwner.technology()) {
+    if (_nextTick) passTimeTo(message.time);
+    _clock.setNow(message.time);
+    if (!follow(message.technology)) {
+      return failure(fmt::format("nothing here decodes the technology {}", message.technology));
+    }
+  }
   passTimeTo(message.time);
   _clock.setNow(message.time);
   try {
-    _generator.updateStateWithData(_state, message.bytes);
+    _generator->updateStateWithData(_state, message.bytes);
   } catch (...) {
     return failure(failureText(std::current_exception()));
   }
@@ -27,6 +41,16 @@ Result<void> Replay::feed(const ReplayMessage& message) {
     refreshAt(message.time);
   }
   return {};
+}
+
+bool Replay::follow(std::string_view technology) {
+  auto generator = _makeGenerator(technology);
+  if (!generator) return false;
+  _generator = std::move(generator);
+  if (_stateOwner.handTo(*_generator, technology, _state)) _updated = false;
+  _nextTick.reset();
+  _bytesSinceRefresh = 0;
+  return true;
 }
 
 void Replay::finish() {
@@ -45,10 +69,13 @@ void Replay::passTimeTo(Moment time) {
 
 void Replay::refreshAt(Moment time) {
   _clock.setNow(time);
-  _display = _generator.generateLogUsingState(_state);
+  _display = _generator->generateLogUsingState(_state);
   _updated = false;
   _bytesSinceRefresh = 0;
-  _refreshed({.time = time, .message = _lastMessage, .display = _display});
+  _refreshed({.time = time,
+              .message = _lastMessage,
+              .technology = _stateOwner.technology(),
+              .display = _display});
 }
 
 }  // namespace kestro

@@ -14,6 +14,7 @@
 #include "Platform/TelephonyService.h"
 #include "Sources/AutoDriveTest.h"
 #include "Sources/C2K/C2KSimulation.h"
+#include "Sources/CodeTechnologies.h"
 #include "Sources/DriveTestSource.h"
 #include "Sources/GsmUmts/GsmUmtsSimulation.h"
 #include "Sources/IFX/IFXDriveTest.h"
@@ -231,7 +232,7 @@ constexpr std::array kKinds = {
 SourceServices sourceServices(Platform& platform) {
   return {.propertyListCoding = platform.propertyListCoding(),
           .clock = platform.clock(),
-          .technologiesOfCode = {},
+          .technologiesOfCode = technologiesByCode(generatorServices(platform)),
           .inputStreams = &platform.inputStreams()};
 }
 

@@ -9,6 +9,7 @@
 #include <system_error>
 #include <utility>
 
+#include "CommandLine/Output.h"
 #include "Options/ProgramOptions.h"
 
 namespace kestro {
@@ -46,17 +47,17 @@ std::optional<MessageNumbers> messagesIn(std::string_view text) {
 
 }  // namespace
 
+ExitStatus nothingDone(std::string_view why) {
+  complain(why);
+  return kExitNothingDone;
+}
+
 OptionRow secondsOption(std::string name, std::string help, double& seconds) {
   return {.name = std::move(name),
           .value = "SECONDS",
           .help = std::move(help),
           .target = &seconds,
           .range = NumberRange{0, kMaximumSeconds}};
-}
-
-OptionRow captureArgument(std::string& path) {
-  return {
-      .name = "CAPTURE", .help = "The capture, a pcap file", .target = &path, .isRequired = true};
 }
 
 OptionRow messageOption(std::optional<MessageNumbers>& numbers) {

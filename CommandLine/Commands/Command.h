@@ -7,8 +7,10 @@
 #include <limits>
 #include <optional>
 #include <string>
+#include <string_view>
 #include <vector>
 
+#include "CommandLine/ExitStatus.h"
 #include "LogGenerator/Packets/PacketKind.h"
 #include "Options/CommandRow.h"
 #include "Platform/SystemLog.h"
@@ -17,13 +19,15 @@ namespace kestro {
 
 /// How `decode` and `explain` tell of a recording's messages.
 inline constexpr const char* kTimesAndNumbers =
-    "Times are the capture's, in UTC. Messages are numbered from 1, counting every record.";
+    "Times are the recording's, in UTC. Messages are numbered from 1, counting every record of "
+    "all\n"
+    "inputs, before anything is narrowed.";
+
+/// Says on standard error why nothing was done; that exit status.
+[[nodiscard]] ExitStatus nothingDone(std::string_view why);
 
 /// An option that takes seconds, with fractions, from 0 to a year; `seconds` holds the default.
 [[nodiscard]] OptionRow secondsOption(std::string name, std::string help, double& seconds);
-
-/// A recorded capture, which must be given.
-[[nodiscard]] OptionRow captureArgument(std::string& path);
 
 /// Numbers of messages, both ends included.
 struct MessageNumbers {

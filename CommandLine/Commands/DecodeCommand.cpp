@@ -9,36 +9,40 @@
 #include <vector>
 
 #include "CommandLine/Commands/Command.h"
-#include "CommandLine/Commands/RecordingFeed.h"
+#include "CommandLine/Commands/ReplayedInputs.h"
 #include "CommandLine/ExitStatus.h"
 #include "CommandLine/Formats/DecodeWriter.h"
+#include "CommandLine/InputFeed.h"
 #include "CommandLine/OfflineServices.h"
 #include "CommandLine/Output.h"
-#include "Model/Replay.h"
 #include "Recordings/OutputPath.h"
-#include "Recordings/PcapReader.h"
 
 namespace kestro {
 namespace {
 
-constexpr const char* kDecodeExamples = R"(  kestro-cli decode drive.pcap
-  kestro-cli decode drive.pcap --format=json | jq '.display'
-  kestro-cli decode drive.pcap --format=csv --refresh-every=0 > every-message.csv)";
+constexpr const char* kDecodeExamples = R"(  kestro-cli decode drive.pcapng
+  kestro-cli decode drive.pcapng --format=json | jq '.display'
+  kestro-cli decode monday.pcapng tuesday.csv --from=2019-11-25 --to=2019-11-26
+  kestro-cli decode drive.pcapng --format=csv --refresh-every=0 > every-message.csv)";
 
 struct DecodeOptions {
-  std::string capture;
+  InputOptions inputs;
   std::string format;
   double refreshSeconds = 2;
   std::string logFile;
   std::optional<LogPriority> shownLog;
+
+  [[nodiscard]] const DecodeFormat& chosenFormat() const {
+    return *std::ranges::find(decodeFormats(), format, &DecodeFormat::name);
+  }
 };
 
 /// One run of the command.
 class Decoder {
  public:
-  Decoder(const DecodeOptions& options, PcapReader reader, std::optional<Output> logFile)
+  Decoder(const DecodeOptions& options, InputFeed feed, std::optional<Output> logFile)
       : _options(options),
-        _feed(options.capture, std::move(reader)),
+        _feed(std::move(feed)),
         _services(std::move(logFile), options.shownLog) {}
 
   int run() {
@@ -47,71 +51,54 @@ class Decoder {
   }
 
  private:
-  /// Writes the capture's displays; false when nothing could be done.
+  /// Writes the displays; false when nothing could be done.
   [[nodiscard]] bool decode() {
-    const auto generator = _feed.makeGenerator(_services.forGenerator());
-    if (!generator) return false;
-    const std::unique_ptr<DecodeWriter> writer = makeWriter();
-    Replay replay(*generator, _services.clock(),
-                  {.refreshInterval = durationOfSeconds(_options.refreshSeconds)},
-                  [&](const ReplayRefresh& refresh) { writer->refreshed(refresh); });
+    const auto& format = _options.chosenFormat();
+    const auto writer =
+        format.makeWriter(_output, format.isStreamed && haveSeveralTechnologies(_options.inputs));
+    ReplayedInputs replayed(_feed, _services,
+                            {.refreshInterval = durationOfSeconds(_options.refreshSeconds)},
+                            [&](const ReplayRefresh& refresh) { writer->refreshed(refresh); });
     writer->begin();
-    while (_output.failureMessage().empty() && _feed.feedNext(replay)) {
+    while (_output.failureMessage().empty() && replayed.feedNext()) {
     }
     if (_feed.status() == kExitNothingDone) return false;
+    Replay& replay = replayed.replay();
     replay.finish();
-    writer->finish({.technology = _feed.technology(),
-                    .messages = _feed.messageCount(),
+    writer->finish({.technology = replay.technology(),
+                    .messages = _feed.wantedCount(),
                     .display = replay.display()});
     return true;
-  }
-
-  [[nodiscard]] std::unique_ptr<DecodeWriter> makeWriter() {
-    const auto& formats = decodeFormats();
-    return std::ranges::find(formats, _options.format, &DecodeFormat::name)->makeWriter(_output);
   }
 
   /// Hands the outputs to the system; the exit status.
   [[nodiscard]] int finish() {
     _output.flush();
-    if (!_output.failureMessage().empty()) {
-      complain(_output.failureMessage());
-      return kExitNothingDone;
-    }
+    if (!_output.failureMessage().empty()) return nothingDone(_output.failureMessage());
     if (const auto logged = _services.finishLog(); !logged) {
-      complain(logged.error().message);
-      return kExitNothingDone;
+      return nothingDone(logged.error().message);
     }
     return _feed.status();
   }
 
   const DecodeOptions& _options;
-  RecordingFeed _feed;
+  InputFeed _feed;
   OfflineServices _services;
   Output _output = Output::standardOutput();
 };
 
 int runDecode(const DecodeOptions& options) {
-  auto reader = PcapReader::open(options.capture);
-  if (!reader) {
-    complain(reader.error().message);
-    return kExitNothingDone;
-  }
+  auto feed = InputFeed::open(options.inputs, options.chosenFormat().isStreamed);
+  if (!feed) return feed.error();
   std::optional<Output> logFile;
   if (!options.logFile.empty()) {
-    const std::string inputs[] = {options.capture};
-    if (const auto checked = checkOutputIsNoInput(options.logFile, inputs); !checked) {
-      complain(checked.error().message);
-      return kExitNothingDone;
-    }
+    const auto checked = checkOutputIsNoInput(options.logFile, filesOf(options.inputs));
+    if (!checked) return nothingDone(checked.error().message);
     auto created = Output::create(options.logFile);
-    if (!created) {
-      complain(created.error().message);
-      return kExitNothingDone;
-    }
+    if (!created) return nothingDone(created.error().message);
     logFile = *std::move(created);
   }
-  return Decoder(options, *std::move(reader), std::move(logFile)).run();
+  return Decoder(options, *std::move(feed), std::move(logFile)).run();
 }
 
 }  // namespace
@@ -119,21 +106,22 @@ int runDecode(const DecodeOptions& options) {
 CommandRow decodeCommand() {
   const auto options = std::make_shared<DecodeOptions>();
   return {.name = "decode",
-          .help = "Decode a recorded capture",
-          .options = {captureArgument(options->capture),
-                      formatOption(options->format, formatRows(decodeFormats())),
-                      secondsOption("--refresh-every",
-                                    "The capture's time between refreshes; 0: after every message",
-                                    options->refreshSeconds),
-                      {.name = "--log-json",
-                       .value = "FILE",
-                       .help = "Write every line of the system log there, as "
-                               "{\"priority\",\"message\"}",
-                       .target = &options->logFile},
-                      shownLogOption(options->shownLog)},
+          .help = "Decode recordings",
+          .options = withInputRows(
+              options->inputs,
+              {formatOption(options->format, formatRows(decodeFormats())),
+               secondsOption("--refresh-every",
+                             "The recording's time between refreshes; 0: after every message",
+                             options->refreshSeconds),
+               {.name = "--log-json",
+                .value = "FILE",
+                .help = "Write every line of the system log there, as {\"priority\",\"message\"}",
+                .target = &options->logFile},
+               shownLogOption(options->shownLog)}),
           .sections = {{.title = "Formats",
                         .rows = formatRows(decodeFormats()),
                         .text = kTimesAndNumbers},
+                       inputsHelp(),
                        {.title = "Examples", .text = kDecodeExamples}},
           .run = [options] { return runDecode(*options); }};
 }

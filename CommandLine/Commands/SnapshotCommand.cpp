@@ -11,10 +11,11 @@
 #include <vector>
 
 #include "CommandLine/Commands/Command.h"
-#include "CommandLine/Commands/RecordingFeed.h"
+#include "CommandLine/Commands/ReplayedInputs.h"
 #include "CommandLine/ExitStatus.h"
 #include "CommandLine/Formats/SnapshotText.h"
 #include "CommandLine/Input.h"
+#include "CommandLine/InputFeed.h"
 #include "CommandLine/OfflineServices.h"
 #include "CommandLine/Output.h"
 #include "CommandLine/ReplaceFile.h"
@@ -23,7 +24,6 @@
 #include "Model/Snapshot.h"
 #include "Platform/Linux/LinuxPlatform.h"
 #include "Recordings/OutputPath.h"
-#include "Recordings/PcapReader.h"
 #include "Recordings/SnapshotFile.h"
 
 namespace kestro {
@@ -33,16 +33,16 @@ constexpr const char* kSnapshotText =
     R"(A snapshot holds the last five displays with a description and, for binary log channels, their
 packets as a DLF log: what the window saves, in the same format.)";
 constexpr const char* kSnapshotExamples =
-    R"(  kestro-cli snapshot save drive.pcap -o drive.kestro --description="drop at the tunnel"
+    R"(  kestro-cli snapshot save drive.pcapng -o drive.kestro --description="drop at the tunnel"
   kestro-cli snapshot show drive.kestro
   kestro-cli snapshot export-dlf drive.kestro -o drive.dlf)";
 
 constexpr const char* kSaveText =
-    R"(The capture is replayed with a refresh every 2 s of its time, as `decode` does, and saved as if the
-save button were pressed at its last message: all times in the snapshot are the capture's. An
+    R"(The recording is replayed with a refresh every 2 s of its time, as `decode` does, and saved as if the
+save button were pressed at its last message: all times in the snapshot are the recording's. An
 existing file is replaced when the snapshot is complete.)";
 constexpr const char* kSaveExample =
-    R"(  kestro-cli snapshot save drive.pcap -o drive.kestro --description="drop at the tunnel")";
+    R"(  kestro-cli snapshot save drive.pcapng -o drive.kestro --description="drop at the tunnel")";
 
 constexpr const char* kShowExample = "  kestro-cli snapshot show drive.kestro | less";
 
@@ -56,21 +56,18 @@ constexpr const char* kExportExamples =
   kestro-cli snapshot export-dlf drive.kestro -o drive.dlf --reframe)";
 
 struct SnapshotOptions {
-  std::string input;
+  InputOptions inputs;  ///< of a snapshot that is made
+  std::string input;    ///< the snapshot that is read
   std::string output;
   std::string description;
   bool reframe = false;
   std::optional<LogPriority> shownLog;
 };
 
-int nothingDone(std::string_view why) {
-  complain(why);
-  return kExitNothingDone;
-}
-
-/// Writes a whole file, unless it is the very one that was read; the exit status.
+/// Writes a whole file, unless it is one of those that were read; the exit status.
 int writeFile(const SnapshotOptions& options, const Bytes& contents, ExitStatus status) {
-  const std::string inputs[] = {options.input};
+  auto inputs = filesOf(options.inputs);
+  if (!options.input.empty()) inputs.push_back(options.input);
   if (const auto checked = checkOutputIsNoInput(options.output, inputs); !checked) {
     return nothingDone(checked.error().message);
   }
@@ -89,24 +86,26 @@ Result<Dictionary> readSnapshot(const std::string& path) {
 
 // --- save
 
-/// What a generator would save at the end of a capture.
+/// What a generator would save at the end of the inputs.
 int runSave(const SnapshotOptions& options) {
-  auto reader = PcapReader::open(options.input);
-  if (!reader) return nothingDone(reader.error().message);
-  RecordingFeed feed(options.input, *std::move(reader));
+  auto feed = InputFeed::open(options.inputs, false);
+  if (!feed) return feed.error();
   OfflineServices services(std::nullopt, options.shownLog);
-  services.clock().setNow(createSystemClock()->now());  // for a capture without a message
-  const auto generator = feed.makeGenerator(services.forGenerator());
-  if (!generator) return kExitNothingDone;
-  Replay replay(*generator, services.clock(), {}, [](const ReplayRefresh&) {});
-  while (feed.feedNext(replay)) {
+  services.clock().setNow(createSystemClock()->now());  // for a recording without a message
+  ReplayedInputs replayed(*feed, services, {}, [](const ReplayRefresh&) {});
+  while (replayed.feedNext()) {
   }
-  if (feed.status() == kExitNothingDone) return kExitNothingDone;
+  if (feed->status() == kExitNothingDone) return kExitNothingDone;
+  Replay& replay = replayed.replay();
   replay.finish();
-  const Snapshot snapshot(services.clock(), generator->getSaveContentsFromState(replay.state()));
+  Value contents;
+  if (auto* generator = replay.generator()) {
+    contents = generator->getSaveContentsFromState(replay.state());
+  }
+  const Snapshot snapshot(services.clock(), contents);
   const auto file = snapshot.file(services.propertyListCoding(), options.description);
-  if (!file) return nothingDone(fmt::format("{}: {}", options.input, file.error().message));
-  return writeFile(options, *file, feed.status());
+  if (!file) return nothingDone(fmt::format("{}: {}", feed->name(), file.error().message));
+  return writeFile(options, *file, feed->status());
 }
 
 // --- show
@@ -163,19 +162,19 @@ OptionRow outputOption(const SharedOptions& options, const char* what) {
 }
 
 CommandRow saveAction(const SharedOptions& options) {
-  return {.name = "save",
-          .help = "Save the end of a capture as a snapshot",
-          .options = {captureArgument(options->input),
-                      outputOption(options, "The snapshot to write"),
-                      {.name = "--description",
-                       .value = "TEXT",
-                       .help = "What the snapshot shows; may be empty",
-                       .target = &options->description,
-                       .isRequired = true,
-                       .impliedValue = ""},
-                      shownLogOption(options->shownLog)},
-          .sections = {{.text = kSaveText}, {.title = "Example", .text = kSaveExample}},
-          .run = [options] { return runSave(*options); }};
+  return {
+      .name = "save",
+      .help = "Save the end of recordings as a snapshot",
+      .options = withInputRows(options->inputs, {outputOption(options, "The snapshot to write"),
+                                                 {.name = "--description",
+                                                  .value = "TEXT",
+                                                  .help = "What the snapshot shows; may be empty",
+                                                  .target = &options->description,
+                                                  .isRequired = true,
+                                                  .impliedValue = ""},
+                                                 shownLogOption(options->shownLog)}),
+      .sections = {{.text = kSaveText}, inputsHelp(), {.title = "Example", .text = kSaveExample}},
+      .run = [options] { return runSave(*options); }};
 }
 
 CommandRow showAction(const SharedOptions& options) {

@@ -13,10 +13,16 @@ NodePointer treeOf(const Value& display) {
   return KestroModelNode::makeTreeFromObjectWithPathDictionary(display, nodesByPath);
 }
 
+DisplayHead headOf(const ReplayRefresh& refresh, bool hasTechnology) {
+  return {.time = refresh.time,
+          .message = refresh.message,
+          .technology = hasTechnology ? refresh.technology : ""};
+}
+
 /// The last display, for people.
 class TreeWriter : public DecodeWriter {
  public:
-  explicit TreeWriter(Output& output) : _output(output) {}
+  TreeWriter(Output& output, bool /*hasTechnology*/) : _output(output) {}
 
   void finish(const DecodeResult& result) override {
     std::string text;
@@ -31,7 +37,7 @@ class TreeWriter : public DecodeWriter {
 /// The last display in one object.
 class JsonObjectWriter : public DecodeWriter {
  public:
-  explicit JsonObjectWriter(Output& output) : _output(output) {}
+  JsonObjectWriter(Output& output, bool /*hasTechnology*/) : _output(output) {}
 
   void finish(const DecodeResult& result) override {
     std::string text;
@@ -54,28 +60,30 @@ class JsonObjectWriter : public DecodeWriter {
 /// One object a refresh.
 class NdjsonWriter : public DecodeWriter {
  public:
-  explicit NdjsonWriter(Output& output) : _output(output) {}
+  NdjsonWriter(Output& output, bool hasTechnology)
+      : _output(output), _hasTechnology(hasTechnology) {}
 
   void refreshed(const ReplayRefresh& refresh) override {
     _text.clear();
-    appendNdjsonLine(_text, refresh.time, refresh.message, *treeOf(refresh.display));
+    appendNdjsonLine(_text, headOf(refresh, _hasTechnology), *treeOf(refresh.display));
     _output.write(_text);
   }
 
  private:
   Output& _output;
+  bool _hasTechnology;
   std::string _text;
 };
 
 /// One line for each leaf and refresh.
 class CsvWriter : public DecodeWriter {
  public:
-  explicit CsvWriter(Output& output) : _output(output) {}
+  CsvWriter(Output& output, bool hasTechnology) : _output(output), _hasTechnology(hasTechnology) {}
 
-  void begin() override { appendCsvHeading(_text); }
+  void begin() override { appendCsvHeading(_text, _hasTechnology); }
 
   void refreshed(const ReplayRefresh& refresh) override {
-    appendCsvLines(_text, refresh.time, refresh.message, *treeOf(refresh.display));
+    appendCsvLines(_text, headOf(refresh, _hasTechnology), *treeOf(refresh.display));
     _output.write(_text);
     _text.clear();
   }
@@ -84,25 +92,32 @@ class CsvWriter : public DecodeWriter {
 
  private:
   Output& _output;
+  bool _hasTechnology;
   std::string _text;
 };
 
 template <class Writer>
-std::unique_ptr<DecodeWriter> makeWriter(Output& output) {
-  return std::make_unique<Writer>(output);
+std::unique_ptr<DecodeWriter> makeWriter(Output& output, bool hasTechnology) {
+  return std::make_unique<Writer>(output, hasTechnology);
 }
 
 }  // namespace
 
 const std::vector<DecodeFormat>& decodeFormats() {
   static const std::vector<DecodeFormat> kFormats = {
-      {"tree", "the display after the last message, for people", makeWriter<TreeWriter>},
-      {"json", R"(one object: "technology", "messages" (how many) and the last "display")",
-       makeWriter<JsonObjectWriter>},
-      {"ndjson", R"(one line a refresh: "time", "message" (the last one's number) and "display")",
-       makeWriter<NdjsonWriter>},
-      {"csv", "one line for each value and refresh: time,message,path,value",
-       makeWriter<CsvWriter>},
+      {"tree", "the display after the last message, for people", makeWriter<TreeWriter>, false},
+      {"json",
+       "one object: \"technology\" (the last one), \"messages\" (how many) and the last\n"
+       "\"display\"",
+       makeWriter<JsonObjectWriter>, false},
+      {"ndjson",
+       "one line a refresh: \"time\", \"message\" (the last one's number), \"technology\"\n"
+       "(where there are several) and \"display\"",
+       makeWriter<NdjsonWriter>, true},
+      {"csv",
+       "one line for each value and refresh: time,message,path,value; technology\n"
+       "behind the message where there are several",
+       makeWriter<CsvWriter>, true},
   };
   return kFormats;
 }

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-// What `decode` writes while a capture is replayed, one class a format.
+// What `decode` writes while its inputs are replayed, one class a format.
 #pragma once
 
 #include <cstdint>
@@ -12,11 +12,11 @@
 
 namespace kestro {
 
-/// What is known when a capture has been replayed.
+/// What is known when everything has been replayed.
 struct DecodeResult {
-  std::string_view technology;
-  std::uint64_t messages;  ///< all records, also those that could not be decoded
-  const Value& display;    ///< after the last message
+  std::string_view technology;  ///< of the display
+  std::uint64_t messages;       ///< all records, also those that could not be decoded
+  const Value& display;         ///< after the last message
 };
 
 class DecodeWriter {
@@ -38,7 +38,10 @@ class DecodeWriter {
 struct DecodeFormat {
   std::string_view name;
   std::string_view help;  ///< one line or several
-  std::unique_ptr<DecodeWriter> (*makeWriter)(Output& output);
+  /// `hasTechnology` says that every display is to be written with its technology, where there is
+  /// one display for each refresh.
+  std::unique_ptr<DecodeWriter> (*makeWriter)(Output& output, bool hasTechnology);
+  bool isStreamed;  ///< whether it writes at every refresh
 };
 
 /// All formats, the default first.

@@ -58,15 +58,19 @@ void writeDisplayJson(JsonWriter& writer, const KestroModelNode& display) {
   writer.endObject();
 }
 
-void appendNdjsonLine(std::string& output, Moment time, std::optional<std::uint64_t> message,
+void appendNdjsonLine(std::string& output, const DisplayHead& head,
                       const KestroModelNode& display) {
   JsonWriter writer(output);
   writer.beginObject();
   writer.key("time");
-  writer.text(isoTimeText(time));
-  if (message) {
+  writer.text(isoTimeText(head.time));
+  if (head.message) {
     writer.key("message");
-    writer.number(*message);
+    writer.number(*head.message);
+  }
+  if (!head.technology.empty()) {
+    writer.key("technology");
+    writer.text(head.technology);
   }
   writer.key("display");
   writeDisplayJson(writer, display);
@@ -74,11 +78,13 @@ void appendNdjsonLine(std::string& output, Moment time, std::optional<std::uint6
   output += '\n';
 }
 
-void appendCsvHeading(std::string& output) { output += "time,message,path,value\n"; }
+void appendCsvHeading(std::string& output, bool hasTechnology) {
+  output += hasTechnology ? "time,message,technology,path,value\n" : "time,message,path,value\n";
+}
 
-void appendCsvLines(std::string& output, Moment time, std::uint64_t message,
-                    const KestroModelNode& display) {
-  const std::string beginning = fmt::format("{},{},", isoTimeText(time), message);
+void appendCsvLines(std::string& output, const DisplayHead& head, const KestroModelNode& display) {
+  std::string beginning = fmt::format("{},{},", isoTimeText(head.time), head.message.value_or(0));
+  if (!head.technology.empty()) beginning += fmt::format("{},", head.technology);
   CsvLines(output, beginning).append(display, "/");
 }
 

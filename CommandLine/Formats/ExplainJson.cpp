@@ -36,9 +36,13 @@ void writeShown(JsonWriter& writer, const Value& value) {
 
 void ExplainJson::begin(std::string_view technology) {
   // The messages are written one by one as they come, so their array is no call of the writer's.
-  _text = "{\"technology\":";
-  _writer.text(technology);
-  _text += ",\"messages\":[";
+  _text = "{";
+  if (!_style.hasTechnology) {
+    _text += "\"technology\":";
+    _writer.text(technology);
+    _text += ',';
+  }
+  _text += "\"messages\":[";
   _output.write(_text);
 }
 
@@ -51,6 +55,10 @@ void ExplainJson::beginPacket(const PacketHead& head) {
   _writer.number(head.message);
   _writer.key("time");
   _writer.text(isoTimeText(head.time));
+  if (_style.hasTechnology) {
+    _writer.key("technology");
+    _writer.text(head.technology);
+  }
   if (head.code) {
     _writer.key("code");
     _writer.text(logCodeText(*head.code));
@@ -65,6 +73,7 @@ void ExplainJson::beginPacket(const PacketHead& head) {
     _writer.key("prefixLength");
     _writer.number(head.prefixLength);
   }
+  if (_style.isList) return;
   _writer.key("values");
   _writer.beginArray();
 }
@@ -122,7 +131,7 @@ void ExplainJson::writeSource(const ExplainedSource& source) {
 }
 
 void ExplainJson::endPacket(std::string_view remark) {
-  _writer.endArray();
+  if (!_style.isList) _writer.endArray();
   if (!remark.empty()) {
     _writer.key("remark");
     _writer.text(remark);

@@ -13,7 +13,7 @@ namespace kestro {
 class ExplainJson : public ExplainWriter {
  public:
   /// `output` must outlive the writer.
-  explicit ExplainJson(Output& output) : _output(output) {}
+  ExplainJson(Output& output, const ExplainStyle& style) : _output(output), _style(style) {}
 
   void begin(std::string_view technology) override;
   void beginPacket(const PacketHead& head) override;
@@ -25,6 +25,7 @@ class ExplainJson : public ExplainWriter {
   void writeSource(const ExplainedSource& source);
 
   Output& _output;
+  ExplainStyle _style;
   ByteView _packet;
   std::string _text;
   JsonWriter _writer{_text};  ///< of one message after the other

@@ -63,10 +63,11 @@ void ExplainTable::beginPacket(const PacketHead& head) {
   _section.clear();
   _row.clear();
   _text.clear();
-  if (!_isFirst) _text += '\n';
+  if (!_isFirst && !_style.isList) _text += '\n';
   _isFirst = false;
   auto end = std::back_inserter(_text);
   fmt::format_to(end, "Message {}  {}", head.message, isoTimeText(head.time));
+  if (_style.hasTechnology) fmt::format_to(end, "  {}", head.technology);
   if (head.code) fmt::format_to(end, "  {}", logCodeText(*head.code));
   if (!head.name.empty()) fmt::format_to(end, " {}", head.name);
   fmt::format_to(end, "{} {} {}", head.name.empty() ? " " : ",", head.packet.size(),

@@ -14,7 +14,7 @@ namespace kestro {
 class ExplainTable : public ExplainWriter {
  public:
   /// `output` must outlive the writer.
-  explicit ExplainTable(Output& output) : _output(output) {}
+  ExplainTable(Output& output, const ExplainStyle& style) : _output(output), _style(style) {}
 
   void begin(std::string_view /*technology*/) override {}
   void beginPacket(const PacketHead& head) override;
@@ -34,6 +34,7 @@ class ExplainTable : public ExplainWriter {
   void appendTable();
 
   Output& _output;
+  ExplainStyle _style;
   ByteView _packet;
   std::vector<Line> _lines;  ///< of the packet; those from _lineCount on are of an earlier one
   std::size_t _lineCount = 0;

@@ -8,8 +8,8 @@ namespace kestro {
 namespace {
 
 template <class Writer>
-std::unique_ptr<ExplainWriter> makeExplainWriter(Output& output) {
-  return std::make_unique<Writer>(output);
+std::unique_ptr<ExplainWriter> makeExplainWriter(Output& output, const ExplainStyle& style) {
+  return std::make_unique<Writer>(output, style);
 }
 
 }  // namespace
@@ -17,7 +17,9 @@ std::unique_ptr<ExplainWriter> makeExplainWriter(Output& output) {
 const std::vector<ExplainFormat>& explainFormats() {
   static const std::vector<ExplainFormat> kFormats = {
       {"table", "for people, a table a packet", makeExplainWriter<ExplainTable>},
-      {"json", R"(one object: "technology" and "messages", one packet a line)",
+      {"json",
+       "one object: \"technology\" (of every message where there are several) and\n"
+       "\"messages\", one packet a line",
        makeExplainWriter<ExplainJson>},
   };
   return kFormats;

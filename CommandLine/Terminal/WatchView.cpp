@@ -49,7 +49,7 @@ class NdjsonView : public TextView {
 
   void refreshed(const WatchState& state) override {
     std::string text;
-    appendNdjsonLine(text, state.time, std::nullopt, *state.tree);
+    appendNdjsonLine(text, {.time = state.time}, *state.tree);
     write(text);
   }
   void changed(const WatchState&) override {}

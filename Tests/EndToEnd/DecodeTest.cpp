@@ -225,7 +225,7 @@ TEST(Usage, WrongUsageIsTwo) {
       {"kestro-cli", "watch", "--log-priority=2"},
       {"kestro-cli", "watch", "--server=A", "--demo"},
       {"kestro-cli", "watch", "--server=", "--format=ndjson"},
-      {"kestro-cli", "watch", "--demo=nonsense:x"},
+      {"kestro-cli", "watch", "--demo=simulation:x"},
       {"kestro-cli", "record"},
       {"kestro-cli", "record", "-o", "--duration=1"},
       {"kestro-cli", "explain"},

@@ -18,7 +18,7 @@ using namespace std::chrono_literals;
 using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 
-/// Shows the last message's text; "!" ends the application.
+/// Shows the last messages' texts; "!" ends the application.
 class EchoGenerator : public LogGenerator {
  public:
   explicit EchoGenerator(const GeneratorServices& services) : LogGenerator(services) {}
@@ -28,6 +28,7 @@ class EchoGenerator : public LogGenerator {
     if (text == "!") throw InternalConsistencyFailure("No good", "Echo", 7);
     if (text == "?") throw 42;
     state.set(kStateDisplay, text);
+    state.set("All", std::string(state["All"].isText() ? state["All"].text() : "") + text);
   }
   Value generateLogUsingState(Dictionary& state) override { return state[kStateDisplay]; }
   [[nodiscard]] Dictionary getStartCommand() const override { return {}; }
@@ -37,27 +38,38 @@ class EchoGenerator : public LogGenerator {
 class ReplayTest : public ::testing::Test {
  protected:
   void start(const ReplayOptions& options) {
-    replay = std::make_unique<Replay>(generator, clock, options, [this](const ReplayRefresh& r) {
-      const auto time = std::chrono::duration_cast<std::chrono::milliseconds>(r.time - kStart);
-      EXPECT_EQ(clock.now(), r.time);
-      refreshes.push_back(std::to_string(time.count()) + " " + std::to_string(r.message) + " " +
-                          std::string(r.display.text()));
-    });
+    replay = std::make_unique<Replay>(
+        [this](std::string_view technology) {
+          made.emplace_back(technology);
+          return technology == "none"
+                     ? nullptr
+                     : std::make_unique<EchoGenerator>(generatorServices(platform));
+        },
+        clock, options,
+        [this](const ReplayRefresh& r) {
+          const auto time = std::chrono::duration_cast<std::chrono::milliseconds>(r.time - kStart);
+          EXPECT_EQ(clock.now(), r.time);
+          EXPECT_EQ(r.technology, made.back());
+          refreshes.push_back(std::to_string(time.count()) + " " + std::to_string(r.message) + " " +
+                              std::string(r.display.text()));
+        });
   }
 
-  Result<void> feed(std::chrono::milliseconds time, std::string_view text) {
+  Result<void> feed(std::chrono::milliseconds time, std::string_view text,
+                    std::string_view technology = "echo") {
     const Bytes bytes(text.begin(), text.end());
-    return replay->feed({.number = ++number, .time = kStart + time, .bytes = bytes});
+    return replay->feed(
+        {.number = ++number, .time = kStart + time, .technology = technology, .bytes = bytes});
   }
 
   static constexpr Moment kStart{1'330'866'309'000'000us};
 
   std::unique_ptr<PropertyListCoding> coding = createPropertyListCoding();
   VirtualPlatform platform{*coding};
-  EchoGenerator generator{generatorServices(platform)};
   ReplayClock clock{platform.clock()};
   std::unique_ptr<Replay> replay;
   std::uint64_t number = 0;
+  std::vector<std::string> made;       ///< technologies that a generator was asked for
   std::vector<std::string> refreshes;  ///< "milliseconds message display"
 };
 
@@ -139,6 +151,51 @@ TEST_F(ReplayTest, WithoutMessagesThereIsNoDisplay) {
   replay->finish();
   EXPECT_THAT(refreshes, IsEmpty());
   EXPECT_TRUE(replay->display().isNull());
+}
+
+TEST_F(ReplayTest, AnotherTechnologyStartsItsOwnDisplayAndItsOwnTicks) {
+  start({});
+  EXPECT_TRUE(feed(0s, "a"));
+  EXPECT_TRUE(feed(1s, "b", "other"));  // what no tick has seen of "a" is gone
+  EXPECT_TRUE(feed(2s, "c", "other"));
+  EXPECT_TRUE(feed(3s, "d", "other"));  // 2 s after the change
+  replay->finish();
+  EXPECT_THAT(refreshes, ElementsAre("3000 3 c", "3000 4 d"));
+  EXPECT_THAT(made, ElementsAre("echo", "other"));
+}
+
+TEST_F(ReplayTest, ATickBeforeTheChangeStillShowsTheOldDisplay) {
+  start({});
+  EXPECT_TRUE(feed(0s, "a"));
+  EXPECT_TRUE(feed(2s, "b", "other"));
+  replay->finish();
+  // The tick of the old display is due when the change comes.
+  EXPECT_THAT(refreshes, ElementsAre("2000 1 a", "2000 2 b"));
+}
+
+TEST_F(ReplayTest, AChangeTakesTheDisplayOutOfTheStateAndKeepsTheRest) {
+  start({});
+  EXPECT_TRUE(feed(0s, "a"));
+  EXPECT_FALSE(feed(1s, "!", "other"));
+  EXPECT_TRUE(replay->state()[kStateDisplay].isNull());
+  EXPECT_EQ(replay->state()["All"], Value("a"));
+}
+
+TEST_F(ReplayTest, AMessageWithoutAGeneratorIsLeftOut) {
+  start({});
+  EXPECT_TRUE(feed(0s, "a"));
+  EXPECT_EQ(feed(1s, "b", "none").error().message, "nothing here decodes the technology none");
+  EXPECT_TRUE(feed(1s, "c"));
+}
+
+TEST_F(ReplayTest, BeginsWithAGeneratorWhereThereIsNoMessage) {
+  start({});
+  EXPECT_EQ(replay->generator(), nullptr);
+  EXPECT_FALSE(replay->begin("none"));
+  EXPECT_TRUE(replay->begin("echo"));
+  EXPECT_NE(replay->generator(), nullptr);
+  EXPECT_TRUE(feed(0s, "a"));
+  EXPECT_THAT(made, ElementsAre("none", "echo"));
 }
 
 TEST_F(ReplayTest, TheClockKeepsTheZoneOfTheOtherOne) {

@@ -23,7 +23,7 @@ std::string json(const Value& display) {
 
 std::string csv(const Value& display) {
   std::string output;
-  appendCsvLines(output, kTime, 7, *treeOf(display));
+  appendCsvLines(output, {.time = kTime, .message = 7}, *treeOf(display));
   return output;
 }
 
@@ -57,14 +57,14 @@ TEST(DisplayJson, NoDisplayIsUnknown) { EXPECT_EQ(json(Value()), "\"(unknown)\""
 
 TEST(DisplayNdjson, HasTimeMessageAndDisplay) {
   std::string output;
-  appendNdjsonLine(output, kTime, 7, *treeOf(Dictionary{{"k", "v"}}));
+  appendNdjsonLine(output, {.time = kTime, .message = 7}, *treeOf(Dictionary{{"k", "v"}}));
   EXPECT_EQ(output, R"({"time":"2012-03-04T12:05:09.000250Z","message":7,"display":{"k":"v"}})"
                     "\n");
 }
 
 TEST(DisplayNdjson, LeavesTheMessageOutWhereThereIsNoNumber) {
   std::string output;
-  appendNdjsonLine(output, kTime, std::nullopt, *treeOf(Dictionary()));
+  appendNdjsonLine(output, {.time = kTime}, *treeOf(Dictionary()));
   EXPECT_EQ(output, "{\"time\":\"2012-03-04T12:05:09.000250Z\",\"display\":{}}\n");
 }
 

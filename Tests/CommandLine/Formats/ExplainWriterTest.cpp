@@ -36,7 +36,7 @@ class ExplainWriterTest : public ::testing::Test {
     const TemporaryFile file;
     {
       Output output = *Output::create(file.path());
-      Writer writer(output);
+      Writer writer(output, ExplainStyle());
       writer.begin("LTE");
       use(writer);
       writer.finish();
