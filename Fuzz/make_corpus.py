@@ -122,10 +122,67 @@ def make_logs(technology, entries):
     log = {"Description": "DLF binary", "DLF": dlf_of(entries)}
     snapshot = {"Timestamp": "2012-03-04 13:05:09 +0100", "Data": [*history, log],
                 "Description": "drive"}
-    for form in (plistlib.FMT_XML, plistlib.FMT_BINARY):
+    for form in (plistlib.FMT_BINARY, plistlib.FMT_XML):
         lines = plistlib.dumps(snapshot, fmt=form, sort_keys=False).split(b"\n")
         lines = [line for line in lines if not line.startswith(b"<!DOCTYPE")]
-        write("SnapshotFuzz", f"{technology}-{form.name[4:].lower()}", b"\n".join(lines))
+        file = b"\n".join(lines)
+        write("SnapshotFuzz", f"{technology}-{form.name[4:].lower()}", file)
+    make_other_recordings(technology, entries, file)
+
+
+def block(order, kind, body):
+    length = struct.pack(order + "I", 12 + len(body))
+    return struct.pack(order + "I", kind) + length + body + length
+
+
+def option(order, code, value):
+    return struct.pack(order + "HH", code, len(value)) + value + bytes(-len(value) % 4)
+
+
+def section(order, *comments):
+    body = struct.pack(order + "IHHq", 0x1A2B3C4D, 1, 0, -1)
+    return block(order, 0x0A0D0D0A, body + b"".join(option(order, 1, text) for text in comments))
+
+
+def interface(order, link_type, longest, *options):
+    body = struct.pack(order + "HHI", link_type, 0, longest)
+    return block(order, 1, body + b"".join(option(order, *each) for each in options))
+
+
+def packet(order, number, time, data, *options):
+    body = struct.pack(order + "IIIII", number, time >> 32, time & 0xFFFFFFFF, len(data), len(data))
+    body += data + bytes(-len(data) % 4)
+    return block(order, 6, body + b"".join(option(order, *each) for each in options))
+
+
+def make_pcapng():
+    """Sections in both byte orders, times of many resolutions, every kind of packet and comment."""
+    for name, order in (("little", "<"), ("big", ">")):
+        first = section(order) + interface(order, 150, 262144, (2, b"LTE"), (9, b"\x06"))
+        packets = (packet(order, 0, 1_330_862_709_000_250, b"abc", (1, b"note"), (0, b""))
+                   + packet(order, 0, 1_330_862_710_000_250, b"de"))
+        write("PcapngFuzz", name, first + packets)
+        write("PcapngFuzz", f"{name}-simple", first + packets
+              + block(order, 3, struct.pack(order + "I", 5) + b"fghij\0\0\0")
+              + block(order, 2, struct.pack(order + "HHIIII", 0, 0, 0, 9, 1, 4) + b"k\0\0\0"))
+        write("PcapngFuzz", f"{name}-other", first + block(order, 5, b"\0\0\0\0") + packets
+              + interface(order, 1, 0) + packet(order, 1, 3, b"ethernet") + packets)
+        write("PcapngFuzz", f"{name}-sections", section(order, b"made-up: simulation")
+              + interface(order, 147, 0) + packet(order, 0, 1, b"a") + section(order, b"last"))
+        for resolution in (0, 3, 7, 9, 12, 19, 127, 0x80, 0x81, 0x94, 0xA0, 0xBF, 0xFF):
+            times = ((9, bytes([resolution])), (14, struct.pack(order + "q", 1000)))
+            write("PcapngFuzz", f"{name}-times-{resolution:02x}",
+                  section(order) + interface(order, 150, 0, *times)
+                  + packet(order, 0, 1_330_862_709, b"a") + packet(order, 0, 1 << 63, b"b"))
+
+
+def make_other_recordings(technology, entries, snapshot):
+    """A log as it is exported and one of whole records, and a snapshot of the same packets."""
+    report = b"\xa1\x00\xfd\x1f" + bytes(157)
+    write("RecordingFuzz", f"{technology}-exported", report + dlf_of(entries)[161:])
+    records = b"".join(entry[1:] for entry in entries[1:])
+    write("RecordingFuzz", f"{technology}-reframed", report + records)
+    write("RecordingFuzz", f"{technology}-snapshot", snapshot)
 
 
 def make_recordings(technology, kinds):
@@ -163,5 +220,6 @@ def make(technology, capture):
 
 
 if __name__ == "__main__":
+    make_pcapng()
     for argument in sys.argv[1:]:
         make(*argument.split("=", 1))

@@ -47,9 +47,10 @@ PcapngTimeScale::PcapngTimeScale(std::uint8_t resolution, std::int64_t offset) n
   } else {
     _divisor = powerOfTen(exponent - kMicrosecondDigits);
   }
+  _isMicroseconds = resolution == kMicrosecondDigits && offset == 0;
 }
 
-std::optional<Moment> PcapngTimeScale::momentOf(std::uint64_t units) const noexcept {
+std::optional<Moment> PcapngTimeScale::scaledMomentOf(std::uint64_t units) const noexcept {
   const Wide count = scaled(units, _multiplier, _divisor, _shift) +
                      Wide{_offset} * static_cast<std::int64_t>(kMicrosecondsPerSecond);
   if (count < kFirstPcapngTime.time_since_epoch().count() ||

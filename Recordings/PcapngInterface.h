@@ -23,9 +23,17 @@ class PcapngTimeScale {
 
   /// The moment of a time, rounded down to the microsecond; absent when it lies outside the years 1
   /// to 9999, as texts and property lists hold them.
-  [[nodiscard]] std::optional<Moment> momentOf(std::uint64_t units) const noexcept;
+  [[nodiscard]] std::optional<Moment> momentOf(std::uint64_t units) const noexcept {
+    if (!_isMicroseconds || units > kMostMicroseconds) return scaledMomentOf(units);
+    return Moment(std::chrono::microseconds(units));
+  }
 
  private:
+  static constexpr std::uint64_t kMostMicroseconds = kLastPcapngTime.time_since_epoch().count();
+
+  [[nodiscard]] std::optional<Moment> scaledMomentOf(std::uint64_t units) const noexcept;
+
+  bool _isMicroseconds = true;    ///< since 1970
   std::uint64_t _multiplier = 1;  ///< microseconds = units * multiplier / divisor / 2^shift
   std::uint64_t _divisor = 1;
   unsigned _shift = 0;

@@ -123,8 +123,10 @@ Result<std::optional<RecordedMessage>> PcapngReader::messageIn(const PcapngBlock
     _lastTime = *time;
   }
   const std::size_t end = packet->data + pcapngPadded(packet->length);
-  if (auto added = takeComments(block, end); !added) {
-    return _blocks.damaged(added.error().message);
+  if (end < block.body.size() || !_notes.empty() || !_comments.empty()) {
+    if (auto added = takeComments(block, end); !added) {
+      return _blocks.damaged(added.error().message);
+    }
   }
   return counted({.time = _lastTime,
                   .technology = interface.technology,

@@ -14,7 +14,7 @@
 namespace kestro {
 namespace {
 
-constexpr std::size_t kPiece = std::size_t{256} * 1024;
+constexpr std::size_t kPiece = std::size_t{128} * 1024;
 
 Error systemError(const std::string& path) {
   return Error{fmt::format("{}: {}", path, std::strerror(errno))};
