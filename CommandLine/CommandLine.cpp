@@ -3,8 +3,10 @@
 
 #include <variant>
 
+#include "CommandLine/Commands/CellsCommand.h"
 #include "CommandLine/Commands/CodesCommand.h"
 #include "CommandLine/Commands/DecodeCommand.h"
+#include "CommandLine/Commands/EventsCommand.h"
 #include "CommandLine/Commands/ExplainCommand.h"
 #include "CommandLine/Commands/RecordCommand.h"
 #include "CommandLine/Commands/SnapshotCommand.h"
@@ -21,7 +23,7 @@ CommandRow commandLineProgram(const Bundle& bundle) {
           .help = "Shows live, or from a recording, what a phone's cellular baseband is doing.",
           .options = {versionOption("kestro-cli", bundle)},
           .commands = {watchCommand(), decodeCommand(), recordCommand(), explainCommand(),
-                       codesCommand(), snapshotCommand()},
+                       cellsCommand(), eventsCommand(), codesCommand(), snapshotCommand()},
           .sections = {{.title = "Exit status",
                         .rows = {{"0", "done"},
                                  {"1", "nothing could be done; one line says why"},

@@ -147,8 +147,10 @@ CellTracker::Sight CellTracker::sightOf(const CellObservation& observation, Mome
   ServingCell& cell = sight.cell;
   cell.channel = observation.number(CellField::Channel);
   cell.physical = observation.number(CellField::Physical);
+  cell.ownBand = observation.number(CellField::Band);
   if (!cell.channel && serving && observation.section->isOnServingChannel) {
     cell.channel = serving->channel;
+    cell.ownBand = serving->ownBand;
   }
   if (const auto identity = observation.number(CellField::Identity)) {
     cell.name.identity = identity;
@@ -178,6 +180,7 @@ CellTracker::Sight CellTracker::servingSight(const CellObservation& observation,
   if (!sight.cell.name.isEmpty() || !serving) return sight;
   Sight own{.cell = *serving, .isServing = true};
   if (sight.cell.channel) own.cell.channel = sight.cell.channel;
+  if (sight.cell.ownBand) own.cell.ownBand = sight.cell.ownBand;
   return own;
 }
 
@@ -194,6 +197,7 @@ void CellTracker::absorb(const MeasuredMessage& message, const CellObservation& 
       sight.isServing && serving && serving->name == seen.name) {
     if (seen.channel) serving->channel = seen.channel;
     if (seen.physical) serving->physical = seen.physical;
+    if (seen.ownBand) serving->ownBand = seen.ownBand;
     if (observation.section->use == CellUse::Serving) {
       takeRegion(message, observation, observation.radio);
     }
@@ -202,7 +206,7 @@ void CellTracker::absorb(const MeasuredMessage& message, const CellObservation& 
   Cell& cell = _cells.at(*id);
   if (seen.channel) cell.channel = seen.channel;
   if (seen.physical) cell.physical = seen.physical;
-  if (const auto band = observation.number(CellField::Band)) cell.ownBand = band;
+  if (seen.ownBand) cell.ownBand = seen.ownBand;
   cell.isAssumed = cell.isAssumed || seen.isAssumed;
   Sight kept = sight;
   kept.cell.cell = id;

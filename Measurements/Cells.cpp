@@ -69,6 +69,11 @@ std::optional<CellId> Cells::see(const CellName& name, Moment time) {
   return id;
 }
 
+const Cell* Cells::find(const CellName& name) const {
+  const auto known = _places.find(name);
+  return known == _places.end() ? nullptr : &_cells[known->second];
+}
+
 std::size_t KnownIdentities::PairHash::operator()(const Pair& pair) const noexcept {
   return mixed(mixed(mixed(0, static_cast<std::uint64_t>(pair.radio)), pair.channel),
                pair.physical);

@@ -65,6 +65,9 @@ class Cells {
   /// The cell's place, made when it is seen for the first time; absent when there is no room.
   [[nodiscard]] std::optional<CellId> see(const CellName& name, Moment time);
 
+  /// A cell that has been seen.
+  [[nodiscard]] const Cell* find(const CellName& name) const;
+
   [[nodiscard]] Cell& at(CellId cell) { return _cells[cell]; }
   [[nodiscard]] const std::deque<Cell>& all() const noexcept { return _cells; }
   /// How often a cell was seen for which there is no room.

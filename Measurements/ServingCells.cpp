@@ -79,10 +79,14 @@ void ServingCells::takePlace(Radio radio, const ServingCell& cell) {
 }
 
 std::optional<double> ServingCells::levelOf(const ServingCell& cell, Moment time) const {
-  if (!cell.cell) return std::nullopt;
-  const Cell& row = _cells.all()[*cell.cell];
-  if (row.level.count() == 0 || time - row.lastLevel > kLevelFor) return std::nullopt;
-  return row.level.last();
+  // A cell that has just become known was measured as a neighbour, by its pair.
+  const CellName pair{.radio = cell.name.radio, .channel = cell.channel, .physical = cell.physical};
+  const Cell* latest = nullptr;
+  for (const Cell* row : {_cells.find(cell.name), _cells.find(pair)}) {
+    if (row == nullptr || row->level.count() == 0 || time - row->lastLevel > kLevelFor) continue;
+    if (latest == nullptr || row->lastLevel > latest->lastLevel) latest = row;
+  }
+  return latest == nullptr ? std::nullopt : std::optional(latest->level.last());
 }
 
 void ServingCells::tellChange(const Previous& previous, Radio radio, const ServingCell& cell,

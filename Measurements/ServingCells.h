@@ -18,6 +18,7 @@ struct ServingCell {
   std::optional<CellId> cell{};
   std::optional<std::uint32_t> channel{};
   std::optional<std::uint32_t> physical{};
+  std::optional<std::uint32_t> ownBand{};
   /// Its identity is that last seen for its channel and physical identity.
   bool isAssumed = false;
 

@@ -34,6 +34,7 @@ TEST_F(LTEDriveTest, ItIsAHandoverWithinASecondOfTheConnectedModesMeasurement) {
   EXPECT_THAT(lines, ElementsAre("1.5 handover LTE: 700 -> 800"));
   EXPECT_EQ(events[0].connectedBy, "0xB179");
   EXPECT_EQ(events[0].fromLevel, -100);
+  EXPECT_EQ(events[0].toLevel, -97);  // when it was known by its pair only
 }
 
 TEST_F(LTEDriveTest, MoreThanASecondAfterItItIsAReselection) {
