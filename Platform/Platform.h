@@ -10,6 +10,8 @@ class DeviceRoot;
 class InputStreams;
 class MainQueue;
 class MessagePorts;
+class ModemService;
+class PositionService;
 class Preferences;
 class PropertyListCoding;
 class SystemLog;
@@ -41,6 +43,8 @@ class Platform {
   [[nodiscard]] virtual Uuids& uuids() = 0;
   [[nodiscard]] virtual Preferences& preferences() = 0;
   [[nodiscard]] virtual DeviceRoot& deviceRoot() = 0;
+  [[nodiscard]] virtual ModemService& modemService() = 0;
+  [[nodiscard]] virtual PositionService& positionService() = 0;
 };
 
 }  // namespace kestro

@@ -10,8 +10,10 @@
 #include "Platform/Clock.h"
 #include "Platform/Linux/FileDeviceRoot.h"
 #include "Platform/Linux/FileInputStreams.h"
+#include "Platform/Linux/GpsdPositions.h"
 #include "Platform/Linux/IniPreferences.h"
 #include "Platform/Linux/MessagePorts.h"
+#include "Platform/Linux/ModemBus.h"
 #include "Platform/Linux/ProcessSignals.h"
 #include "Platform/Linux/QtMainQueue.h"
 #include "Platform/Linux/QueuedSystemLog.h"
@@ -90,6 +92,8 @@ class LinuxPlatformServices final : public LinuxPlatform {
   [[nodiscard]] Uuids& uuids() override { return _uuids; }
   [[nodiscard]] Preferences& preferences() override { return _preferences; }
   [[nodiscard]] DeviceRoot& deviceRoot() override { return _deviceRoot; }
+  [[nodiscard]] ModemService& modemService() override { return _modemService; }
+  [[nodiscard]] PositionService& positionService() override { return _positionService; }
 
   int run() override { return _eventLoop.run(); }
   void quit(int exitStatus) override { _eventLoop.quit(exitStatus); }
@@ -119,6 +123,8 @@ class LinuxPlatformServices final : public LinuxPlatform {
   FileInputStreams _inputStreams;
   std::unique_ptr<MessagePorts> _messagePorts;
   std::unique_ptr<TelephonyService> _telephonyService;
+  LinuxModemService _modemService;
+  GpsdPositions _positionService;
   ProcessSignals _signals;
   QtMainQueue _mainQueue;
 };

@@ -6,6 +6,8 @@
 #include "Platform/Platform.h"
 #include "Platform/Virtual/InMemoryPorts.h"
 #include "Platform/Virtual/VirtualMainQueue.h"
+#include "Platform/Virtual/VirtualModemService.h"
+#include "Platform/Virtual/VirtualPositionService.h"
 #include "Platform/Virtual/VirtualServices.h"
 
 namespace kestro {
@@ -28,6 +30,8 @@ class VirtualPlatform : public Platform {
   [[nodiscard]] VirtualUuids& uuids() override { return _uuids; }
   [[nodiscard]] VirtualPreferences& preferences() override { return _preferences; }
   [[nodiscard]] VirtualDeviceRoot& deviceRoot() override { return _deviceRoot; }
+  [[nodiscard]] VirtualModemService& modemService() override { return _modemService; }
+  [[nodiscard]] VirtualPositionService& positionService() override { return _positionService; }
 
  private:
   RecordingSystemLog _systemLog;
@@ -43,6 +47,8 @@ class VirtualPlatform : public Platform {
   VirtualDeviceRoot _deviceRoot;
   VirtualMainQueue _mainQueue{_clock};
   InMemoryPorts _messagePorts{_mainQueue};
+  VirtualModemService _modemService{_mainQueue};
+  VirtualPositionService _positionService;
 };
 
 }  // namespace kestro

@@ -13,6 +13,7 @@ KINDS = (
     ("sockets", r"sys/(socket|un)\.h|netinet/.*|arpa/.*|netdb\.h|linux/.*"),
     ("pcap", r"pcap(/.*)?(\.h)?"),
     ("xml", r"expat\.h"),
+    ("positions", r"gps\.h"),
     ("databases", r"sqlite3\.h"),
     ("digests", r"sha2\.h"),
     ("command lines", r"CLI/.*"),
@@ -56,7 +57,7 @@ ROOMS = {
     "Platform": Room((), CORE),
     "Platform/Virtual": Room(("Platform",), CORE),
     "Platform/Linux": Room(
-        ("Platform",), HOSTED | {"qt", "property lists", "system log", "sockets"}
+        ("Platform",), HOSTED | {"qt", "property lists", "system log", "sockets", "positions"}
     ),
     "Options": Room(("Platform",), CORE),
     "Options/ArgumentParser.cpp": Room(
