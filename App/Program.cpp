@@ -150,7 +150,8 @@ int runProgram(int argumentCount, char** arguments) {
   std::signal(SIGPIPE, SIG_IGN);
   std::unique_ptr<DemoServer> demo;
   if (!options.live.demoSource.empty()) {
-    auto started = startDemoServer(options.live.demoSource);
+    auto started = startDemoServer(
+      {.source = options.live.demoSource, .speed = options.live.demoSpeed, .loops = options.live.demoLoops});
     if (!started) {
       complain(started.error().message);
       return kNothingDone;

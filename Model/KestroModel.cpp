@@ -23,11 +23,16 @@ KestroModel::KestroModel(Platform& platform, std::function<void()> updateViewCon
 
 KestroModel::~KestroModel() {
   _connectionChanged = {};
+  _newsChanged = {};
   destroyPorts();
 }
 
 void KestroModel::setConnectionHandler(std::function<void(bool isConnected)> connectionChanged) {
   _connectionChanged = std::move(connectionChanged);
+}
+
+void KestroModel::setNewsHandler(std::function<void()> changed) {
+  _newsChanged = std::move(changed);
 }
 
 // --- Connection ----------------------------------------------------------------------------------
@@ -53,8 +58,9 @@ void KestroModel::technologyAnswered(std::string_view technology) {
 void KestroModel::setGenerator(std::string_view technology) {
   _logGenerator = _generatorFromTechnology(generatorServices(_platform), technology);
   if (!_logGenerator) return;
-  // What no tick has seen yet is gone with the display of another technology.
-  if (_stateOwner.handTo(*_logGenerator, technology, _state)) _updated = false;
+  if (!_stateOwner.handTo(*_logGenerator, technology, _state)) return;
+  _updated = false;  // what no tick has seen yet is gone with the display of another technology
+  if (_newsChanged) _newsChanged();
 }
 
 std::optional<Dictionary> KestroModel::startCommand() {
@@ -75,7 +81,18 @@ void KestroModel::channelStops() {
   if (const auto timer = std::exchange(_displayUpdateTimer, nullptr)) timer->invalidate();
 }
 
+void KestroModel::sourceTold(const LogSourceState& source) {
+  if (std::exchange(_source, source) != source && _newsChanged) _newsChanged();
+}
+
+void KestroModel::connectionFailed(const ConnectionProblem& problem) { setProblem(problem); }
+
+void KestroModel::setProblem(std::optional<ConnectionProblem> problem) {
+  if (std::exchange(_problem, problem) != problem && _newsChanged) _newsChanged();
+}
+
 void KestroModel::connectionChanged(bool isConnected) {
+  if (isConnected) setProblem(std::nullopt);
   if (_connectionChanged) _connectionChanged(isConnected);
 }
 

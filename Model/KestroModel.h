@@ -44,6 +44,19 @@ class KestroModel : public std::enable_shared_from_this<KestroModel>, private Lo
   /// destroy the model.
   void setConnectionHandler(std::function<void(bool isConnected)> connectionChanged);
 
+  /// `changed` is called, while the model lives, when `technology`, `source` or `problem` says
+  /// something else. It runs within the model's operations and must not destroy the model.
+  void setNewsHandler(std::function<void()> changed);
+
+  /// The technology of the display, as the server names it; empty before the first one.
+  [[nodiscard]] const std::string& technology() const noexcept { return _stateOwner.technology(); }
+  /// What the server last said of its source.
+  [[nodiscard]] const LogSourceState& source() const noexcept { return _source; }
+  /// Why the last attempt to connect failed; absent while connected and before the first one.
+  [[nodiscard]] const std::optional<ConnectionProblem>& problem() const noexcept {
+    return _problem;
+  }
+
   /// Whether both ports exist; it does not look whether they still work.
   [[nodiscard]] bool isConnected() const noexcept;
 
@@ -86,16 +99,20 @@ class KestroModel : public std::enable_shared_from_this<KestroModel>, private Lo
   void channelStarted() override;
   void channelStops() override;
   void connectionChanged(bool isConnected) override;
+  void sourceTold(const LogSourceState& source) override;
+  void connectionFailed(const ConnectionProblem& problem) override;
   void serverNotified() override;
   [[nodiscard]] std::shared_ptr<const void> keptByRetry() override;
 
   void setGenerator(std::string_view technology);
+  void setProblem(std::optional<ConnectionProblem> problem);
   void logError(std::string_view line);
 
   Platform& _platform;
   std::function<void()> _updateViewControllerFromModel;
   GeneratorFactory _generatorFromTechnology;
   std::function<void(bool isConnected)> _connectionChanged;
+  std::function<void()> _newsChanged;
 
   LogChannelClient _client;
   std::unique_ptr<Timer> _displayUpdateTimer;
@@ -105,6 +122,8 @@ class KestroModel : public std::enable_shared_from_this<KestroModel>, private Lo
   std::unique_ptr<LogGenerator> _logGenerator;
   StateOwner _stateOwner;
   bool _updated = false;
+  LogSourceState _source;
+  std::optional<ConnectionProblem> _problem;
 };
 
 }  // namespace kestro

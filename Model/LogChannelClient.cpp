@@ -22,9 +22,9 @@ LogChannelHandlers LogChannelClient::handlers() {
   LogChannelHandlers result{.received = [this](ByteView message) { _user.messageArrived(message); },
                             .lost = [this] { restart(); },
                             .notified = [this] { serverNotified(); }};
+  result.sourceTold = [this](const LogSourceState& source) { _user.sourceTold(source); };
   if (_watch == ChannelWatch::ByClient) {
     result.followed = [this](std::optional<std::uint64_t> missed) { followed(missed); };
-    result.sourceTold = [this](const LogSourceState& source) { _user.sourceTold(source); };
   }
   return result;
 }
@@ -46,11 +46,13 @@ std::optional<std::chrono::microseconds> LogChannelClient::gap() const {
 
 void LogChannelClient::start() {
   if (_isRunning) return;
-  if (!tryStart()) {
+  const auto problem = tryToConnect();
+  if (problem) {
     stopPorts();
     scheduleRetry();
   }
   tellConnection();
+  if (problem) _user.connectionFailed(*problem);
 }
 
 void LogChannelClient::restart() {
@@ -70,13 +72,15 @@ void LogChannelClient::stopPorts() {
   _ports.close();
 }
 
-bool LogChannelClient::tryStart() {
+std::optional<ConnectionProblem> LogChannelClient::tryToConnect() {
   if (!openPorts()) {
     logError("Could not create the ports necessary");
-    return false;
+    return _ports.problem();
   }
+  _technology.clear();
   requestTechnology();
-  if (!sendStartCommand()) return false;
+  const auto problem = sendStartCommand();
+  if (problem) return problem;
   _isRunning = true;
   _seen = _platform.clock().now();
   if (_watch == ChannelWatch::ByClient) {
@@ -84,7 +88,7 @@ bool LogChannelClient::tryStart() {
         _platform.mainQueue().scheduleRepeating(kChannelCheckInterval, [this] { check(); });
   }
   _user.channelStarted();
-  return true;
+  return std::nullopt;
 }
 
 void LogChannelClient::scheduleRetry() {
@@ -126,23 +130,27 @@ void LogChannelClient::readTechnology(ByteView reply) {
     logError(" ***** Reply to GetTechnology had no answer; cannot configure");
     return;
   }
+  _technology = technology.text();
   _user.technologyAnswered(technology.text());
 }
 
-bool LogChannelClient::sendStartCommand() {
+std::optional<ConnectionProblem> LogChannelClient::sendStartCommand() {
+  using Kind = ConnectionProblem::Kind;
   const std::optional<Dictionary> command = _user.startCommand();
-  if (!command) return false;
+  if (!command && !_technology.empty()) return ConnectionProblem{Kind::Technology, _technology};
+  const ConnectionProblem noAnswer{Kind::NoAnswer};
+  if (!command) return noAnswer;
   const auto message = _platform.propertyListCoding().xml(*command);
   if (!message) {
     logError(" Could not generate PLIST");
-    return false;
+    return noAnswer;
   }
   const SendError error = _ports.send(*message);
-  if (error == SendError::None) return true;
+  if (error == SendError::None) return std::nullopt;
   _platform.systemLog().log(LogPriority::Error,
                             " ***** Could not send the START command (got error={})",
                             static_cast<int>(error));
-  return false;
+  return noAnswer;
 }
 
 void LogChannelClient::serverNotified() {

@@ -6,6 +6,7 @@
 #include <cstdint>
 #include <memory>
 #include <optional>
+#include <string>
 #include <string_view>
 
 #include "Model/LogChannelPorts.h"
@@ -58,8 +59,11 @@ class LogChannelUser {
                                std::optional<std::uint64_t> /*missed*/) {}
 
   /// What the server says of its source: with each channel, before its technology, and when it
-  /// changes. Only with `ChannelWatch::ByClient`.
+  /// changes.
   virtual void sourceTold(const LogSourceState& /*source*/) {}
+
+  /// An attempt to connect has failed; the next one comes by itself.
+  virtual void connectionFailed(const ConnectionProblem& /*problem*/) {}
 
   /// The telephony server has something to tell; only with `ChannelWatch::ByUser`.
   virtual void serverNotified() {}
@@ -115,11 +119,11 @@ class LogChannelClient {
 
  private:
   void stopPorts();
-  [[nodiscard]] bool tryStart();
   [[nodiscard]] LogChannelHandlers handlers();
   void followed(std::optional<std::uint64_t> missed);
   void readTechnology(ByteView reply);
-  [[nodiscard]] bool sendStartCommand();
+  [[nodiscard]] std::optional<ConnectionProblem> sendStartCommand();
+  [[nodiscard]] std::optional<ConnectionProblem> tryToConnect();
   void scheduleRetry();
   void serverNotified();
   void tellConnection();
@@ -133,6 +137,7 @@ class LogChannelClient {
   std::unique_ptr<Timer> _checkTimer;
   bool _isRunning = false;
   bool _toldConnected = false;
+  std::string _technology;      ///< as the server answered last
   std::optional<Moment> _seen;  ///< when there was a channel for the last time
 };
 

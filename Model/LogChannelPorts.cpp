@@ -34,6 +34,9 @@ bool LogChannelPorts::open() {
   if (!uuid) return false;
   const std::string name = fmt::format("KestroApp.{}", *uuid);
   createLocalPort(name);
+  const std::string unusable = _platform.messagePorts().problem();
+  _problem = unusable.empty() ? ConnectionProblem{}
+                              : ConnectionProblem{ConnectionProblem::Kind::Ports, unusable};
   if (!createRemotePort(name)) return false;
   _platform.systemLog().log(LogPriority::Error, " ***** Created ports (send={}, recv={})",
                             addressText(_sendPort.get()), addressText(_recvPort.get()));
@@ -67,6 +70,7 @@ bool LogChannelPorts::createRemotePort(std::string_view localPortName) {
     _platform.systemLog().log(
         LogPriority::Error, "_TqServerConnectionNetworkMonitorCreateLogChannel returns error: {}!",
         channel.error);
+    _problem = {ConnectionProblem::Kind::NoChannel, std::to_string(channel.error)};
     return false;
   }
   if (!channel.portName || channel.portName->empty()) {

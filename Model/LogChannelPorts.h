@@ -10,6 +10,7 @@
 #include <string>
 #include <string_view>
 
+#include "Model/ConnectionProblem.h"
 #include "Platform/Bytes.h"
 #include "Platform/Clock.h"
 #include "Platform/LogSourceState.h"
@@ -51,6 +52,8 @@ class LogChannelPorts {
   /// Opens the local port, the log channel and the remote port to it; false when one is missing.
   /// What went wrong has its line in the system log, and ports that were opened stay open.
   bool open();
+  /// Why `open` failed.
+  [[nodiscard]] const ConnectionProblem& problem() const noexcept { return _problem; }
   /// Closes the ports, as far as there are any; no handler runs.
   void close();
 
@@ -80,6 +83,7 @@ class LogChannelPorts {
   std::shared_ptr<LocalPort> _recvPort;
   std::shared_ptr<RemotePort> _sendPort;
   SourceTimes _sourceTimes;
+  ConnectionProblem _problem;
   std::string _channelPort;  ///< of the last channel that there was
 };
 

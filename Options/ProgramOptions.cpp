@@ -11,6 +11,9 @@
 namespace kestro {
 namespace {
 
+constexpr double kSlowestPlayback = 0.001;
+constexpr double kFastestPlayback = 1e6;
+
 std::string portNameProblem(const std::string& name) {
   if (isPortName(name)) return "";
   return fmt::format("'{}' is no port name (1 to 64 letters, digits, '.', '-', '_')", name);
@@ -19,6 +22,9 @@ std::string portNameProblem(const std::string& name) {
 }  // namespace
 
 std::vector<OptionRow> liveOptions(LiveOptions& options) {
+  OptionRow speed = speedOption(options.demoSpeed);
+  OptionRow loop = loopOption(options.demoLoops);
+  speed.needs = loop.needs = "--demo";
   return {
       portNameOption("--server", "The telephony server's port", options.serverName),
       {.name = "--demo",
@@ -28,8 +34,22 @@ std::vector<OptionRow> liveOptions(LiveOptions& options) {
        .target = &options.demoSource,
        .impliedValue = kDefaultDemoSource,
        .excludes = "--server"},
+      std::move(speed),
+      std::move(loop),
       logPriorityOption(options.logThreshold),
   };
+}
+
+OptionRow speedOption(double& speed) {
+  return {.name = "--speed",
+          .value = "X",
+          .help = "Seconds of the source in one second",
+          .target = &speed,
+          .range = NumberRange{kSlowestPlayback, kFastestPlayback}};
+}
+
+OptionRow loopOption(bool& loops) {
+  return {.name = "--loop", .help = "Begin again when the source has ended", .target = &loops};
 }
 
 OptionRow logPriorityOption(LogPriority& threshold) {

@@ -16,10 +16,13 @@ namespace kestro {
 struct LiveOptions {
   std::string serverName = "TelephonyServer";  ///< a port's name
   std::string demoSource;                      ///< empty: no demo
+  double demoSpeed = 1;                        ///< seconds of its source in one second
+  bool demoLoops = false;
   LogPriority logThreshold = LogPriority::Notice;
 };
 
-/// --server, --demo, which excludes it, and --log-priority. `options` holds the defaults.
+/// --server, --demo, which excludes it, --speed and --loop of the demo, and --log-priority.
+/// `options` holds the defaults.
 [[nodiscard]] std::vector<OptionRow> liveOptions(LiveOptions& options);
 
 /// The numbers of the priorities that can be asked for.
@@ -28,6 +31,10 @@ inline constexpr NumberRange kLogPriorities{static_cast<double>(LogPriority::Err
 
 /// --log-priority: the number of a LogPriority.
 [[nodiscard]] OptionRow logPriorityOption(LogPriority& threshold);
+
+/// --speed and --loop of what plays a source.
+[[nodiscard]] OptionRow speedOption(double& speed);
+[[nodiscard]] OptionRow loopOption(bool& loops);
 
 /// The name of a port.
 [[nodiscard]] OptionRow portNameOption(std::string name, std::string help, std::string& portName);

@@ -14,6 +14,13 @@ namespace kestro {
 /// What a demo plays unless told otherwise.
 inline constexpr const char* kDefaultDemoSource = "simulation";
 
+/// What a demo plays, and how.
+struct DemoOptions {
+  std::string source = kDefaultDemoSource;
+  double speed = 1;  ///< seconds of the source in one second
+  bool loops = false;
+};
+
 /// A telephony server with a source, on a port directory that nobody else uses. It ends with this
 /// object, or with this process, however that ends.
 class DemoServer {

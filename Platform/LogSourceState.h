@@ -21,6 +21,13 @@ struct LogSourceState {
   friend bool operator==(const LogSourceState&, const LogSourceState&) = default;
 };
 
+/// What a person is told of a source: "simulation", "capture drive.pcap", "drive-test a.csv,
+/// simulated"; empty when the server says nothing of it.
+[[nodiscard]] std::string sourceText(const LogSourceState& state);
+
+/// What a person is told when it has ended: "the recording has ended".
+[[nodiscard]] std::string sourceEndedText(const LogSourceState& state);
+
 /// Adds what is known to the server's answer or notification.
 void addSourceState(const LogSourceState& state, Dictionary& body);
 

@@ -7,6 +7,7 @@
 #include <functional>
 #include <memory>
 #include <optional>
+#include <string>
 #include <string_view>
 
 #include "Platform/Bytes.h"
@@ -123,6 +124,10 @@ class MessagePorts {
   /// Connects to somebody's local port; null when nobody owns that name, or (with a log line) when
   /// it cannot be connected to: it is another user's, or a symbolic link.
   [[nodiscard]] virtual std::shared_ptr<RemotePort> createRemotePort(std::string_view name) = 0;
+
+  /// Why no port could be made when one was last asked for, whatever its name, as one line for a
+  /// person; empty when that was not the reason.
+  [[nodiscard]] virtual std::string problem() const { return {}; }
 };
 
 }  // namespace kestro

@@ -8,6 +8,9 @@
 
 namespace kestro {
 
+/// The name of the server's port unless another is asked for.
+inline constexpr std::string_view kDefaultServerName = "TelephonyServer";
+
 /// The messages, by id. Bodies are XML property lists (a dictionary) unless said otherwise.
 enum class TelephonyMessage : std::int32_t {
   /// On a channel port: a command; on the client's local port: log data, unparsed.

@@ -13,9 +13,6 @@
 namespace kestro {
 namespace {
 
-constexpr double kSlowestPlayback = 0.001;
-constexpr double kFastestPlayback = 1e6;
-
 std::string indented(std::string_view text, std::string_view indent) {
   std::string result(indent);
   for (const char c : text) {
@@ -56,14 +53,8 @@ std::vector<OptionRow> sourceOptions(ServerArguments& arguments) {
                            fmt::join(technologyChoices(), ", ")),
        .target = &arguments.technology,
        .choices = choicesOf(technologyChoices())},
-      {.name = "--speed",
-       .value = "X",
-       .help = "Seconds of the source in one second",
-       .target = &arguments.options.playback.speed,
-       .range = NumberRange{kSlowestPlayback, kFastestPlayback}},
-      {.name = "--loop",
-       .help = "Begin again when the source has ended",
-       .target = &arguments.options.playback.loop},
+      speedOption(arguments.options.playback.speed),
+      loopOption(arguments.options.playback.loop),
   };
 }
 

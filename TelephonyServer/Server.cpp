@@ -41,6 +41,8 @@ Result<std::unique_ptr<Server>> Server::open(Platform& platform, std::string_vie
   if (platform.messagePorts().createRemotePort(name)) {
     return failure(fmt::format("another server is running: the port name \"{}\" is taken", name));
   }
+  const std::string problem = platform.messagePorts().problem();
+  if (!problem.empty()) return failure(problem);
   return failure(fmt::format("cannot open the port \"{}\"; the system log says why", name));
 }
 

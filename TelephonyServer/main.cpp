@@ -9,7 +9,9 @@
 
 #include "Options/ArgumentParser.h"
 #include "Platform/Linux/LinuxPlatform.h"
+#include "Platform/LogSourceState.h"
 #include "Platform/TextSink.h"
+#include "TelephonyServer/Announcement.h"
 #include "TelephonyServer/DescriptorLimit.h"
 #include "TelephonyServer/EndWithParent.h"
 #include "TelephonyServer/Options.h"
@@ -36,7 +38,9 @@ int serve(LinuxPlatform& platform, const ServerOptions& options) {
     platform.quit(fail(platform, "the server's port was removed"));
   });
   if (!server) return fail(platform, server.error().message);
-  (*server)->setSource(stateOf(options.source, **source));
+  const LogSourceState state = stateOf(options.source, **source);
+  (*server)->setSource(state);
+  report(announcement(state, (*source)->technology(), options.portName));
   Playback playback(std::move(*source), options.playback, platform.mainQueue(), platform.clock(),
                     **server, report);
   platform.setTerminationHandler([&platform] {

@@ -100,7 +100,8 @@ int runLive(const LiveOptions& options, const LiveTaskMaker& makeTask) {
     complain("--demo: " + source.error().message);
     return kExitWrongUsage;
   }
-  const auto demo = startDemoServer(options.demoSource);
+  const auto demo = startDemoServer(
+      {.source = options.demoSource, .speed = options.demoSpeed, .loops = options.demoLoops});
   if (!demo) {
     complain(demo.error().message);
     return kExitNothingDone;

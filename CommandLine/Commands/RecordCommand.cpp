@@ -80,6 +80,7 @@ class RecordTask : public LiveTask {
     }
     if (::isatty(STDERR_FILENO) == 1) _session.tellEveryMinute();
     if (_options.usesSourceTimes) _session.useSourceTimes();
+    _session.setServerName(_options.live.serverName);
     _session.start();
   }
 

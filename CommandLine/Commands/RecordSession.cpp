@@ -167,7 +167,13 @@ void RecordSession::messageArrived(ByteView message) {
 }
 
 void RecordSession::connectionChanged(bool isConnected) {
+  if (isConnected) _toldProblem.reset();
   if (!isConnected && !_isOver) _remark(kConnectingRemark);
+}
+
+void RecordSession::connectionFailed(const ConnectionProblem& problem) {
+  if (_isOver || std::exchange(_toldProblem, problem) == problem) return;
+  _remark(problemText(problem, _serverName));
 }
 
 void RecordSession::fail(const std::string& reason) {

@@ -9,12 +9,14 @@
 #include <optional>
 #include <string>
 #include <string_view>
+#include <utility>
 #include <vector>
 
 #include "Model/LogChannelClient.h"
 #include "Platform/LogSourceState.h"
 #include "Platform/MainQueue.h"
 #include "Platform/Platform.h"
+#include "Platform/TelephonyProtocol.h"
 #include "Recordings/RecordingWriter.h"
 
 namespace kestro {
@@ -39,6 +41,8 @@ class RecordSession : private LogChannelUser {
   void useSourceTimes() noexcept { _usesSourceTimes = true; }
   /// Adds a line to the recording, as a comment of the next message.
   void addNote(std::string_view line);
+  /// What remarks call the server; its default name unless set.
+  void setServerName(std::string name) { _serverName = std::move(name); }
   /// Remarks every minute from now on how much has come.
   void tellEveryMinute();
   /// Writes the notes that no message has followed, and records nothing from now on: what still
@@ -58,6 +62,7 @@ class RecordSession : private LogChannelUser {
   void messageArrived(ByteView message) override;
   void connectionChanged(bool isConnected) override;
   void sourceTold(const LogSourceState& source) override;
+  void connectionFailed(const ConnectionProblem& problem) override;
   void channelFollowed(std::chrono::microseconds gap, std::optional<std::uint64_t> missed) override;
 
   /// Connections that were lost, with messages.
@@ -87,6 +92,8 @@ class RecordSession : private LogChannelUser {
   std::unique_ptr<Timer> _minutes;
   std::uint64_t _toldCount = 0;  ///< of messages, a minute ago
   Losses _losses;
+  std::string _serverName{kDefaultServerName};
+  std::optional<ConnectionProblem> _toldProblem;
   bool _isOver = false;  ///< stopped or failed: nothing is recorded any more
   LogChannelClient _client;
 };

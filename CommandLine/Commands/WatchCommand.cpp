@@ -31,7 +31,8 @@ class WatchTask : public LiveTask {
   WatchTask(const WatchOptions& options, Platform& platform, Finish finish)
       : _finish(std::move(finish)),
         _view(makeView(options)),
-        _session(platform, *_view, options.count, [this] { sessionEnded(); }) {}
+        _session(
+            platform, *_view, options.count, [this] { sessionEnded(); }, options.live.serverName) {}
 
   void start() override { _session.start(); }
   void stop() override { _finish(kExitDone, ""); }
@@ -41,9 +42,7 @@ class WatchTask : public LiveTask {
   static std::unique_ptr<WatchView> makeView(const WatchOptions& options) {
     const auto& formats = watchFormats();
     const auto format = std::ranges::find(formats, options.format, &WatchFormat::name);
-    return format->makeView("Kestro · " + (options.live.demoSource.empty()
-                                               ? options.live.serverName
-                                               : "demo " + options.live.demoSource));
+    return format->makeView(options.live.demoSource.empty() ? options.live.serverName : "demo");
   }
 
   void sessionEnded() {

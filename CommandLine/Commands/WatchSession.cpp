@@ -4,7 +4,9 @@
 #include <string>
 #include <utility>
 
+#include "Model/ConnectionProblem.h"
 #include "Platform/Clock.h"
+#include "Platform/LogSourceState.h"
 
 namespace kestro {
 namespace {
@@ -14,11 +16,13 @@ constexpr const char* kConnecting = "Connecting...";
 }  // namespace
 
 WatchSession::WatchSession(Platform& platform, WatchView& view,
-                           std::optional<std::uint64_t> refreshLimit, std::function<void()> ended)
+                           std::optional<std::uint64_t> refreshLimit, std::function<void()> ended,
+                           std::string serverName)
     : _platform(platform),
       _view(view),
       _refreshLimit(refreshLimit),
       _ended(std::move(ended)),
+      _serverName(std::move(serverName)),
       _updateMessage(kConnecting),
       _self(std::make_shared<WatchSession*>(this)),
       _model(KestroModel::create(platform, [weak = std::weak_ptr(_self)] {
@@ -27,6 +31,9 @@ WatchSession::WatchSession(Platform& platform, WatchView& view,
   _state.status = kConnecting;
   _model->setConnectionHandler([weak = std::weak_ptr(_self)](bool) {
     if (const auto session = weak.lock()) (*session)->connectionChanged();
+  });
+  _model->setNewsHandler([weak = std::weak_ptr(_self)] {
+    if (const auto session = weak.lock()) (*session)->updateOrigin();
   });
 }
 
@@ -58,7 +65,25 @@ void WatchSession::refresh() {
 void WatchSession::connectionChanged() {
   const std::string before = _state.status;
   updateStatus();
+  updateOrigin();
   if (_state.status != before) redraw();
+}
+
+void WatchSession::updateOrigin() {
+  if (_isOver) return;
+  const LogSourceState& source = _model->source();
+  const bool hasEnded = source.hasEnded.value_or(false);
+  _state.technology = _model->technology();
+  _state.source = sourceText(source);
+  _state.isRenewed = _model->isConnected() && !hasEnded;
+  _state.notice.clear();
+  if (_model->problem()) {
+    _state.notice = problemText(*_model->problem(), _serverName);
+  } else if (_model->isConnected() && hasEnded) {
+    _state.notice = sourceEndedText(source);
+  }
+  _view.noticed(_state);
+  endIfOver();
 }
 
 void WatchSession::updateStatus() {

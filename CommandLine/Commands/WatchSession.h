@@ -6,10 +6,12 @@
 #include <functional>
 #include <memory>
 #include <optional>
+#include <string>
 
 #include "CommandLine/Terminal/WatchView.h"
 #include "Model/KestroModel.h"
 #include "Platform/Platform.h"
+#include "Platform/TelephonyProtocol.h"
 
 namespace kestro {
 
@@ -19,8 +21,10 @@ class WatchSession {
  public:
   /// `view` and `platform` must outlive the session. After `refreshLimit` refreshes, or when the
   /// view has failed, nothing more is shown, and `ended` is called once.
+  /// `serverName` is the port that is connected to.
   WatchSession(Platform& platform, WatchView& view, std::optional<std::uint64_t> refreshLimit,
-               std::function<void()> ended);
+               std::function<void()> ended,
+               std::string serverName = std::string(kDefaultServerName));
 
   /// Shows the status and begins to connect.
   void start();
@@ -31,12 +35,14 @@ class WatchSession {
   void refresh();
   void connectionChanged();
   void updateStatus();
+  void updateOrigin();
   void endIfOver();
 
   Platform& _platform;
   WatchView& _view;
   std::optional<std::uint64_t> _refreshLimit;
   std::function<void()> _ended;
+  std::string _serverName;
   bool _isOver = false;
   std::uint64_t _refreshCount = 0;
   std::string _updateMessage = "Connecting...";

@@ -5,6 +5,7 @@
 #include <utility>
 
 #include "CommandLine/Formats/DisplayFormats.h"
+#include "CommandLine/Formats/DisplayText.h"
 #include "CommandLine/Terminal/FullScreen.h"
 #include "CommandLine/Terminal/TerminalView.h"
 
@@ -21,6 +22,11 @@ class TextView : public WatchView {
   }
   [[nodiscard]] bool readerIsGone() const override { return _output.readerIsGone(); }
 
+  void noticed(const WatchState& state) override {
+    if (std::exchange(_notice, state.notice) == state.notice || state.notice.empty()) return;
+    complain(displayText(state.notice));
+  }
+
  protected:
   void write(std::string_view text) {
     _output.write(text);
@@ -29,6 +35,7 @@ class TextView : public WatchView {
 
  private:
   Output _output;
+  std::string _notice;
 };
 
 class PlainView : public TextView {
@@ -36,7 +43,11 @@ class PlainView : public TextView {
   using TextView::TextView;
 
   void refreshed(const WatchState& state) override {
-    std::string text = state.status + "\n\n";
+    std::string text = state.status;
+    for (const std::string& origin : {state.technology, state.source}) {
+      if (!origin.empty()) text += " · " + displayText(origin);
+    }
+    text += "\n\n";
     appendPlainTree(text, *state.tree);
     write(text + "\n");
   }
@@ -58,26 +69,31 @@ class NdjsonView : public TextView {
 /// The live display in the terminal's window.
 class FullScreenView : public WatchView {
  public:
-  explicit FullScreenView(std::string title) : _title(std::move(title)) {}
+  explicit FullScreenView(std::string place) : _place(std::move(place)) {}
 
   void refreshed(const WatchState& state) override { draw(state); }
   void changed(const WatchState& state) override { draw(state); }
+  void noticed(const WatchState& state) override { draw(state); }
 
  private:
   void draw(const WatchState& state) {
-    _screen.draw(terminalView({.title = _title,
+    _screen.draw(terminalView({.technology = state.technology,
+                               .source = state.source,
+                               .place = _place,
                                .status = state.status,
+                               .notice = state.notice,
                                .tree = state.tree.get(),
-                               .previous = state.previous.get()},
+                               .previous = state.previous.get(),
+                               .isRenewed = state.isRenewed},
                               _screen.size()));
   }
 
-  std::string _title;
+  std::string _place;
   FullScreen _screen;
 };
 
-std::unique_ptr<WatchView> makeTreeView(const std::string& title) {
-  if (FullScreen::isPossible()) return std::make_unique<FullScreenView>(title);
+std::unique_ptr<WatchView> makeTreeView(const std::string& place) {
+  if (FullScreen::isPossible()) return std::make_unique<FullScreenView>(place);
   return makePlainView(Output::standardOutput());
 }
 

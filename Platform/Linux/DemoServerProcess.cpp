@@ -117,7 +117,7 @@ class DemoServerProcess final : public DemoServer {
   DemoServerProcess(const DemoServerProcess&) = delete;
   DemoServerProcess& operator=(const DemoServerProcess&) = delete;
 
-  [[nodiscard]] Result<void> start(const std::string& source);
+  [[nodiscard]] Result<void> start(const DemoOptions& options);
 
   [[nodiscard]] const std::string& portDirectory() const noexcept override { return _directory; }
   [[nodiscard]] std::unique_ptr<Timer> watch(
@@ -135,11 +135,12 @@ class DemoServerProcess final : public DemoServer {
   pid_t _process = -1;  ///< -1 before it runs and after it has ended
 };
 
-Result<void> DemoServerProcess::start(const std::string& source) {
+Result<void> DemoServerProcess::start(const DemoOptions& options) {
   const std::string program = serverProgram();
-  std::vector<std::string> arguments{program, "--source=" + source,
-                                     fmt::format("--exit-with-parent={}", ::getpid()),
-                                     "--demo-directory=" + _directory};
+  std::vector<std::string> arguments{
+      program, "--source=" + options.source, fmt::format("--speed={}", options.speed),
+      fmt::format("--exit-with-parent={}", ::getpid()), "--demo-directory=" + _directory};
+  if (options.loops) arguments.emplace_back("--loop");
   std::vector<std::string> environment = environmentWithPortDirectory(_directory);
   const SpawnSettings settings(logPath());
   const int error =
@@ -206,11 +207,11 @@ void DemoServerProcess::removeDirectory() noexcept {
 
 }  // namespace
 
-Result<std::unique_ptr<DemoServer>> startDemoServer(const std::string& source) {
+Result<std::unique_ptr<DemoServer>> startDemoServer(const DemoOptions& options) {
   auto directory = makeDirectory();
   if (!directory) return tl::unexpected(directory.error());
   auto server = std::make_unique<DemoServerProcess>(*std::move(directory));
-  if (auto started = server->start(source); !started) return tl::unexpected(started.error());
+  if (auto started = server->start(options); !started) return tl::unexpected(started.error());
   return server;
 }
 

@@ -57,7 +57,7 @@ class LinuxPlatform : public Platform {
 /// Starts a kestro-telephonyd process, which is looked for beside this program and then in PATH, on
 /// a fresh port directory (0700). Call it on the main thread. The error says why it could not be
 /// started.
-[[nodiscard]] Result<std::unique_ptr<DemoServer>> startDemoServer(const std::string& source);
+[[nodiscard]] Result<std::unique_ptr<DemoServer>> startDemoServer(const DemoOptions& options);
 
 /// Opens those of the descriptors 0, 1 and 2 that are closed on the null device, so that no file
 /// that is opened later becomes one of them and gets lines that were not meant for it. Call it

@@ -26,11 +26,13 @@ class UnixMessagePorts final : public MessagePorts {
   [[nodiscard]] std::shared_ptr<LocalPort> createLocalPort(std::string_view name,
                                                            ReceiveHandler handler) override;
   [[nodiscard]] std::shared_ptr<RemotePort> createRemotePort(std::string_view name) override;
+  [[nodiscard]] std::string problem() const override { return _problem; }
 
  private:
   std::nullptr_t refuse(std::string_view what, std::string_view name, std::string_view reason);
 
   std::string _directory;
+  std::string _problem;  ///< with the directory, when it was last opened
   bool _tidied = false;  ///< whether the directory has been rid of dead owners' files
   std::shared_ptr<PortContext> _context;
 };
@@ -46,6 +48,7 @@ std::shared_ptr<LocalPort> UnixMessagePorts::createLocalPort(std::string_view na
   constexpr std::string_view kWhat = "open";
   if (!isPortName(name)) return refuse(kWhat, name, "this is no port name");
   const auto directory = PortDirectory::openOrMake(_directory);
+  _problem = directory ? "" : directory.error().message;
   if (!directory) return refuse(kWhat, name, directory.error().message);
   if (!std::exchange(_tidied, true)) directory->removeDeadOwners();
   auto listener = directory->listen(std::string(name));
@@ -58,6 +61,7 @@ std::shared_ptr<RemotePort> UnixMessagePorts::createRemotePort(std::string_view 
   constexpr std::string_view kWhat = "connect";
   if (!isPortName(name)) return refuse(kWhat, name, "this is no port name");
   const auto directory = PortDirectory::openExisting(_directory);
+  _problem = directory ? "" : directory.error().message;
   if (!directory) return refuse(kWhat, name, directory.error().message);
   if (!*directory) return nullptr;
   auto socket = (*directory)->connect(std::string(name));

@@ -105,8 +105,11 @@ Result<PortDirectory> PortDirectory::openOrMake(const std::string& path) {
 Result<std::optional<PortDirectory>> PortDirectory::openExisting(const std::string& path) {
   FileDescriptor descriptor(::open(path.c_str(), O_RDONLY | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC));
   if (!descriptor.isOpen()) {
-    if (errno == ENOENT) return std::nullopt;
-    return unusable(path, reason(errno));
+    const int error = errno;
+    if (error == ENOENT) return std::nullopt;
+    struct stat file {};
+    const bool isLink = ::lstat(path.c_str(), &file) == 0 && S_ISLNK(file.st_mode);
+    return unusable(path, isLink ? "it is a symbolic link" : reason(error));
   }
   if (const auto check = checkIsPrivate(descriptor.get()); !check) {
     return unusable(path, check.error().message);

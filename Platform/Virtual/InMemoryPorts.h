@@ -41,6 +41,9 @@ class InMemoryPorts : public MessagePorts {
                                                            ReceiveHandler handler) override;
   [[nodiscard]] std::shared_ptr<RemotePort> createRemotePort(std::string_view name) override;
 
+  [[nodiscard]] std::string problem() const override { return _problem; }
+  void setProblem(std::string problem) { _problem = std::move(problem); }
+
   /// The same ports as another process sees them, for as long as this object lives.
   [[nodiscard]] std::unique_ptr<MessagePorts> portsOf(ProcessNumber process);
 
@@ -70,6 +73,7 @@ class InMemoryPorts : public MessagePorts {
   [[nodiscard]] std::shared_ptr<Local> find(std::string_view name) const;
 
   VirtualMainQueue& _queue;
+  std::string _problem;
   Failures _failures;
   std::map<std::string, std::weak_ptr<Local>, std::less<>> _ports;
 };

@@ -94,6 +94,8 @@ TEST_F(LiveTest, RecordWithoutAServerHasDoneNothing) {
   const auto record = start({"kestro-cli", "record", "-o", "/tmp/never", "--duration=0.2"});
   EXPECT_EQ(record->wait(), 1);
   EXPECT_EQ(record->errors(),
+            "kestro-cli: no telephony server \"TelephonyServer\" is running: start "
+            "kestro-telephonyd, or use --demo\n"
             "kestro-cli: connecting...\n"
             "kestro-cli: nothing was recorded: no telephony server could be connected to\n");
 }
@@ -146,6 +148,52 @@ TEST_F(LiveTest, AGarbageDisplayListEndsWatchWithItsName) {
   EXPECT_THAT(watch->errors(),
               HasSubstr("kestro-cli: ended by a failure: Could not deserialize the object "
                         "(LogGenerator/GSM/GSMLogGenerator, line 90)\n"));
+}
+
+TEST_F(LiveTest, WatchWithoutAServerSaysWhatHelps) {
+  for (const char* format : {"--format=tree", "--format=ndjson"}) {
+    const auto watch = start({"kestro-cli", "watch", format, "--server=Other"});
+    ASSERT_TRUE(watch->waitUntil([&] { return watch->errors().ends_with("use --demo\n"); }));
+    EXPECT_EQ(watch->errors(),
+              "kestro-cli: no telephony server \"Other\" is running: start kestro-telephonyd "
+              "--name=Other, or use --demo\n");
+  }
+}
+
+TEST_F(LiveTest, ABadPortDirectoryIsNamedWhereOneLooks) {
+  const std::string directory = source.directory() + "/ports";
+  std::filesystem::create_directory(directory);
+  std::filesystem::permissions(directory, std::filesystem::perms(0755));
+  const std::string problem =
+      "port directory " + directory + ": its mode is 0755, group and others must have no access\n";
+  const std::string recording = source.directory() + "/recording.pcap";
+  for (const std::vector<std::string>& command : std::vector<std::vector<std::string>>{
+           {"kestro-cli", "watch"}, {"kestro-cli", "record", "-o", recording}}) {
+    const auto live = start(command);
+    EXPECT_TRUE(live->waitUntil([&] {
+      return live->errors().find("kestro-cli: " + problem) != std::string::npos;
+    })) << live->errors();
+  }
+  const auto telephonyd = start({"kestro-telephonyd"});
+  EXPECT_EQ(telephonyd->wait(), 1);
+  EXPECT_EQ(telephonyd->errors(), "kestro-telephonyd: " + problem);
+}
+
+TEST_F(LiveTest, TheServerSaysWhatItPlaysAndHowToWatchIt) {
+  startServer();
+  ASSERT_TRUE(server->waitUntil([&] { return !server->errors().empty(); }));
+  EXPECT_EQ(server->errors(),
+            "kestro-telephonyd: playing capture source.pcap as IFX, under the name "
+            "TelephonyServer; watch it with `kestro` or `kestro-cli watch`\n");
+}
+
+TEST_F(LiveTest, WatchSaysWhereItsDisplaysComeFromAndWhenThatHasEnded) {
+  // 200 s of messages, a hundred times as fast.
+  const auto watch =
+      start({"kestro-cli", "watch", "--demo=capture:" + source.path(), "--speed=100"});
+  ASSERT_TRUE(watch->waitForOutput(" · IFX · capture source.pcap\n\n"));
+  ASSERT_TRUE(watch->waitUntil([&] { return !watch->errors().empty(); }));
+  EXPECT_EQ(watch->errors(), "kestro-cli: the recording has ended\n");
 }
 
 TEST_F(LiveTest, AReaderThatGoesAwayEndsWatchQuietly) {

@@ -85,7 +85,21 @@ TEST_F(TerminalTest, AnotherWindowSizeIsFollowedAtOnce) {
   watch->forgetOutput();
   watch->resize(60, 10);
   // The title line fills the new width: 60 cells with the status at the right end.
-  ASSERT_TRUE(watch->waitForOutput("\033[7m Kestro · TelephonyServer    Updated "));
+  ASSERT_TRUE(watch->waitForOutput("\033[7m IFX · capture source.pcap   Updated "));
+}
+
+TEST_F(TerminalTest, WithoutAServerTheScreenSaysWhatHelps) {
+  watch = start({"kestro-cli", "watch"}, Process::Terminal::Own);
+  ASSERT_TRUE(watch->waitForOutput("no telephony server"));
+  EXPECT_THAT(watch->output(), HasSubstr("start kestro-telephonyd, or use --demo"));
+}
+
+TEST_F(TerminalTest, ValuesOfASourceThatHasEndedAreFaint) {
+  watch = start({"kestro-cli", "watch", "--demo=capture:" + source.path(), "--speed=100"},
+                Process::Terminal::Own);
+  ASSERT_TRUE(watch->waitForOutput("the recording has ended"));
+  ASSERT_TRUE(watch->waitForOutput("\033[2mCount  "));
+  EXPECT_THAT(watch->output(), HasSubstr(" Kestro · IFX · capture source.pcap · demo "));
 }
 
 TEST_F(TerminalTest, WithoutATerminalTypeItPrintsPlainly) {

@@ -416,10 +416,11 @@ TEST_F(LogChannelClientTest, TellsWhatTheServerSaysOfItsSource) {
   EXPECT_THAT(user.sources, SizeIs(2));
 }
 
-TEST_F(LogChannelClientTest, WhoWatchesItsChannelItselfIsToldNothingOfTheSource) {
+TEST_F(LogChannelClientTest, WhoWatchesItsChannelItselfIsToldOfTheSourceToo) {
   startClient(ChannelWatch::ByUser);
+  user.sources.clear();
   platform.telephonyService().notifySource({.isSimulated = true});
-  EXPECT_THAT(user.sources, IsEmpty());
+  EXPECT_THAT(user.sources, ElementsAre(LogSourceState{.isSimulated = true}));
 }
 
 TEST_F(LogChannelClientTest, KnowsTheSourcesTimeOfAMessageThatCameWithOne) {

@@ -65,5 +65,15 @@ TEST(ProgramOptionsTest, TheVersionIsTheBundles) {
             "program 1.2.3\n");
 }
 
+TEST(ProgramOptionsTest, ADemoHasASpeedAndMayLoop) {
+  LiveOptions options;
+  const CommandRow program = programOf(liveOptions(options));
+  EXPECT_EQ(refusal(program, {"--speed=2"}), "--speed requires --demo");
+  EXPECT_EQ(refusal(program, {"--loop"}), "--loop requires --demo");
+  chosen(program, {"--demo", "--speed=2", "--loop"});
+  EXPECT_EQ(options.demoSpeed, 2);
+  EXPECT_TRUE(options.demoLoops);
+}
+
 }  // namespace
 }  // namespace kestro

@@ -21,6 +21,9 @@ using ::testing::EndsWith;
 using testing::FileSizeLimit;
 using ::testing::IsEmpty;
 
+constexpr const char* kNoServer =
+    "no telephony server \"TelephonyServer\" is running: start kestro-telephonyd, or use --demo";
+
 class RecordSessionTest : public testing::LogChannelFixture {
  protected:
   RecordSessionTest() { platform.clock().setNow(Moment(1'330'866'000s)); }
@@ -135,7 +138,7 @@ TEST_F(RecordSessionTest, GoesOnAfterALostConnection) {
   queue().advance(5s);
   send(testing::bytesOf("b"));
   EXPECT_THAT(messagesIn(file.path()), ElementsAre("IFX: 0, a", "IFX: 8, b"));
-  EXPECT_THAT(remarks, ElementsAre("recording IFX to " + file.path(), "connecting...",
+  EXPECT_THAT(remarks, ElementsAre("recording IFX to " + file.path(), "connecting...", kNoServer,
                                    "recording IFX to " + file.path()));
 }
 
@@ -224,7 +227,7 @@ TEST_F(RecordSessionTest, WithoutAServerThereIsNoFile) {
   platform.telephonyService().setReachable(false);
   start(file.path());
   queue().advance(60s);
-  EXPECT_THAT(remarks, ElementsAre("connecting..."));
+  EXPECT_THAT(remarks, ElementsAre(kNoServer, "connecting..."));
   EXPECT_EQ(session->summary(), std::nullopt);
   EXPECT_FALSE(std::filesystem::exists(file.path()));
 }

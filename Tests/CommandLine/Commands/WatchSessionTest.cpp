@@ -188,5 +188,65 @@ TEST_F(WatchSessionTest, ARetryThatOutlivesItEndsWithoutAChannel) {
   EXPECT_THAT(platform.messagePorts().names(), ElementsAre("Channel"));
 }
 
+/// Keeps what it is told of the display's origin.
+class OriginView : public RecordingView {
+ public:
+  void noticed(const WatchState& state) override {
+    origins.push_back(state.technology + "|" + state.source + "|" + state.notice + "|" +
+                      (state.isRenewed ? "renewed" : "kept"));
+  }
+  std::vector<std::string> origins;
+};
+
+class WatchOriginTest : public WatchSessionTest {
+ protected:
+  void start() {
+    session.emplace(
+        platform, originView, std::nullopt, [] {}, "Other");
+    session->start();
+  }
+  std::string lastOrigin() { return originView.origins.empty() ? "" : originView.origins.back(); }
+
+  OriginView originView;
+};
+
+TEST_F(WatchOriginTest, TellsTheTechnologyAndTheSource) {
+  channelReply.source = {.kind = "capture", .name = "/x/a.pcap", .isSimulated = false};
+  start();
+  EXPECT_EQ(lastOrigin(), "IFX|capture a.pcap||renewed");
+}
+
+TEST_F(WatchOriginTest, TellsThatTheSourceHasEnded) {
+  channelReply.source = {.kind = "capture", .name = "/x/a.pcap"};
+  start();
+  LogSourceState ended = channelReply.source;
+  ended.hasEnded = true;
+  platform.telephonyService().notifySource(ended);
+  EXPECT_EQ(lastOrigin(), "IFX|capture a.pcap|the recording has ended|kept");
+}
+
+TEST_F(WatchOriginTest, TellsWhatIsMissingAfterTheFirstAttempt) {
+  platform.telephonyService().setReachable(false);
+  start();
+  EXPECT_EQ(lastOrigin(),
+            "||no telephony server \"Other\" is running: start kestro-telephonyd --name=Other, or "
+            "use --demo|kept");
+  originView.origins.clear();
+  queue().advance(60s);
+  EXPECT_THAT(originView.origins, IsEmpty());
+  platform.telephonyService().setReachable(true);
+  queue().advance(5s);
+  EXPECT_EQ(lastOrigin(), "IFX|||renewed");
+}
+
+TEST_F(WatchOriginTest, ALostConnectionKeepsTheOriginAndRenewsNothing) {
+  channelReply.source = {.kind = "simulation", .isSimulated = true};
+  start();
+  loseServer();
+  queue().advance(2s);
+  EXPECT_THAT(lastOrigin(), ::testing::StartsWith("IFX|simulation|no telephony server"));
+  EXPECT_THAT(lastOrigin(), ::testing::EndsWith("|kept"));
+}
+
 }  // namespace
 }  // namespace kestro

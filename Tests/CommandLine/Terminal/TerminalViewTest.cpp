@@ -9,8 +9,10 @@ namespace kestro {
 namespace {
 
 using ::testing::ElementsAre;
+using ::testing::IsEmpty;
 using testing::screenOf;
 using ::testing::SizeIs;
+using ::testing::StartsWith;
 using testing::textsInStyle;
 using testing::treeOf;
 
@@ -18,9 +20,7 @@ constexpr const char* kUpdated = "Updated 2012-03-04 at 13:05:09";
 
 std::vector<StyledLine> view(const NodePointer& tree, TerminalSize size,
                              const NodePointer& previous = nullptr) {
-  return terminalView(
-      {.title = "Kestro", .status = kUpdated, .tree = tree.get(), .previous = previous.get()},
-      size);
+  return terminalView({.status = kUpdated, .tree = tree.get(), .previous = previous.get()}, size);
 }
 
 Dictionary section(int values) {
@@ -30,12 +30,12 @@ Dictionary section(int values) {
 }
 
 TEST(TerminalView, BeforeTheFirstDataThereIsTheTitleLineAlone) {
-  EXPECT_EQ(screenOf(terminalView({.title = "Kestro", .status = "Connecting..."}, {30, 5})),
+  EXPECT_EQ(screenOf(terminalView({.status = "Connecting..."}, {30, 5})),
             " Kestro         Connecting...\n");
 }
 
 TEST(TerminalView, TheTitleLineFillsTheWidth) {
-  const auto lines = terminalView({.title = "Kestro", .status = "Connecting..."}, {30, 5});
+  const auto lines = terminalView({.status = "Connecting..."}, {30, 5});
   ASSERT_THAT(lines, SizeIs(1));
   EXPECT_EQ(lines[0].width(), 30U);
   EXPECT_THAT(textsInStyle(lines, TextStyle::Bar), ElementsAre(" Kestro         Connecting... "));
@@ -106,10 +106,8 @@ TEST(TerminalView, ATreeThatJustFitsIsNotCut) {
 }
 
 TEST(TerminalView, ANarrowWindowShowsTheStatusRatherThanTheTitle) {
-  EXPECT_EQ(screenOf(terminalView({.title = "Kestro", .status = "Connecting..."}, {20, 1})),
-            "      Connecting...\n");
-  EXPECT_EQ(screenOf(terminalView({.title = "Kestro", .status = "Connecting..."}, {10, 1})),
-            "Connectin…\n");
+  EXPECT_EQ(screenOf(terminalView({.status = "Connecting..."}, {20, 1})), "      Connecting...\n");
+  EXPECT_EQ(screenOf(terminalView({.status = "Connecting..."}, {10, 1})), "Connectin…\n");
 }
 
 TEST(TerminalView, LongValuesAreCutAtTheWindow) {
@@ -135,6 +133,46 @@ TEST(TerminalView, NoWindowIsTooSmall) {
       for (const StyledLine& line : lines) ASSERT_LE(line.width(), columns);
     }
   }
+}
+
+TEST(TerminalView, TheTitleSaysAsMuchOfTheOriginAsFits) {
+  const auto title = [](std::size_t columns) {
+    const auto lines = terminalView(
+        {.technology = "LTE", .source = "capture a.pcap", .place = "Server", .status = kUpdated},
+        {columns, 1});
+    const std::string text = lines[0].plainText();
+    return text.substr(0, text.find("  Updated"));
+  };
+  EXPECT_THAT(title(80), StartsWith(" Kestro · LTE · capture a.pcap · Server "));
+  EXPECT_EQ(title(72), " Kestro · LTE · capture a.pcap · Server");
+  EXPECT_EQ(title(71), " Kestro · LTE · capture a.pcap        ");
+  EXPECT_EQ(title(63), " Kestro · LTE · capture a.pcap");
+  EXPECT_EQ(title(54), " LTE · capture a.pcap");
+  EXPECT_EQ(title(46), " Kestro · LTE");
+  EXPECT_EQ(title(40), " Kestro");
+  EXPECT_EQ(title(39), "      ");
+}
+
+TEST(TerminalView, ANoticeStandsAboveTheTreeInWholeWords) {
+  const NodePointer tree = treeOf(Dictionary{{"a", "1"}});
+  EXPECT_EQ(screenOf(terminalView({.status = "Connecting...",
+                                   .notice = "no server is there: start one",
+                                   .tree = tree.get()},
+                                  {24, 6})),
+            " Kestro   Connecting...\n"
+            " no server is there:\n"
+            " start one\n"
+            "a  1\n");
+}
+
+TEST(TerminalView, ValuesThatAreNotRenewedAreFaint) {
+  const NodePointer tree = treeOf(Dictionary{{"S", Dictionary{{"a", "1"}, {"b", "2"}}}});
+  const NodePointer before = treeOf(Dictionary{{"S", Dictionary{{"a", "1"}, {"b", "1"}}}});
+  const auto lines = terminalView(
+      {.status = kUpdated, .tree = tree.get(), .previous = before.get(), .isRenewed = false},
+      {80, 24});
+  EXPECT_THAT(textsInStyle(lines, TextStyle::Faint), ElementsAre("S", "  a  1", "  b  2"));
+  EXPECT_THAT(textsInStyle(lines, TextStyle::Changed), IsEmpty());
 }
 
 }  // namespace
