@@ -7,13 +7,9 @@
 #include <utility>
 
 #include "CommandLine/Output.h"
+#include "Sources/LogSource.h"
 
 namespace kestro {
-namespace {
-
-constexpr std::string_view kDriveTestLog = "drive-test";
-
-}  // namespace
 
 DriveFeed::DriveFeed(InputFeed feed, const std::vector<Rule>& rules, Sink sink)
     : _feed(std::move(feed)), _services(std::make_unique<OfflineServices>()) {
@@ -37,7 +33,7 @@ void DriveFeed::take(const InputMessage& message) {
   drive.watch.take({.time = message.time,
                     .number = message.number,
                     .technology = message.technology,
-                    .isFromDriveTest = message.madeUp == kDriveTestLog,
+                    .isFromDriveTest = message.madeUp == kMadeUpFromDriveTest,
                     .measured = drive.measurer.measure(message.technology, message.bytes)});
 }
 

@@ -19,10 +19,14 @@ class DriveWatch {
   /// Without a message for so long they are told to be missing.
   static constexpr std::chrono::seconds kMissingAfter{5};
 
-  /// `sink` receives every event; it must not call the watch.
+  /// `sink` receives every event; it must not call the watch. The messages' technologies must be
+  /// constants.
   DriveWatch(std::vector<Rule> rules, const EventSink& sink);
 
   void take(const MeasuredMessage& message);
+
+  /// For a drive that is going on, whose messages come at about `now`: tells when they are missing.
+  void passTime(Moment now);
 
   [[nodiscard]] const Cells& cells() const noexcept { return _cells.cells(); }
   /// The last message's levels and qualities of cells. Valid until the next message.
@@ -30,7 +34,8 @@ class DriveWatch {
   [[nodiscard]] const Alarms& alarms() const noexcept { return _alarms; }
 
  private:
-  void tellGap(const MeasuredMessage& message);
+  void tellMissing();
+  void tellBack(const MeasuredMessage& message);
 
   EventSink _sink;
   Alarms _alarms;
@@ -38,6 +43,8 @@ class DriveWatch {
   StateChanges _states;
   std::optional<Moment> _lastTime;
   std::uint64_t _lastNumber = 0;
+  std::string_view _lastTechnology;
+  bool _areMissing = false;
 };
 
 }  // namespace kestro

@@ -15,7 +15,8 @@ namespace kestro {
 struct MeasuredMessage {
   Moment time;
   std::uint64_t number = 0;     ///< its place in the recording, from 1
-  std::string_view technology;  ///< as the log channel names it
+  /// As the log channel names it: a constant text of Platform/TelephonyService.h.
+  std::string_view technology;
   /// It was encoded from a drive-test log: what such a log does not hold is made up.
   bool isFromDriveTest = false;
   Measured measured;

@@ -57,6 +57,23 @@ class RowCsv : public RowWriter {
   bool _isFirst = true;
 };
 
+void appendMember(JsonWriter& writer, const RowColumn& column, const RowField& field) {
+  if (std::holds_alternative<std::monostate>(field)) return;
+  writer.key(column.name);
+  std::visit(Overloaded{[](std::monostate) {}, [&](const std::string& text) { writer.text(text); },
+                        [&](std::int64_t number) { writer.integer(number); },
+                        [&](double number) { writer.real(number); }},
+             field);
+}
+
+void appendObject(std::string& text, std::span<const RowColumn> columns,
+                  std::span<const RowField> fields) {
+  JsonWriter writer(text);
+  writer.beginObject();
+  for (std::size_t i = 0; i < fields.size(); ++i) appendMember(writer, columns[i], fields[i]);
+  writer.endObject();
+}
+
 class RowJson : public RowWriter {
  public:
   explicit RowJson(Output& output) : _output(output) {}
@@ -65,25 +82,12 @@ class RowJson : public RowWriter {
   void row(std::span<const RowField> fields) override {
     std::string text = _isFirst ? "[\n" : ",\n";
     _isFirst = false;
-    JsonWriter writer(text);
-    writer.beginObject();
-    for (std::size_t i = 0; i < fields.size(); ++i) appendMember(writer, _columns[i], fields[i]);
-    writer.endObject();
+    appendObject(text, _columns, fields);
     _output.write(text);
   }
   void finish() override { _output.write(_isFirst ? "[]\n" : "\n]\n"); }
 
  private:
-  static void appendMember(JsonWriter& writer, const RowColumn& column, const RowField& field) {
-    if (std::holds_alternative<std::monostate>(field)) return;
-    writer.key(column.name);
-    std::visit(
-        Overloaded{[](std::monostate) {}, [&](const std::string& text) { writer.text(text); },
-                   [&](std::int64_t number) { writer.integer(number); },
-                   [&](double number) { writer.real(number); }},
-        field);
-  }
-
   Output& _output;
   std::span<const RowColumn> _columns;
   bool _isFirst = true;
@@ -95,6 +99,13 @@ std::unique_ptr<RowWriter> makeRows(Output& output) {
 }
 
 }  // namespace
+
+std::string jsonLineOf(std::span<const RowColumn> columns, std::span<const RowField> fields) {
+  std::string line;
+  appendObject(line, columns, fields);
+  line += '\n';
+  return line;
+}
 
 const std::vector<RowFormat>& rowFormats() {
   static const std::vector<RowFormat> formats = {

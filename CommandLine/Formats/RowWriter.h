@@ -45,6 +45,10 @@ struct RowFormat {
   std::unique_ptr<RowWriter> (*makeWriter)(Output& output);
 };
 
+/// One row as an object on a line of its own.
+[[nodiscard]] std::string jsonLineOf(std::span<const RowColumn> columns,
+                                     std::span<const RowField> fields);
+
 /// All formats, the default first: table, csv, json.
 [[nodiscard]] const std::vector<RowFormat>& rowFormats();
 

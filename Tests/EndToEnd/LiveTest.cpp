@@ -48,6 +48,25 @@ bool isRunning(pid_t process) {
   return stream && word != "Z";
 }
 
+TEST_F(LiveTest, WatchWritesEventsAsTheyHappen) {
+  startServer("simulation:LTE");
+  const auto watch = start({"kestro-cli", "watch", "--format=events", "--count=1",
+                            "--rule=Serving Cell Measurements/Measured RSRP < 0 dBm"});
+  EXPECT_EQ(watch->wait(), 0);
+  ASSERT_THAT(watch->outputLines(), SizeIs(1));
+  const auto event = nlohmann::json::parse(watch->outputLines()[0]);
+  EXPECT_EQ(event["event"], "alarm");
+  EXPECT_EQ(event["to"], "Serving Cell Measurements/Measured RSRP < 0 dBm");
+  EXPECT_LT(event["value"], 0);
+  EXPECT_EQ(event["told_by"], "0xB17F");
+}
+
+TEST_F(LiveTest, RulesAreForEvents) {
+  const auto watch = start({"kestro-cli", "watch", "--rule=RSRP < 0"});
+  EXPECT_EQ(watch->wait(), 2);
+  EXPECT_EQ(watch->errors(), "kestro-cli: rules are for --format=events\n");
+}
+
 TEST_F(LiveTest, WatchWritesTheSourcesDisplays) {
   startServer();
   const auto watch = start({"kestro-cli", "watch", "--format=ndjson", "--count=2"});

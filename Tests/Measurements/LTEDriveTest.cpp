@@ -191,6 +191,18 @@ TEST_F(LTEDriveTest, MessagesThatAreMissingForFiveSecondsAreToldWhenTheyAreBack)
   EXPECT_EQ(events[3].duration, std::chrono::milliseconds(10'001));
 }
 
+TEST_F(LTEDriveTest, OfADriveThatIsGoingOnMissingMessagesAreToldAtOnce) {
+  using std::chrono::milliseconds;
+  at(0).take(lteCell(700, 14));
+  watch->passTime(kBegin + milliseconds(4'999));
+  EXPECT_THAT(lines, IsEmpty());
+  watch->passTime(kBegin + milliseconds(5'500));
+  watch->passTime(kBegin + milliseconds(6'500));
+  EXPECT_THAT(lines, ElementsAre("5 messages-missing LTE:"));
+  at(8'000).take(lteCell(700, 14));
+  EXPECT_THAT(lines, ElementsAre("5 messages-missing LTE:", "8 messages-back LTE:"));
+}
+
 TEST_F(LTEDriveTest, AnotherTrackingAreaIsToldWithTheCellThatHasIt) {
   at(0).take(lteCell(700, 14, 601));
   at(1'000).take(lteCell(800, 15, 602));
