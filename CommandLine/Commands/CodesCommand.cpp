@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "CommandLine/Commands/CodesCommand.h"
 
+#include <fmt/format.h>
+
 #include <algorithm>
 #include <memory>
 #include <optional>
@@ -13,18 +15,25 @@
 #include "CommandLine/OfflineServices.h"
 #include "CommandLine/Output.h"
 #include "Options/ProgramOptions.h"
+#include "Platform/Bundle.h"
 
 namespace kestro {
 namespace {
 
 constexpr const char* kCodesExamples = R"(  kestro-cli codes --technology=LTE
-  kestro-cli codes --format=json | jq '.[].codes[] | .code + " " + .name')";
+  kestro-cli codes --format=json | jq '.[].codes[] | .code + " " + .name'
+  kestro-cli codes --format=lua > ~/.local/lib/wireshark/plugins/kestro.lua)";
 
 struct CodesOptions {
   std::string technology;
   std::string format;
   std::optional<LogPriority> shownLog;
 };
+
+int fail(std::string_view reason) {
+  complain(reason);
+  return kExitNothingDone;
+}
 
 int runCodes(const CodesOptions& options) {
   OfflineServices services(std::nullopt, options.shownLog);
@@ -35,11 +44,14 @@ int runCodes(const CodesOptions& options) {
   }
   const auto format = std::ranges::find(codesFormats(), options.format, &CodesFormat::name);
   Output output = Output::standardOutput();
+  for (const auto& [name, extension] : format->preamble) {
+    const auto contents = services.forGenerator().bundle.resource(name, extension);
+    if (!contents) return fail(fmt::format("the resource {}.{} is missing", name, extension));
+    output.write({reinterpret_cast<const char*>(contents->data()), contents->size()});
+  }
   output.write(format->text(technologies));
   output.flush();
-  if (output.failureMessage().empty()) return kExitDone;
-  complain(output.failureMessage());
-  return kExitNothingDone;
+  return output.failureMessage().empty() ? kExitDone : fail(output.failureMessage());
 }
 
 }  // namespace

@@ -12,7 +12,7 @@ namespace {
 void add(const CatalogueEntry& entry, std::vector<ListedCode>& codes) {
   auto code = std::ranges::find(codes, entry.code, &ListedCode::code);
   if (code == codes.end()) {
-    code = codes.insert(code, {entry.code, entry.packetName, entry.minimumLength, {}});
+    code = codes.insert(code, {entry.code, entry.packetName, entry.minimumLength, {}, {}});
   }
   if (!entry.packetName.empty()) {
     const bool isFirst = code->name.empty();
@@ -37,6 +37,10 @@ std::string_view groupOf(const ListedCode& code) {
 std::vector<ListedCode> listCodes(const LogGenerator& generator) {
   std::vector<ListedCode> codes;
   generator.catalogue([&](const CatalogueEntry& entry) { add(entry, codes); });
+  generator.outline([&](const Outline& taker) {
+    const auto code = std::ranges::find(codes, taker.code, &ListedCode::code);
+    if (code != codes.end() && !taker.readings.empty()) code->takers.push_back(taker);
+  });
   std::ranges::sort(codes, {}, &ListedCode::code);
   return codes;
 }

@@ -17,6 +17,7 @@ struct ListedCode {
   std::string_view name;                ///< what the packet is; empty when nobody knows
   std::size_t minimumLength;            ///< the least that a section asks for
   std::vector<CatalogueEntry> entries;  ///< section by section, as the packet is handed out
+  std::vector<Outline> takers{};        ///< what is read, taker by taker, as a packet is explained
 };
 
 /// Codes whose sections stand in one group of the display.

@@ -6,8 +6,10 @@
 #include <iterator>
 #include <utility>
 
+#include "CommandLine/Formats/CodesLua.h"
 #include "CommandLine/Formats/CodesMarkdown.h"
 #include "CommandLine/Formats/JsonWriter.h"
+#include "CommandLine/Formats/LayoutData.h"
 #include "CommandLine/Formats/LayoutText.h"
 #include "LogGenerator/DisplayKeys.h"
 
@@ -164,6 +166,8 @@ void writeCode(JsonWriter& writer, const ListedCode& code) {
   writer.beginArray();
   for (const CatalogueEntry& entry : code.entries) writeEntry(writer, entry);
   writer.endArray();
+  writer.key("takers");
+  writeTakers(writer, code.takers);
   writer.endObject();
 }
 
@@ -193,7 +197,10 @@ const std::vector<CodesFormat>& codesFormats() {
       {"table", "code by code: the packet, its least length, the sections and their keys",
        tableText},
       {"markdown", "a document, with where every key is read and how it is shown", codesMarkdown},
-      {"json", "all of that for programs: an array of technologies", jsonText},
+      {"json", "all of that for programs, with all places as numbers: an array of technologies",
+       jsonText},
+      {"lua", "a dissector for Wireshark, to be put into its folder of personal plugins", codesLua,
+       dissectorParts()},
   };
   return kFormats;
 }

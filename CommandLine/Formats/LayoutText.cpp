@@ -11,15 +11,6 @@
 namespace kestro {
 namespace {
 
-std::string numberFormatText(const NumberFormat& format) {
-  const std::string width = format.width == 0 ? "" : fmt::to_string(format.width);
-  const std::string precision =
-      format.conversion == 'f' && format.precision != 6 ? fmt::format(".{}", format.precision) : "";
-  return fmt::format("{}%{}{}{}{}{}{}", format.prefix, format.plus ? "+" : "",
-                     format.zeroPadded ? "0" : "", width, precision, format.conversion,
-                     format.suffix);
-}
-
 /// "0.25x - 140"; empty for the raw value itself.
 std::string formulaText(double factor, double addend) {
   if (factor == 1 && addend == 0) return "";
@@ -30,7 +21,7 @@ std::string formulaText(double factor, double addend) {
 }
 
 std::string formattedText(const std::string& formula, const NumberFormat& format) {
-  const std::string number = numberFormatText(format);
+  const std::string number = printfText(format);
   return formula.empty() ? number : formula + " as " + number;
 }
 
@@ -46,7 +37,7 @@ std::string namesText(const TextRule& rule) {
 /// "0: Idle; 3: Busy; else Unknown"
 std::string namesOrOtherText(const TextRule& rule) {
   const std::string other =
-      rule.otherName.empty() ? numberFormatText(rule.format) : std::string(rule.otherName);
+      rule.otherName.empty() ? printfText(rule.format) : std::string(rule.otherName);
   return rule.names.empty() ? other : namesText(rule) + "; else " + other;
 }
 
@@ -147,6 +138,15 @@ std::string cellKindText(const CellKind& kind) {
 }  // namespace
 
 std::string logCodeText(LogCode code) { return fmt::format("0x{:04X}", code); }
+
+std::string printfText(const NumberFormat& format) {
+  const std::string width = format.width == 0 ? "" : fmt::to_string(format.width);
+  const std::string precision =
+      format.conversion == 'f' && format.precision != 6 ? fmt::format(".{}", format.precision) : "";
+  return fmt::format("{}%{}{}{}{}{}{}", format.prefix, format.plus ? "+" : "",
+                     format.zeroPadded ? "0" : "", width, precision, format.conversion,
+                     format.suffix == "%" ? "%%" : format.suffix);
+}
 
 std::string placeText(const Place& place, bool inRecord) {
   const bool isRelative = inRecord && place.origin != Origin::Packet;

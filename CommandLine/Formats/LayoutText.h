@@ -13,6 +13,9 @@ namespace kestro {
 /// How a log code is written: "0xB17F", "0xFF0001".
 [[nodiscard]] std::string logCodeText(LogCode code);
 
+/// A number format as C's printf takes it: "%4.2f dBm".
+[[nodiscard]] std::string printfText(const NumberFormat& format);
+
 /// Where a place lies: "u16 at 19, bits 0-8". An offset that counts from a record's beginning has a
 /// plus sign when `inRecord`: "s8 at +4".
 [[nodiscard]] std::string placeText(const Place& place, bool inRecord);

@@ -7,6 +7,10 @@
 
 namespace kestro {
 
+std::string remarkTooShortForAPacket() {
+  return fmt::format("too short for a packet, which has at least {} bytes", kPacketHeaderSize);
+}
+
 PacketNames::PacketNames(const LogGenerator& generator) {
   for (const ListedCode& code : listCodes(generator)) {
     _codes[code.code] = {code.name, code.minimumLength};
@@ -20,20 +24,19 @@ std::string_view PacketNames::nameOf(LogCode code) const {
 
 std::string PacketNames::reasonForNothing(ByteView message) const {
   if (message.size() < kPacketHeaderSize) {
-    return fmt::format("too short for a packet, which has at least {} bytes", kPacketHeaderSize);
+    return remarkTooShortForAPacket();
   }
   const PacketView packet(packetOfMessage(message));
   if (!isKnownLogType(logTypeOf(packet))) {
-    return fmt::format("dropped: 0x{:02x} is no log type", logTypeOf(packet));
+    return fmt::format(kRemarkUnknownType, logTypeOf(packet));
   }
   const auto known = _codes.find(logCodeOf(packet));
-  if (known == _codes.end()) return "no section takes this log code";
-  if (known->second.name.empty()) return "what this packet contains is not known";
+  if (known == _codes.end()) return kRemarkUnknownCode;
+  if (known->second.name.empty()) return kRemarkUnknownContents;
   if (packet.size() < known->second.minimumLength) {
-    return fmt::format("too short: sections read this packet from {} bytes on",
-                       known->second.minimumLength);
+    return fmt::format(kRemarkTooShort, known->second.minimumLength);
   }
-  return "no section reads a value from it";
+  return kRemarkNoValue;
 }
 
 }  // namespace kestro

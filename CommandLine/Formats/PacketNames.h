@@ -11,6 +11,15 @@
 
 namespace kestro {
 
+// Why nothing is read from a packet. {} is the log type, or the least length.
+inline constexpr const char* kRemarkUnknownType = "dropped: 0x{:02x} is no log type";
+inline constexpr const char* kRemarkUnknownCode = "no section takes this log code";
+inline constexpr const char* kRemarkUnknownContents = "what this packet contains is not known";
+inline constexpr const char* kRemarkTooShort =
+    "too short: sections read this packet from {} bytes on";
+inline constexpr const char* kRemarkNoValue = "no section reads a value from it";
+[[nodiscard]] std::string remarkTooShortForAPacket();
+
 /// The log codes of one generator. Its names live as long as the generator, which must outlive it.
 class PacketNames {
  public:

@@ -28,11 +28,12 @@ void C2KParser::explainTaken(const TakenPacket& packet, const ExplainVisitor& vi
 }
 
 OutlinedReading C2KParser::outline() const {
-  OutlinedReading outlined{
-      .packetName = reading().packet.name,
-      .requirements = _rules.requirements,
-      .requiredRecords = reading().lists.empty() ? nullptr : &reading().lists[0].table};
+  OutlinedReading outlined;
+  outlined.packetName = reading().packet.name;
   // The least length is one of the requirements, where it is one.
+  outlined.requirements = _rules.requirements;
+  outlined.packetLength = reading().packet.minimumLength;
+  if (!reading().lists.empty()) outlined.requiredRecords = &reading().lists[0].table;
   outlineTaken(outlined.parts);
   return outlined;
 }

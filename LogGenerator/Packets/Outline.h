@@ -67,8 +67,10 @@ using OutlinedPart = std::variant<OutlinedValue, OutlinedTable, OutlinedSizedRec
 struct OutlinedReading {
   std::string_view packetName{};
   std::size_t minimumLength = 0;  ///< in bytes; of several readings the first that has it counts
-  /// What a packet must have besides; constants. `requiredRecords` are those that some are about.
+  /// What a packet must have besides; constants. Those about a length mean `packetLength`, those
+  /// about records `requiredRecords`.
   std::span<const Requirement> requirements{};
+  std::size_t packetLength = 0;
   const RecordTable* requiredRecords = nullptr;
   std::vector<OutlinedPart> parts{};  ///< in `explain`'s order
 };
