@@ -118,15 +118,49 @@ TEST_F(DlfReaderTest, ALengthThatLooksLikeATypeByteIsStillALength) {
 
 TEST_F(DlfReaderTest, ATypeByteThatLooksLikeALengthIsStillAType) {
   // As a record's length, the type byte and the length's first byte make 0x0C01: 3,073 bytes, and
-  // as many follow.
-  const Bytes record = dlfRecord(0xB0C2, kDlfTestTime);
-  Bytes log = logOf({record});
-  std::vector<Bytes> expected = {behind(1, record)};
-  for (int i = 0; i < 600; ++i) {
-    expected.push_back(behind(1, record));
-    log.insert(log.end(), expected.back().begin(), expected.back().end());
+  // as many follow. With a time the times tell which it is, without one the codes, and where nobody
+  // knows codes, what would follow the 3,073 bytes.
+  for (const std::uint64_t time : {kDlfTestTime, std::uint64_t{0}}) {
+    const Bytes record = dlfRecord(0xB0C2, time);
+    Bytes log = logOf({record});
+    std::vector<Bytes> expected = {behind(1, record)};
+    for (int i = 0; i < 600; ++i) {
+      expected.push_back(behind(1, record));
+      log.insert(log.end(), expected.back().begin(), expected.back().end());
+    }
+    EXPECT_EQ(messagesIn(log), expected);
+    const auto reader = DlfReader::open(RecordedFile::open(_path).value(),
+                                        {.coding = *_coding, .technology = "LTE"});
+    EXPECT_EQ(messagesOf(**reader), expected);
   }
-  EXPECT_EQ(messagesIn(log), expected);
+}
+
+// Read as a length, 01 0C makes 3,073 bytes; the record's code would then be nobody's 0xC200, and
+// its time, where its own is 0, 0xB0.
+
+TEST_F(DlfReaderTest, CodesTellWhatTimesDoNot) {
+  const Bytes before = dlfRecord(0xB0C2, 0xB0);
+  const Bytes typed = behind(1, dlfRecord(0xB0C2, 0));
+  const Bytes filling = dlfRecord(0xB0C3, 0, std::string(3'073 - typed.size() - 12, '\0'));
+  EXPECT_THAT(messagesIn(logOf({before, typed, filling, before})),
+              ElementsAre(behind(1, before), typed, behind(1, filling), behind(1, before)));
+}
+
+TEST_F(DlfReaderTest, TimesTellWhatCodesDoNot) {
+  const Bytes before = dlfRecord(0x1234, kDlfTestTime);
+  const Bytes typed = behind(1, dlfRecord(0x1234, kDlfTestTime));
+  const Bytes filling =
+      dlfRecord(0x1234, kDlfTestTime, std::string(3'073 - typed.size() - 12, '\0'));
+  EXPECT_THAT(messagesIn(logOf({before, typed, filling, before})),
+              ElementsAre(behind(1, before), typed, behind(1, filling), behind(1, before)));
+}
+
+TEST_F(DlfReaderTest, WhatFollowsTellsWhatCodesAndTimesDoNot) {
+  const Bytes before = dlfRecord(0x1234, 0x12);
+  const Bytes typed = behind(1, dlfRecord(0x1234, 0));
+  const Bytes filling = dlfRecord(0x1234, 0, std::string(4'000, '\0'));
+  EXPECT_THAT(messagesIn(logOf({before, typed, filling})),
+              ElementsAre(behind(1, before), typed, behind(1, filling)));
 }
 
 TEST_F(DlfReaderTest, PrefixesAreLeftOut) {

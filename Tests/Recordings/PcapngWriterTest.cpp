@@ -141,10 +141,13 @@ TEST_F(PcapngWriterTest, AnUnknownTechnologyIsRefused) {
   EXPECT_EQ(file(), PcapngText().section().get());
 }
 
-TEST_F(PcapngWriterTest, ATimeBefore1970IsWrittenAs1970) {
+TEST_F(PcapngWriterTest, ATimeOutsideTheYears1970To9999IsWrittenAsTheNearest) {
   auto writer = PcapngWriter::create(_path).value();
   ASSERT_TRUE(writer.write(messageOf("LTE", Moment(microseconds(-1)))));
-  EXPECT_EQ(reader()->next().value().value().time, Moment());
+  ASSERT_TRUE(writer.write(messageOf("LTE", Moment::max())));
+  const auto opened = reader();
+  EXPECT_EQ(opened->next().value().value().time, Moment());
+  EXPECT_EQ(opened->next().value().value().time, Moment(microseconds(253'402'300'799'999'999)));
 }
 
 TEST_F(PcapngWriterTest, AFullDiskIsReportedAndStaysTheError) {
