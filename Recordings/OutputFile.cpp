@@ -55,7 +55,7 @@ Result<void> OutputFile::write(ByteView bytes) {
     const ssize_t size = ::write(_descriptor, bytes.data(), bytes.size());
     if (size >= 0) {
       bytes = bytes.subspan(static_cast<std::size_t>(size));
-    } else if (errno != EINTR) {
+    } else {  // also when it was interrupted: a program that is to end waits for no reader
       _error = Error{fmt::format("{}: cannot write: {}", _name, std::strerror(errno))};
       return tl::unexpected(*_error);
     }

@@ -93,10 +93,8 @@ Result<ByteView> RecordedFile::fillTo(std::size_t count) {
 }
 
 Result<std::size_t> RecordedFile::fetch(std::span<std::uint8_t> target) {
-  ssize_t size = 0;
-  do {
-    size = ::read(_descriptor, target.data(), target.size());
-  } while (size < 0 && errno == EINTR);
+  // One that is interrupted fails, too: a program that is to end waits for no writer.
+  const ssize_t size = ::read(_descriptor, target.data(), target.size());
   if (size < 0) return tl::unexpected(systemError(_path));
   _hasEnded = size == 0;
   _fetched += static_cast<std::uint64_t>(size);

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 // Programs whose output nobody takes are asked to end.
 #include <fcntl.h>
+#include <fmt/format.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 #include <sys/stat.h>
@@ -33,6 +34,26 @@ class BlockedTest : public LiveTest, public ::testing::WithParamInterface<int> {
     EXPECT_LT(std::chrono::steady_clock::now() - begin, kAtOnce);
   }
 
+  /// Starts a command whose standard output is a pipe that takes nothing, waits until that blocks
+  /// it, and expects that it ends soon after the signal.
+  void expectEndIntoFullPipe(const std::string& command, int signal) {
+    ASSERT_EQ(::mkfifo(pipePath().c_str(), 0600), 0);
+    const int reader = ::open(pipePath().c_str(), O_RDWR);  // keeps the pipe open, takes nothing
+    ASSERT_GE(reader, 0);
+    ::fcntl(reader, F_SETPIPE_SZ, 4096);
+    const auto process = start({"/bin/sh", "-c",
+                                fmt::format("exec \"{}\"/kestro-cli {} > {}",
+                                            KESTRO_PROGRAM_DIRECTORY, command, pipePath())});
+    // A pipe that is full takes no byte more.
+    const std::vector<char> filling(4096, 'x');
+    ::fcntl(reader, F_SETFL, O_NONBLOCK);
+    while (::write(reader, filling.data(), filling.size()) > 0) {
+    }
+    EXPECT_TRUE(eventually([&] { return isBlocked(process->id()); }));
+    expectEndAfter(*process, signal);
+    ::close(reader);
+  }
+
   /// Whether the process sleeps in a system call for half a second.
   static bool isBlocked(pid_t process) {
     for (int i = 0; i < 50; ++i) {
@@ -48,22 +69,13 @@ class BlockedTest : public LiveTest, public ::testing::WithParamInterface<int> {
 };
 
 TEST_P(BlockedTest, WatchIntoAPipeThatNobodyReadsEnds) {
-  ASSERT_EQ(::mkfifo(pipePath().c_str(), 0600), 0);
-  const int reader = ::open(pipePath().c_str(), O_RDWR);  // keeps the pipe open, takes nothing
-  ASSERT_GE(reader, 0);
-  ::fcntl(reader, F_SETPIPE_SZ, 4096);
   startServer();
-  const auto watch = start({"/bin/sh", "-c",
-                            std::string("exec \"") + KESTRO_PROGRAM_DIRECTORY +
-                                "\"/kestro-cli watch --format=ndjson > " + pipePath()});
-  // A pipe that is full takes no byte more.
-  const std::vector<char> filling(4096, 'x');
-  ::fcntl(reader, F_SETFL, O_NONBLOCK);
-  while (::write(reader, filling.data(), filling.size()) > 0) {
-  }
-  EXPECT_TRUE(eventually([&] { return isBlocked(watch->id()); }));
-  expectEndAfter(*watch, GetParam());
-  ::close(reader);
+  expectEndIntoFullPipe("watch --format=ndjson", GetParam());
+}
+
+TEST_P(BlockedTest, RecordIntoAPipeThatNobodyReadsEnds) {
+  startServer();
+  expectEndIntoFullPipe("record -o -", GetParam());
 }
 
 TEST_P(BlockedTest, RecordToANamedPipeWithoutAReaderEnds) {

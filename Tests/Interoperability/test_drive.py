@@ -1,13 +1,16 @@
 # SPDX-License-Identifier: MIT
-"""What `record` writes of a drive through two technologies, read by tshark and capinfos.
+"""What `record` writes of a drive through two technologies, decoded, and read by tshark.
 
 The programs are found through $KESTRO_CLI and $KESTRO_TELEPHONYD."""
 
 import contextlib
+import itertools
+import json
 import os
 import pathlib
 import pty
 import shutil
+import signal
 import subprocess
 import tempfile
 import time
@@ -25,7 +28,10 @@ ROWS = (
 FIRST_ROW = 1574350716  # 2019-11-21 15:38:36 UTC
 
 
-@unittest.skipUnless(shutil.which("tshark"), "tshark is missing: apt-get install tshark")
+needs_tshark = unittest.skipUnless(
+    shutil.which("tshark"), "tshark is missing: apt-get install tshark")
+
+
 class Drive(unittest.TestCase):
     def setUp(self):
         folder = tempfile.TemporaryDirectory()
@@ -55,6 +61,7 @@ class Drive(unittest.TestCase):
         run = subprocess.run(command, capture_output=True, text=True, check=True)
         return [line.split("|") for line in run.stdout.splitlines()]
 
+    @needs_tshark
     def test_tshark_reads_both_technologies_in_one_file(self):
         log = self.folder / "mixed.csv"
         log.write_text("\n".join((COLUMNS, *ROWS)) + "\n")
@@ -75,6 +82,32 @@ class Drive(unittest.TestCase):
             ["capinfos", "-k", path], capture_output=True, text=True, check=True).stdout
         self.assertIn("made-up: drive-test", comments)
 
+    def test_both_technologies_decode_to_the_displays_that_were_watched(self):
+        log = self.folder / "mixed.csv"
+        log.write_text("\n".join((COLUMNS, *ROWS)) + "\n")
+        self.serve([f"--source=drive-test:{log}", "--technology=auto", "--loop"])
+        path = self.folder / "drive.pcapng"
+        recorder = subprocess.Popen(
+            self.command(path), env=self.environment, stdin=subprocess.DEVNULL,
+            stderr=subprocess.PIPE)
+        recorder.stderr.readline()  # it records
+        watched = self.displays("watch", "--count=5")
+        recorder.send_signal(signal.SIGINT)
+        recorder.communicate(timeout=PATIENCE)
+        decoded = self.displays("decode", path, "--refresh-every=0")
+        # The recorder may know more of the first technology than the display, which came later.
+        later = list(itertools.dropwhile(lambda each: each.keys() == watched[0].keys(), watched))
+        self.assertGreaterEqual(len({tuple(each) for each in watched}), 2)
+        for display in later:
+            self.assertIn(display, decoded)
+
+    def displays(self, command, *options):
+        run = subprocess.run(
+            [os.environ["KESTRO_CLI"], command, "--format=ndjson", *options],
+            env=self.environment, capture_output=True, text=True, timeout=PATIENCE, check=True)
+        return [json.loads(line)["display"] for line in run.stdout.splitlines()]
+
+    @needs_tshark
     def test_tshark_shows_notes_as_comments_of_packets(self):
         self.serve(["--source=simulation"])
         path = self.folder / "drive.pcapng"
