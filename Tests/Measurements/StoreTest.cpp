@@ -1,5 +1,4 @@
 // SPDX-License-Identifier: MIT
-#include <sqlite3.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -10,6 +9,7 @@
 #include "Platform/TelephonyService.h"
 #include "Tests/Measurements/DriveFixture.h"
 #include "Tests/Measurements/LTEPackets.h"
+#include "Tests/Measurements/StoreRows.h"
 #include "Tests/Support/TemporaryFile.h"
 
 namespace kestro::testing {
@@ -18,27 +18,6 @@ namespace {
 using ::testing::ElementsAre;
 using ::testing::HasSubstr;
 using ::testing::IsEmpty;
-
-/// The rows of a query, their columns with "|" between them; what fails is the only row.
-std::vector<std::string> rowsOf(const std::string& path, const std::string& query) {
-  sqlite3* handle = nullptr;
-  std::vector<std::string> rows;
-  const auto keep = [](void* into, int count, char** texts, char**) {
-    std::string row;
-    for (int i = 0; i < count; ++i) {
-      if (i > 0) row += "|";
-      row += texts[i] == nullptr ? "" : texts[i];
-    }
-    static_cast<std::vector<std::string>*>(into)->push_back(row);
-    return 0;
-  };
-  sqlite3_open_v2(path.c_str(), &handle, SQLITE_OPEN_READWRITE, nullptr);
-  if (sqlite3_exec(handle, query.c_str(), keep, &rows, nullptr) != SQLITE_OK) {
-    rows = {sqlite3_errmsg(handle)};
-  }
-  sqlite3_close(handle);
-  return rows;
-}
 
 std::string bytesOf(const std::string& path) {
   std::ifstream file(path, std::ios::binary);
