@@ -29,6 +29,13 @@ LENGTHS = {"LTE": (9, range(27)), "Ondrel_GSM": (28, range(21)), "UTRAN2": (8, r
 RANDOM_LENGTHS = {"LTE": (300, 300), "Ondrel_GSM": (52, 150), "UTRAN2": (450, 450),
                   "Ondrel_CDMA": (52, 300)}
 COUNTERS = {"Ondrel_CDMA": (2, 6)}  # codes whose packets are longer still
+RULES = b"""# of all kinds
+Measured RSRP < -100 dBm for 1 s
+RSCP >= -90 dB
+"Neighboring Cells/RSSI" != 12 # each
+Rx 0 AGC > -200
+RSSI == 20 for 0.5 s
+"""
 SECOND, REFRESH, WHOLE_MESSAGE = b"\x0a", b"\xff", b"\xfe"
 
 
@@ -185,7 +192,27 @@ def make_other_recordings(technology, entries, snapshot):
     write("RecordingFuzz", f"{technology}-snapshot", snapshot)
 
 
+def make_drives(technology, kinds):
+    """Every kind of message, a second apart; of a drive-test log, and with the clock set back."""
+    index = TECHNOLOGIES.index(technology)
+    for name, choice, step in (("drive", index, 10), ("log", index | 0x80, 60), ("back", index, 255)):
+        write("DriveFuzz", f"{technology}-{name}", framed(RULES)
+              + b"".join(bytes([choice, step]) + framed(message) for message in 2 * kinds[:12]))
+
+
+def make_alarms():
+    """An LTE level that goes up and down around the limit of a rule, at once and for long."""
+    def level(quarters):
+        return (b"\x01" + struct.pack("<HHQ", 32, 0xB17F, 0)
+                + struct.pack("<B3xHHI8x", 1, 1300, 14, quarters))
+    drive = b"".join(bytes([3, step]) + framed(level(quarters))
+                     for step, quarters in ((5, 100), (5, 200), (5, 100), (9, 100), (9, 100), (5, 200),
+                                            (5, 100), (99, 100), (5, 200)))
+    write("DriveFuzz", "alarms", framed(RULES) + drive)
+
+
 def make_recordings(technology, kinds):
+    make_drives(technology, kinds)
     write("ReplayFuzz", technology,
           bytes([TECHNOLOGIES.index(technology)])
           + b"".join(SECOND + framed(message) for message in kinds[:12]))
@@ -221,5 +248,6 @@ def make(technology, capture):
 
 if __name__ == "__main__":
     make_pcapng()
+    make_alarms()
     for argument in sys.argv[1:]:
         make(*argument.split("=", 1))
