@@ -5,9 +5,11 @@
 
 #include "CommandLine/Commands/CellsCommand.h"
 #include "CommandLine/Commands/CodesCommand.h"
+#include "CommandLine/Commands/ConvertCommand.h"
 #include "CommandLine/Commands/DecodeCommand.h"
 #include "CommandLine/Commands/EventsCommand.h"
 #include "CommandLine/Commands/ExplainCommand.h"
+#include "CommandLine/Commands/InfoCommand.h"
 #include "CommandLine/Commands/RecordCommand.h"
 #include "CommandLine/Commands/SnapshotCommand.h"
 #include "CommandLine/Commands/WatchCommand.h"
@@ -22,8 +24,9 @@ CommandRow commandLineProgram(const Bundle& bundle) {
   return {.name = "kestro-cli",
           .help = "Shows live, or from a recording, what a phone's cellular baseband is doing.",
           .options = {versionOption("kestro-cli", bundle)},
-          .commands = {watchCommand(), decodeCommand(), recordCommand(), explainCommand(),
-                       cellsCommand(), eventsCommand(), codesCommand(), snapshotCommand()},
+          .commands = {watchCommand(), recordCommand(), decodeCommand(), convertCommand(),
+                       explainCommand(), infoCommand(), cellsCommand(), eventsCommand(),
+                       codesCommand(), snapshotCommand()},
           .sections = {{.title = "Exit status",
                         .rows = {{"0", "done"},
                                  {"1", "nothing could be done; one line says why"},

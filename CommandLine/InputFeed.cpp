@@ -53,7 +53,7 @@ bool InputFeed::takeNext(const Handler& take) {
   if (!next) {
     _progress.erase();
     complain(next.error().message);
-    _isDamaged = true;
+    _damage.push_back(next.error().message);
     return true;
   }
   if (!*next) {
@@ -72,8 +72,9 @@ bool InputFeed::takeNext(const Handler& take) {
 }
 
 ExitStatus InputFeed::status() const noexcept {
-  if (_isDamaged && messageCount() == 0) return kExitNothingDone;
-  return _isDamaged || _hasSkipped ? kExitPartlyDone : kExitDone;
+  const bool isDamaged = !_damage.empty();
+  if (isDamaged && messageCount() == 0) return kExitNothingDone;
+  return isDamaged || _hasSkipped ? kExitPartlyDone : kExitDone;
 }
 
 void InputFeed::skip(const InputMessage& message, const std::string& reason) {

@@ -8,6 +8,7 @@
 #include <string>
 #include <string_view>
 #include <utility>
+#include <vector>
 
 #include "CommandLine/ExitStatus.h"
 #include "CommandLine/InputOptions.h"
@@ -46,6 +47,9 @@ class InputFeed {
   /// Names on standard error what is wrong with a message, which counts as not done.
   void skip(const InputMessage& message, const std::string& reason);
 
+  /// What has been named of damaged inputs.
+  [[nodiscard]] const std::vector<std::string>& damage() const noexcept { return _damage; }
+
   [[nodiscard]] const Inputs& inputs() const noexcept { return _inputs; }
   /// What lines call the first input.
   [[nodiscard]] const std::string& name() const { return _inputs.nameOf(0); }
@@ -63,7 +67,7 @@ class InputFeed {
   Progress _progress;
   Handler _takeCut;
   std::uint64_t _wantedCount = 0;
-  bool _isDamaged = false;
+  std::vector<std::string> _damage;
   bool _hasSkipped = false;
 };
 

@@ -71,6 +71,7 @@ Result<void> PcapngReader::beginSection(PcapngBytes body) {
                                kPcapngMajorVersion));
   }
   _interfaces.clear();
+  _madeUp.clear();
   return forEachPcapngOption(body.from(kSectionFields),
                              [this](PcapngOption code, PcapngBytes value) -> Result<void> {
                                if (code != PcapngOption::Comment) return {};

@@ -63,8 +63,9 @@ class RecordingReader {
   /// `next`.
   [[nodiscard]] virtual std::span<const std::string_view> technologies() const noexcept = 0;
 
-  /// What of the recording is made up, as it says itself, for instance "simulation"; empty as long
-  /// as it has said nothing. Valid until the next `next`.
+  /// What made up the last message, or a part of it, as the recording says itself, for instance
+  /// "simulation"; before the first what it says so far, and empty where it says nothing. Valid
+  /// until the next `next`.
   [[nodiscard]] virtual std::string_view madeUp() const noexcept { return {}; }
 
   /// The next message, or nothing at the end of the recording. A recording that is cut or damaged

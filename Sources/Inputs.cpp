@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "Sources/Inputs.h"
 
+#include <fmt/format.h>
+
 #include <algorithm>
 #include <filesystem>
 #include <functional>
@@ -35,6 +37,12 @@ bool isOfCode(const InputMessage& message, LogCode code) {
   return packet.size() >= kPacketHeaderSize && logCodeOf(packet) == code;
 }
 
+std::string nameOfInput(const SourceRequest& request) {
+  const auto* kind = sourceKindNamed(request.kind);
+  const bool isFile = kind == nullptr || !kind->isEndless;
+  return isFile ? request.argument : fmt::format("{}:{}", request.kind, request.argument);
+}
+
 /// Whether a second reader would find the same.
 bool canBeReadTwice(const SourceRequest& request) {
   const auto* kind = sourceKindNamed(request.kind);
@@ -56,8 +64,7 @@ Result<Inputs> Inputs::open(std::span<const SourceRequest> requests,
     auto reader = openInput(request, services, report);
     if (!reader) return tl::unexpected(reader.error());
     inputs._unread.insert(inputs._unread.begin(), inputs._inputs.size());
-    inputs._inputs.push_back({.name = request.argument.empty() ? request.kind : request.argument,
-                              .reader = *std::move(reader)});
+    inputs._inputs.push_back({.name = nameOfInput(request), .reader = *std::move(reader)});
   }
   return inputs;
 }

@@ -17,6 +17,7 @@
 #include "CommandLine/Terminal/TypedLines.h"
 #include "Platform/MainQueue.h"
 #include "Recordings/OutputPath.h"
+#include "Sources/SourceCatalogue.h"
 
 namespace kestro {
 namespace {
@@ -46,11 +47,12 @@ struct RecordOptions {
   bool usesSourceTimes = false;
 };
 
-/// The file that a demo plays, if it plays one: what stands behind KIND in KIND:FILE.
+/// The file that a demo plays, if it plays one.
 std::vector<std::string> demoFiles(const std::string& source) {
-  const std::size_t colon = source.find(':');
-  if (colon == std::string::npos) return {};
-  return {source.substr(colon + 1)};
+  const auto request = parseSource(source, "");
+  const auto* kind = request ? sourceKindNamed(request->kind) : nullptr;
+  if (source.empty() || kind == nullptr || kind->isEndless) return {};
+  return {request->argument};
 }
 
 /// Looks at the output before anything is started.

@@ -308,17 +308,28 @@ TEST_F(PcapngReaderTest, ASectionsCommentsAreNotesOfTheNextMessage) {
   EXPECT_THAT(opened->closingNotes(), ElementsAre("last", "words"));
 }
 
-TEST_F(PcapngReaderTest, WhatIsMadeUpIsToldOnce) {
+TEST_F(PcapngReaderTest, WhatIsMadeUpIsToldSectionBySection) {
   const auto opened = reader(little()
                                  .section(little().option(1, "made-up: simulation"))
                                  .interface(150)
                                  .packet(0, 1, "a")
-                                 .section(little().option(1, "made-up: simulation"))
-                                 .section(little().option(1, "made-up: sim"))
-                                 .section(little().option(1, "made-up: ")));
+                                 .section(little()
+                                              .option(1, "made-up: simulation")
+                                              .option(1, "made-up: simulation")
+                                              .option(1, "made-up: sim")
+                                              .option(1, "made-up: "))
+                                 .interface(150)
+                                 .packet(0, 2, "b")
+                                 .section()
+                                 .interface(150)
+                                 .packet(0, 3, "c"));
   EXPECT_EQ(opened->madeUp(), "simulation");
-  EXPECT_EQ(messagesOf(*opened), "LTE 1 a\nend");
+  ASSERT_TRUE(*opened->next());
+  EXPECT_EQ(opened->madeUp(), "simulation");
+  ASSERT_TRUE(*opened->next());
   EXPECT_EQ(opened->madeUp(), "simulation; sim");
+  EXPECT_EQ(messagesOf(*opened), "LTE 3 c\nend");
+  EXPECT_EQ(opened->madeUp(), "");
   EXPECT_THAT(opened->closingNotes(), IsEmpty());
 }
 
