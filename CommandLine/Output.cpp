@@ -45,7 +45,10 @@ void Output::checkSystemError(bool succeeded) {
 }
 
 void complain(std::string_view message) {
-  standardErrorSink().writeLine(fmt::format("kestro-cli: {}", message));
+  // Two programs share the commands' sources; tests of these are neither.
+  const std::string_view started = program_invocation_short_name;
+  const std::string_view name = started.starts_with("kestro-") ? started : "kestro-cli";
+  standardErrorSink().writeLine(fmt::format("{}: {}", name, message));
 }
 
 }  // namespace kestro

@@ -40,8 +40,8 @@ class Output {
   bool _readerIsGone = false;
 };
 
-/// Writes "kestro-cli: MESSAGE" as a line to standard error; it is dropped when that cannot be
-/// written.
+/// Writes "kestro-cli: MESSAGE" as a line to standard error, with the name of the program that
+/// runs; it is dropped when that cannot be written.
 void complain(std::string_view message);
 
 }  // namespace kestro

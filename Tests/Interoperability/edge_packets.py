@@ -92,6 +92,10 @@ class Edges:
                 yield message(code, sub_packets(lambda: self.bytes(size), identifiers))
                 yield message(code, sub_packets(fill, identifiers, claimed=255))
                 yield message(code, sub_packets(fill, identifiers)[: 20 + size])
+        # The last one may reach 16 bytes past the end, and no further.
+        for cut in (1, 16, 17, 18, 50):
+            yield message(code, sub_packets(lambda: self._small(60), (1, 2, 3, 4))[:-cut])
+            yield message(code, sub_packets(lambda: self._small(60), (1, 11))[:-cut])
 
     def random(self):
         """Without end: packets of random codes, lengths and bytes."""

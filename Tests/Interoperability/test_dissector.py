@@ -2,8 +2,8 @@
 """The dissector for Wireshark, in tshark, against what `kestro-cli explain` says of the same messages.
 
 The programs are found through $KESTRO_CLI and $KESTRO_TELEPHONYD, the dissector through
-$KESTRO_DISSECTOR. $KESTRO_DISSECTOR_MESSAGES is how many random packets of each technology are
-compared, besides the simulations' and the edges."""
+$KESTRO_DISSECTOR. $KESTRO_DISSECTOR_MESSAGES is how many random packets of each of the four
+technologies are compared, besides the simulations' and the edges."""
 
 import itertools
 import json

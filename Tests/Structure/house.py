@@ -80,6 +80,9 @@ ROOMS = {
     "CommandLine/Formats": Room(_FORMATS, HOSTED | {"json", "unicode"}),
     "CommandLine/Terminal": Room(_TERMINAL, HOSTED | {"unicode"}),
     "CommandLine/Commands": Room(_TERMINAL, _COMMANDS, (LINUX_DOOR,)),
+    "CommandLine/Extcap": Room(
+        ("CommandLine", "CommandLine/Commands", *_SERVER), _COMMANDS, (LINUX_DOOR,)
+    ),
     "App": Room(("App/Panes", "App/Toolkit", *_APP), CORE | {"qt"}),
     "App/Program.cpp": Room(
         ("App", "App/Panes", "App/Toolkit", *_APP), HOSTED | {"qt"}, (LINUX_DOOR,)
