@@ -44,14 +44,14 @@ TEST_F(RecordTest, InTheBackgroundItLeavesTheTerminalAloneAndGoesOn) {
   const auto shell =
       start({"/bin/bash", "-c",
              fmt::format("set -m; \"{}\"/kestro-cli record -o {} --duration=2 & wait %1; "
-                         "read -r line; echo \"ended $?, read $line\"",
+                         "status=$?; read -r line; echo \"ended $status, read $line\"",
                          KESTRO_PROGRAM_DIRECTORY, drive)},
             Process::Terminal::Own);
   ASSERT_TRUE(shell->waitForOutput("recording IFX"));
   shell->type("tunnel\n");
   EXPECT_EQ(shell->wait(), 0);
   EXPECT_THAT(shell->output(), HasSubstr("recorded "));
-  EXPECT_THAT(shell->output(), HasSubstr("read tunnel"));
+  EXPECT_THAT(shell->output(), HasSubstr("ended 0, read tunnel"));
   EXPECT_THAT(contents(), Not(HasSubstr("tunnel")));
 }
 

@@ -412,6 +412,7 @@ TEST_F(LogChannelClientTest, TellsWhatTheServerSaysOfItsSource) {
   platform.telephonyService().notifySource(ended);
   EXPECT_THAT(user.sources, ElementsAre(simulation, ended));
   client.reset();
+  const auto others = platform.telephonyService()._TqServerConnectionCreate([] {});
   platform.telephonyService().notifySource(simulation);
   EXPECT_THAT(user.sources, SizeIs(2));
 }
