@@ -34,7 +34,7 @@ using CellId = std::uint32_t;
 
 struct Event {
   EventKind kind = EventKind::Reselection;
-  Moment time;
+  Moment time{};
   std::uint64_t message = 0;  ///< the message that showed it
   std::string technology{};  ///< "LTE", "UMTS", …; of states and alarms as the log channel names it
   /// What changed: a state's or an alarm's series, with its item; else empty.

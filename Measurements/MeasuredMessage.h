@@ -13,7 +13,7 @@ namespace kestro {
 /// One message of a drive. What it refers to need not outlive the call that it is given to; its
 /// series must outlive who is given it.
 struct MeasuredMessage {
-  Moment time;
+  Moment time{};
   std::uint64_t number = 0;     ///< its place in the recording, from 1
   /// As the log channel names it: a constant text of Platform/TelephonyService.h.
   std::string_view technology;

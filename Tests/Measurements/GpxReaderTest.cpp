@@ -91,6 +91,19 @@ TEST(GpxReaderTest, EntitiesThatGrowWithoutEndAreRefused) {
   EXPECT_NE(gpxErrorOf(text).find("amplification"), std::string::npos) << gpxErrorOf(text);
 }
 
+TEST(GpxReaderTest, TooManyPointsAreRefused) {
+  GpxReader reader;
+  ASSERT_TRUE(reader.take("<gpx><trk><trkseg>"));
+  constexpr std::string_view kPoint =
+      R"(<trkpt lat="51" lon="8"><time>2023-11-14T22:13:20Z</time></trkpt>)";
+  std::string many;
+  for (int i = 0; i < 1'000; ++i) many += kPoint;
+  for (std::size_t i = 0; i < Track::kMaximumFixes / 1'000; ++i) ASSERT_TRUE(reader.take(many));
+  const auto taken = reader.take(kPoint);
+  ASSERT_FALSE(taken);
+  EXPECT_EQ(taken.error().message, "more than 2000000 points");
+}
+
 TEST(GpxReaderTest, AFileIsReadWhole) {
   const testing::TemporaryFile file("drive.gpx");
   std::ofstream(file.path()) << kGpx;
