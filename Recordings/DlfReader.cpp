@@ -13,11 +13,10 @@ namespace kestro {
 namespace {
 
 std::optional<Moment> timeOfPacket(ByteView packet) {
-  using namespace std::chrono;
-  constexpr Moment kEnd = sys_days(year(10'000) / January / 1);
+  constexpr Moment kEnd = std::chrono::sys_days(std::chrono::year(10'000) / 1 / 1);
   const auto time = loadLittleEndian<std::uint64_t>(packet, 1 + kDlfTimeOffset);
   if (time >= static_cast<std::uint64_t>(kEnd.time_since_epoch().count())) return std::nullopt;
-  return Moment(microseconds(static_cast<std::int64_t>(time)));
+  return Moment(std::chrono::microseconds(static_cast<std::int64_t>(time)));
 }
 
 }  // namespace

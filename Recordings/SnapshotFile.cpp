@@ -21,31 +21,43 @@ std::optional<int> digits(std::string_view text, std::size_t at, std::size_t cou
   return number;
 }
 
+/// Whether the separators of a form stand where they must.
+bool hasFormOf(std::string_view text, std::string_view form) noexcept {
+  if (text.size() != form.size()) return false;
+  for (std::size_t i = 0; i < form.size(); ++i) {
+    const bool isSeparator = form[i] == '-' || form[i] == ':' || form[i] == ' ';
+    if (isSeparator && text[i] != form[i]) return false;
+  }
+  return true;
+}
+
+/// The day that a text begins with, "YYYY-MM-DD".
+std::optional<std::chrono::sys_days> dateAt(std::string_view text) noexcept {
+  const auto year = digits(text, 0, 4), month = digits(text, 5, 2), day = digits(text, 8, 2);
+  if (!year || !month || !day || *year == 0) return std::nullopt;
+  const std::chrono::year_month_day date(std::chrono::year(*year),
+                                         std::chrono::month(static_cast<unsigned>(*month)),
+                                         std::chrono::day(static_cast<unsigned>(*day)));
+  if (!date.ok()) return std::nullopt;
+  return std::chrono::sys_days(date);
+}
+
 }  // namespace
 
 std::optional<Moment> momentOfDate(std::string_view text) noexcept {
-  using namespace std::chrono;
+  using std::chrono::hours, std::chrono::minutes, std::chrono::seconds;
   constexpr std::string_view kForm = "YYYY-MM-DD hh:mm:ss +hhmm";
-  if (text.size() != kForm.size()) return std::nullopt;
-  for (std::size_t i = 0; i < kForm.size(); ++i) {
-    if (const bool isFixed = kForm[i] == '-' || kForm[i] == ':' || kForm[i] == ' ';
-        isFixed && text[i] != kForm[i]) {
-      return std::nullopt;
-    }
-  }
-  const auto years = digits(text, 0, 4), month = digits(text, 5, 2), day = digits(text, 8, 2);
+  if (!hasFormOf(text, kForm)) return std::nullopt;
+  const char sign = text[kForm.find('+')];
+  const auto date = dateAt(text);
   const auto hour = digits(text, 11, 2), minute = digits(text, 14, 2), second = digits(text, 17, 2);
   const auto zoneHours = digits(text, 21, 2), zoneMinutes = digits(text, 23, 2);
-  const char sign = text[20];
-  if (!years || !month || !day || !hour || !minute || !second || !zoneHours || !zoneMinutes ||
-      (sign != '+' && sign != '-')) {
+  if (!date || !hour || !minute || !second || !zoneHours || !zoneMinutes ||
+      (sign != '+' && sign != '-') || *hour > 23 || *minute > 59 || *second > 60) {
     return std::nullopt;
   }
-  const year_month_day date(year(*years), std::chrono::month(static_cast<unsigned>(*month)),
-                            std::chrono::day(static_cast<unsigned>(*day)));
-  if (!date.ok() || *years == 0 || *hour > 23 || *minute > 59 || *second > 60) return std::nullopt;
   const auto offset = hours(*zoneHours) + minutes(*zoneMinutes);
-  const Moment local = sys_days(date) + hours(*hour) + minutes(*minute) + seconds(*second);
+  const Moment local = *date + hours(*hour) + minutes(*minute) + seconds(*second);
   return sign == '+' ? local - offset : local + offset;
 }
 

@@ -15,7 +15,7 @@ namespace {
 
 // A notifier would wake the process for lines that are typed for another one in the foreground.
 constexpr std::chrono::milliseconds kLookInterval{200};
-constexpr std::size_t kPiece = 4096;
+constexpr std::size_t kPieceSize = 4096;
 constexpr int kMostPieces = 16;  ///< at one look
 constexpr std::size_t kLongestLine = std::size_t{64} * 1024;
 
@@ -38,7 +38,7 @@ TypedLines::TypedLines(MainQueue& queue, std::function<void(std::string_view lin
 
 void TypedLines::look() {
   for (int i = 0; i < kMostPieces && isInForeground() && hasInput(); ++i) {
-    std::array<char, kPiece> piece;  // NOLINT(*-member-init): read fills it
+    std::array<char, kPieceSize> piece;  // NOLINT(*-member-init): read fills it
     const ssize_t size = ::read(STDIN_FILENO, piece.data(), piece.size());
     if (size <= 0) return;  // also the end of input that a key makes; there may be more later
     take({piece.data(), static_cast<std::size_t>(size)});
