@@ -42,6 +42,12 @@ class Edges:
         self._codes = [
             (int(code["code"], 16), code["minimumLength"]) for code in technology["codes"]
         ]
+        self._extents = [
+            (int(code["code"], 16), requirement)
+            for code in technology["codes"] for readings in code["takers"]
+            for reading in readings for requirement in reading["requirements"]
+            if requirement["kind"] in ("holdsRecords", "endsWithRecords")
+        ]
         self._random = random.Random(seed)
 
     def bytes(self, count):
@@ -59,7 +65,8 @@ class Edges:
             if len(lengths) > 100:
                 lengths = lengths[:15] + lengths[-50::7]
             for length in lengths:
-                yield message(code, self.bytes(length))
+                fill = self.bytes if length % 7 == 0 else self._small
+                yield message(code, fill(length))
         for length in range(HEADER_SIZE + 4):
             yield message(self._codes[0][0], b"\1\2\3\4")[:length]
             yield b"\x81\0" + message(self._codes[0][0], b"\1\2\3\4")[:length]
@@ -67,10 +74,11 @@ class Edges:
     def fillings(self):
         """All bits clear, all set, and small numbers, with room for all records and without."""
         for code, least in self._codes:
-            for length in (max(least, HEADER_SIZE), least + 7, least + 700):
-                size = max(length - HEADER_SIZE, 0)
-                for payload in (bytes(size), b"\xff" * size, self._small(size), self._small(size)):
-                    yield message(code, payload)
+            size = max(least - HEADER_SIZE, 0)
+            yield message(code, bytes(size + 7))
+            yield message(code, b"\xff" * size)
+            for payload in (b"\xff" * (size + 700), self._small(size + 700), self._small(size + 70)):
+                yield message(code, payload)
 
     def odd_frames(self):
         """Unknown codes and types, prefixes, property lists that are none."""
@@ -82,6 +90,18 @@ class Edges:
             yield message(code | EXTRA_CODES, b"bplist00" + self.bytes(30))
             yield message(code | EXTRA_CODES, b"<plist version='1.0'>\n<dict/>\xff\n</plist>\n")
             yield message(code | EXTRA_CODES, b"")
+
+    def fitting(self):
+        """Packets that are exactly as long as the records that they must hold, and almost so."""
+        for code, extent in self._extents:
+            for count in range(7):
+                length = extent["base"] + extent["stride"] * count
+                for fill in (self.bytes, self._small):
+                    packet = bytearray(message(code, fill(length - HEADER_SIZE)))
+                    packet[extent["count"]["offset"]] = count
+                    yield bytes(packet)
+                    yield bytes(packet)[:-1]
+                    yield bytes(packet) + b"\0"
 
     def with_sub_packets(self, code):
         """Sub-packets in order, out of order, missing, too long, and more than there are."""
@@ -117,6 +137,7 @@ class Edges:
         yield from self.every_length()
         yield from self.fillings()
         yield from self.odd_frames()
+        yield from self.fitting()
         for code, _ in self._codes:
             if code in (0x119C, 0x119D):
                 yield from self.with_sub_packets(code)

@@ -1,10 +1,11 @@
 # SPDX-License-Identifier: MIT
 """The dissector for Wireshark, in tshark, against what `kestro-cli explain` says of the same messages.
 
-The programs are found through $KESTRO_CLI and $KESTRO_TELEPHONYD, the dissector through
-$KESTRO_DISSECTOR. $KESTRO_DISSECTOR_MESSAGES is how many random packets of each of the four
-technologies are compared, besides the simulations' and the edges."""
+The program is found through $KESTRO_CLI, the dissector through $KESTRO_DISSECTOR.
+$KESTRO_DISSECTOR_MESSAGES is how many random packets of each of the four technologies are compared,
+besides the simulations' and the edges."""
 
+import collections
 import itertools
 import json
 import os
@@ -14,14 +15,12 @@ import shutil
 import struct
 import subprocess
 import tempfile
-import time
 import unittest
 
 import edge_packets
 import pdml
 
 CLI = os.environ.get("KESTRO_CLI", "kestro-cli")
-TELEPHONYD = os.environ.get("KESTRO_TELEPHONYD", "kestro-telephonyd")
 DISSECTOR = os.environ.get("KESTRO_DISSECTOR", "kestro.lua")
 RANDOM_MESSAGES = int(os.environ.get("KESTRO_DISSECTOR_MESSAGES", "100"))
 PATIENCE = 600
@@ -63,45 +62,37 @@ class Dissector(unittest.TestCase):
         self.addCleanup(folder.cleanup)
         self.folder = pathlib.Path(folder.name)
 
-    def compare(self, technology, capture):
-        """Compares every message of a capture; how many values these have."""
-        explained = json.loads(run(CLI, "explain", "--format=json", str(capture)).stdout)
-        comparison = pdml.Comparison(TECHNOLOGIES[technology][0], self.codes[technology])
+    def compare(self, recording):
+        """Compares every message of a recording with what is explained of it; how many of each
+        technology there are, and how many values they have."""
+        explained = json.loads(run(CLI, "explain", "--format=json", str(recording)).stdout)
+        comparisons = {
+            name: pdml.Comparison(word, self.codes[name]) for name, (word, _) in TECHNOLOGIES.items()
+        }
         tree = self.folder / "tree.pdml"
-        tree.write_bytes(tshark("-r", str(capture), "-T", "pdml"))
+        tree.write_bytes(tshark("-r", str(recording), "-T", "pdml"))
         self.assertNotIn(b"Lua Error", tree.read_bytes())
+        counts = collections.Counter()
         with tree.open("rb") as stream:
-            found = 0
             for proto, message in itertools.zip_longest(pdml.packets(stream), explained["messages"]):
-                found += 1
-                self.assertIsNotNone(proto, f"message {found}")
-                faults = list(comparison.faults(proto, message))
+                technology = message.get("technology", explained.get("technology"))
+                counts[technology] += 1
+                self.assertEqual(proto.get("name"), f"kestro.{TECHNOLOGIES[technology][0]}")
+                faults = list(comparisons[technology].faults(proto, message))
                 self.assertFalse(faults, f"{technology}: {json.dumps(message)[:2000]}")
-        self.assertEqual(found, len(explained["messages"]))
-        return found, comparison.values
+        return counts, sum(comparison.values for comparison in comparisons.values())
 
     def write(self, technology, messages):
         capture = self.folder / f"{technology}.pcap"
         capture.write_bytes(edge_packets.capture(TECHNOLOGIES[technology][1], messages))
         return capture
 
-    def record(self, technology):
-        """A second of the simulation, played many times as fast."""
-        environment = {**os.environ, "KESTRO_PORT_DIR": str(self.folder)}
-        source = f"--source=simulation:{technology}"
-        server = subprocess.Popen(
-            [TELEPHONYD, source, "--speed=30", f"--name={technology}"], env=environment
-        )
-        self.addCleanup(server.wait)
-        self.addCleanup(server.kill)
-        while not (self.folder / technology).exists():
-            self.assertIsNone(server.poll(), "the server has ended")
-            time.sleep(0.01)
-        capture = self.folder / "simulation.pcap"
-        arguments = (f"--server={technology}", "-o", str(capture), "--duration=0.5")
-        done = run(CLI, "record", *arguments, env=environment)
+    def convert(self, source, *options):
+        """A recording of a source, as fast as it goes."""
+        recording = self.folder / "source.pcapng"
+        done = run(CLI, "convert", source, "-o", str(recording), *options)
         self.assertEqual(done.returncode, 0, done.stderr)
-        return capture
+        return recording
 
     def fields(self, capture, *names):
         """The fields' values of every packet, one after the other."""
@@ -158,16 +149,37 @@ class Dissector(unittest.TestCase):
                 edges = edge_packets.Edges(self.codes[technology])
                 messages = list(edges.all())
                 messages += itertools.islice(edges.random(), RANDOM_MESSAGES)
-                count, values = self.compare(technology, self.write(technology, messages))
-                self.assertEqual(count, len(messages))
-                self.assertGreater(values, count)
+                counts, values = self.compare(self.write(technology, messages))
+                self.assertEqual(counts, {technology: len(messages)})
+                self.assertGreater(values, len(messages))
 
     def test_simulations(self):
         for technology in TECHNOLOGIES:
             with self.subTest(technology=technology):
-                count, values = self.compare(technology, self.record(technology))
-                self.assertGreater(count, 100)
-                self.assertGreater(values, count)
+                recording = self.convert(f"simulation:{technology}", "--to=+20s")
+                counts, values = self.compare(recording)
+                self.assertGreater(counts[technology], 100)
+                self.assertGreater(values, counts[technology])
+
+    def test_a_drive_through_two_technologies(self):
+        log = self.folder / "drive.csv"
+        log.write_text(
+            "Timestamp,NetworkMode,RSRP,RSRQ,RAWCELLID,CELLHEX,LACHEX\n"
+            "2019.11.21_15.38.36,LTE,-93,-11,27447297,1,2A\n"
+            "2019.11.21_15.38.37,UMTS,-81,-5,1234,2,2A\n"
+            "2019.11.21_15.38.38,LTE,-95,-12,27447297,1,2A\n"
+        )
+        counts, _ = self.compare(self.convert(str(log)))
+        self.assertEqual(set(counts), {"LTE", "Ondrel_GSM"})
+        self.assertGreater(min(counts.values()), 5)
+
+    def test_the_simulation_of_ifx(self):
+        recording = self.convert("simulation:IFX", "--to=+20s")
+        lists = self.fields(recording, "_ws.col.Protocol", "kestro.ifx.property_list.data")
+        self.assertGreater(len(lists), 20)
+        for protocol, data in lists:
+            self.assertEqual(protocol, "IFX")
+            self.assertTrue(bytes.fromhex(data).startswith(b"bplist00"))
 
 
 if __name__ == "__main__":
