@@ -24,6 +24,9 @@ class AutoDriveTestEncoder : public DriveTestEncoder {
     _current = &encoderOf(row.family);
     return _current->messages(row);
   }
+  [[nodiscard]] std::uint64_t leftOutCount() const override {
+    return _lte.leftOutCount() + _gsmUmts.leftOutCount();
+  }
 
  private:
   [[nodiscard]] DriveTestEncoder& encoderOf(DriveTestFamily family) {

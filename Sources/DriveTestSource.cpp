@@ -101,6 +101,10 @@ Result<void> DriveTestSource::readSecond() {
 }
 
 void DriveTestSource::reportProblems() {
+  if (const auto count = _encoder->leftOutCount(); count > 0) {
+    _report(fmt::format("{}: {} packets were left out, as they cannot hold a value of their row",
+                        _path, count));
+  }
   const auto& problems = _log.problems();
   if (problems.rows == 0 && problems.values == 0) return;
   _report(fmt::format("{}: {} rows and {} values could not be used; the first: {}", _path,

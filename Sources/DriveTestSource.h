@@ -2,6 +2,7 @@
 // The source that plays a drive-test log.
 #pragma once
 
+#include <cstdint>
 #include <deque>
 #include <functional>
 #include <memory>
@@ -29,6 +30,9 @@ class DriveTestEncoder {
 
   /// The messages that say what `row` says, in order; none when the technology cannot say it.
   [[nodiscard]] virtual std::vector<Bytes> messages(const DriveTestRow& row) = 0;
+
+  /// How many messages were left out so far because they cannot hold a value of their row.
+  [[nodiscard]] virtual std::uint64_t leftOutCount() const { return 0; }
 };
 
 /// Yields a drive-test log's rows at their times. The log counts in seconds: the rows of one second

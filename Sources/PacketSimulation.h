@@ -3,6 +3,7 @@
 #pragma once
 
 #include <chrono>
+#include <cstdint>
 #include <deque>
 #include <functional>
 #include <memory>
@@ -34,13 +35,20 @@ inline constexpr std::chrono::milliseconds kSimulationStep{500};
 /// The packets of one step, in order. A packet that could not carry its values is left out.
 class PacketList {
  public:
+  /// Without a packet, one is left out: it could not hold its values.
   void add(std::optional<Bytes> packet) {
-    if (packet) _packets.push_back(std::move(*packet));
+    if (packet) {
+      _packets.push_back(std::move(*packet));
+    } else {
+      ++_leftOutCount;
+    }
   }
+  [[nodiscard]] std::uint64_t leftOutCount() const noexcept { return _leftOutCount; }
   [[nodiscard]] std::vector<Bytes> take() { return std::exchange(_packets, {}); }
 
  private:
   std::vector<Bytes> _packets;
+  std::uint64_t _leftOutCount = 0;
 };
 
 /// What one technology's baseband reports on a simulated drive. The same sequence in every run.

@@ -32,6 +32,7 @@ std::vector<Bytes> GsmUmtsDriveTestEncoder::messages(const DriveTestRow& row) {
   } else {
     addGSMCell(row, packets);
   }
+  _leftOutCount += packets.leftOutCount();
   return packets.take();
 }
 

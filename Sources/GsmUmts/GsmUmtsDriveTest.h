@@ -23,6 +23,7 @@ class GsmUmtsDriveTestEncoder : public DriveTestEncoder {
 
   [[nodiscard]] std::string_view technology() const override;
   [[nodiscard]] std::vector<Bytes> messages(const DriveTestRow& row) override;
+  [[nodiscard]] std::uint64_t leftOutCount() const override { return _leftOutCount; }
 
  private:
   void addStates(const DriveTestRow& row, PacketList& packets);
@@ -31,6 +32,7 @@ class GsmUmtsDriveTestEncoder : public DriveTestEncoder {
 
   const PropertyListCoding& _coding;
   bool _hasSentFiles = false;
+  std::uint64_t _leftOutCount = 0;
 };
 
 }  // namespace kestro

@@ -14,6 +14,15 @@ namespace {
 
 constexpr unsigned kPhysicalCellIds = 504;
 
+/// RSRQ is N times RSRP over RSSI; N, the resource blocks that RSSI is measured over, is 6 at
+/// least: 10 lg 6 = 7.8 dB.
+constexpr double kLeastBlocksDecibels = 7.8;
+
+/// The log's RSSI, or what RSRP and RSRQ make of it before the log has had one.
+double rssiIn(const DriveTestRow& row, double rsrp, double rsrq) {
+  return numberIn(row, DriveTestColumn::TotalPower).value_or(rsrp - rsrq + kLeastBlocksDecibels);
+}
+
 /// The cell as far as the log knows it; absent without its identity.
 std::optional<LTECell> cellIn(const DriveTestRow& row) {
   const auto identity = integerIn(row, DriveTestColumn::RawCellId, 10);
@@ -28,9 +37,8 @@ std::optional<LTECell> cellIn(const DriveTestRow& row) {
 std::optional<LTEServing> servingIn(const DriveTestRow& row, const std::optional<LTECell>& cell) {
   const auto rsrp = numberIn(row, DriveTestColumn::Level);
   const auto rsrq = numberIn(row, DriveTestColumn::Quality);
-  const auto rssi = numberIn(row, DriveTestColumn::TotalPower);
-  if (!cell || !rsrp || !rsrq || !rssi) return std::nullopt;
-  const LTELevel level{.rsrp = *rsrp, .rsrq = *rsrq, .rssi = *rssi};
+  if (!cell || !rsrp || !rsrq) return std::nullopt;
+  const LTELevel level{.rsrp = *rsrp, .rsrq = *rsrq, .rssi = rssiIn(row, *rsrp, *rsrq)};
   return LTEServing{.cell = *cell, .now = level, .average = level, .reselection = {.priority = 6}};
 }
 
@@ -74,14 +82,19 @@ std::vector<Bytes> LTEDriveTestEncoder::messages(const DriveTestRow& row) {
     packets.add(extraPacket(kCellMonitorPacket, cellMonitorList(*cell), _coding, time));
   }
   addLists(packets, time);
-  const auto serving = servingIn(row, cell);
-  if (!serving) return packets.take();
-  packets.add(lteServingCell(*serving, time));
-  std::vector<LTENeighbour> neighbours;
-  if (const auto neighbour = neighbourIn(row, *serving)) neighbours.push_back(*neighbour);
-  packets.add(lteIntraFrequency(*serving, neighbours, {}, 0, time));
-  if (!neighbours.empty()) packets.add(lteNeighbours(*serving, neighbours, time));
+  if (const auto serving = servingIn(row, cell)) addLevels(row, *serving, packets);
+  _leftOutCount += packets.leftOutCount();
   return packets.take();
+}
+
+void LTEDriveTestEncoder::addLevels(const DriveTestRow& row, const LTEServing& serving,
+                                    PacketList& packets) {
+  const Moment time = row.time;
+  packets.add(lteServingCell(serving, time));
+  std::vector<LTENeighbour> neighbours;
+  if (const auto neighbour = neighbourIn(row, serving)) neighbours.push_back(*neighbour);
+  packets.add(lteIntraFrequency(serving, neighbours, {}, 0, time));
+  if (!neighbours.empty()) packets.add(lteNeighbours(serving, neighbours, time));
 }
 
 void LTEDriveTestEncoder::addLists(PacketList& packets, Moment time) {

@@ -81,8 +81,25 @@ TEST_F(LTEDriveTestTest, SendsFilesAndContextsOnce) {
   EXPECT_THAT(codes, ElementsAre(0xB0C2, 0xB0C1, 0xFF0001, 0xB17F, 0xB179, 0xB180));
 }
 
-TEST_F(LTEDriveTestTest, SendsNoPacketOneOfWhoseValuesTheLogHasNotHadYet) {
+TEST_F(LTEDriveTestTest, MakesUpTheRssiOfALogThatHasHadNone) {
   show("2020.01.02_03.04.05,LTE,-90,-7,-,9CBA,87966209,-,-\n");
+  EXPECT_EQ(display.text("Serving Cell Measurements", "Measured RSRP"), "-90.00 dBm");
+  // -90 + 7 + 7.8 = -75.2, to the next half dBm
+  EXPECT_EQ(display.text("Serving Cell Measurements", "Measured RSSI"), "-75.00 dBm");
+  show("2020.01.02_03.04.06,LTE,-90,-7,-72,9CBA,87966209,-,-\n");
+  EXPECT_EQ(display.text("Serving Cell Measurements", "Measured RSSI"), "-72.00 dBm");
+}
+
+TEST_F(LTEDriveTestTest, ARssiThatTheLogHasHadStays) {
+  show(
+      "2020.01.02_03.04.05,LTE,-90,-7,-72,9CBA,87966209,-,-\n"
+      "2020.01.02_03.04.06,LTE,-100,-9,-,9CBA,87966209,-,-\n");
+  EXPECT_EQ(display.text("Serving Cell Measurements", "Measured RSRP"), "-100.00 dBm");
+  EXPECT_EQ(display.text("Serving Cell Measurements", "Measured RSSI"), "-72.00 dBm");
+}
+
+TEST_F(LTEDriveTestTest, SendsNoPacketOneOfWhoseValuesTheLogHasNotHadYet) {
+  show("2020.01.02_03.04.05,LTE,-90,-,-72,9CBA,87966209,-,-\n");
   EXPECT_THAT(codes, ElementsAre(0xB0C2, 0xB0C1, 0xFF0001, 0xFF0000, 0xFF0002));
 }
 
@@ -102,6 +119,7 @@ TEST_F(LTEDriveTestTest, KeepsTheLastValueForADash) {
 
 TEST_F(LTEDriveTestTest, LeavesOutAPacketThatCannotCarryItsValue) {
   show("2020.01.02_03.04.05,LTE,-190,-7,-72,9CBA,87966209,-95.0,-16.0\n");
+  EXPECT_EQ(_encoder.leftOutCount(), 2U);  // what would say the serving cell's level
   EXPECT_EQ(display.text("Serving Cell Measurements", "Measured RSRP"), "(none)");
   EXPECT_EQ(display.text("Serving Cell Info", "Cell Identity"), "87966209");
 }
