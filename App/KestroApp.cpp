@@ -2,15 +2,21 @@
 #include "App/KestroApp.h"
 
 #include <QAccessible>
+#include <QDesktopServices>
+#include <QFileInfo>
 #include <QIcon>
 #include <QPixmap>
 #include <QScreen>
+#include <QStringList>
+#include <QUrl>
 #include <utility>
 
 #include "App/Toolkit/Accessibility.h"
+#include "Model/ConnectionProblem.h"
 #include "Platform/Bundle.h"
 #include "Platform/Clock.h"
 #include "Platform/DeviceRoot.h"
+#include "Platform/LogSourceState.h"
 #include "Platform/MainQueue.h"
 #include "Platform/Preferences.h"
 
@@ -21,6 +27,13 @@ constexpr std::size_t kRoot = 0;
 constexpr std::string_view kRootPath = "/";
 
 QString connecting() { return QStringLiteral("Connecting..."); }
+
+/// A text that stands by itself, with a capital letter.
+QString sentence(const std::string& text) {
+  QString result = QString::fromStdString(text);
+  if (!result.isEmpty()) result[0] = result[0].toUpper();
+  return result;
+}
 
 QIcon iconOf(const Bundle& bundle) {
   const auto contents = bundle.resource("org.kestro.Kestro", "png");
@@ -51,12 +64,16 @@ bool KestroApp::notify(QObject* receiver, QEvent* event) noexcept {
 void KestroApp::applicationDidFinishLaunching(Platform& platform, const LaunchOptions& options) {
   _platform = &platform;
   _isPlain = options.plain;
+  _serverName = options.serverName;
+  _isDemo = options.isDemo;
+  _isRenewed = true;
   getRSSIPref();
   getSaveButtonPref();
-  _systemColours = std::make_unique<SystemColours>();
+  _systemColours = std::make_unique<SystemColours>(options.style);
   createWindow(options.windowSize);
   _model = KestroModel::create(platform, [this] { updateViewControllerFromModel(); });
   _model->setConnectionHandler([this](bool) { connectionChanged(); });
+  _model->setNewsHandler([this] { updateOrigin(); });
   _updateMessage = connecting();
   showRootPane();
   if (options.connectsAtLaunch) connectAfterFirstFrame();
@@ -195,7 +212,45 @@ void KestroApp::reloadPanes() {
 
 void KestroApp::connectionChanged() {
   if (!_model) return;  // after the exit, by a retry that was queued before
+  updateOrigin();
   updateStatusForViewController(paneAt(_navController->viewControllers().size() - 1));
+}
+
+// --- Origin --------------------------------------------------------------------------------------
+
+/// In the window's title, and in a line of its own above the panes.
+void KestroApp::updateOrigin() {
+  if (!_model || !_window) return;
+  QStringList parts;
+  for (const std::string& part : {_model->technology(), sourceText(_model->source())}) {
+    if (!part.empty()) parts.append(QString::fromStdString(part));
+  }
+  // Before the first connection there is nothing to tell.
+  if (!parts.isEmpty()) parts.append(_isDemo ? tr("demo") : QString::fromStdString(_serverName));
+  _window->noticeBar().setOrigin(parts.join(QStringLiteral(" · ")));
+  _window->noticeBar().setNotice(noticeText());
+  parts.append(QStringLiteral("Kestro"));
+  _window->setWindowTitle(parts.join(QStringLiteral(" · ")));
+  updateRenewal();
+}
+
+QString KestroApp::noticeText() const {
+  if (_model->problem()) return sentence(problemText(*_model->problem(), _serverName));
+  const LogSourceState& source = _model->source();
+  if (!_model->isConnected() || !source.hasEnded.value_or(false)) return {};
+  return sentence(sourceEndedText(source));
+}
+
+void KestroApp::updateRenewal() {
+  const bool isRenewed = _model->isConnected() && !_model->source().hasEnded.value_or(false);
+  if (std::exchange(_isRenewed, isRenewed) == isRenewed) return;
+  for (std::size_t i = 0; i < _navController->viewControllers().size(); ++i) {
+    paneAt(i).updateRenewal();
+  }
+}
+
+void KestroApp::rowCopied(const QString& text) {
+  _window->noticeBar().showMessage(tr("Copied: %1").arg(QString(text).replace(u'\t', u' ')));
 }
 
 // --- Saving --------------------------------------------------------------------------------------
@@ -204,8 +259,10 @@ void KestroApp::showSaveView() {
   if (_saveViewController) return;
   auto screen = std::make_unique<KestroSaveViewController>(
       *_platform, _model->getSaveContents(),
-      KestroSaveViewController::Handlers{.close = [this] { closeSaveView(); },
-                                         .writeFailed = [this] { showFileError(); }});
+      KestroSaveViewController::Handlers{
+          .close = [this] { closeSaveView(); },
+          .writeFailed = [this] { showFileError(); },
+          .saved = [this](const std::string& path) { showSaved(path); }});
   _saveViewController = screen.get();
   _navController->present(std::move(screen), true);
 }
@@ -216,6 +273,13 @@ void KestroApp::closeSaveView() {
   _navController->dismiss(true);
 }
 
+void KestroApp::showSaved(const std::string& path) {
+  const QString file = QString::fromStdString(path);
+  const QUrl folder = QUrl::fromLocalFile(QFileInfo(file).path());
+  _window->noticeBar().showMessage(tr("Saved as %1").arg(file), tr("Open Folder"),
+                                   [folder] { QDesktopServices::openUrl(folder); });
+}
+
 void KestroApp::showFileError() {
   _alert = new AlertView(tr("File Error"), tr("Unable to write file to disk"), tr("Close"),
                          _window.get());
@@ -224,7 +288,9 @@ void KestroApp::showFileError() {
 
 bool KestroApp::saveHistory(std::string_view description) {
   if (!_model) return false;
-  return Snapshot(_platform->clock(), _model->getSaveContents()).save(*_platform, description);
+  return Snapshot(_platform->clock(), _model->getSaveContents())
+      .save(*_platform, description)
+      .has_value();
 }
 
 }  // namespace kestro

@@ -9,6 +9,7 @@
 #include <chrono>
 #include <memory>
 #include <optional>
+#include <string>
 #include <string_view>
 
 #include "App/MainWindow.h"
@@ -19,6 +20,7 @@
 #include "App/Toolkit/SystemColours.h"
 #include "Model/KestroModel.h"
 #include "Platform/Platform.h"
+#include "Platform/TelephonyProtocol.h"
 
 namespace kestro {
 
@@ -36,6 +38,11 @@ struct LaunchOptions {
   std::optional<QSize> windowSize;
   /// No marks at values that have changed.
   bool plain = false;
+  ColourStyle style = ColourStyle::System;
+  /// The port that is connected to, as the title and notices call it.
+  std::string serverName = std::string(kDefaultServerName);
+  /// Whether that is a server of the program's own.
+  bool isDemo = false;
   /// Whether connecting begins by itself, once the first frame is shown; else `restartMonitor` does
   /// it.
   bool connectsAtLaunch = true;
@@ -108,6 +115,8 @@ class KestroApp : public QApplication, private PaneHost {
  private:
   [[nodiscard]] bool marksChanges() const override { return !_isPlain; }
   void pushPane(std::unique_ptr<ViewController> pane) override;
+  [[nodiscard]] bool isRenewed() const override { return _isRenewed; }
+  void rowCopied(const QString& text) override;
 
   void createWindow(const std::optional<QSize>& size);
   void placeWindow(const std::optional<QSize>& size);
@@ -115,6 +124,10 @@ class KestroApp : public QApplication, private PaneHost {
   void connectAfterFirstFrame();
   void reloadPanes();
   void connectionChanged();
+  void updateOrigin();
+  void updateRenewal();
+  [[nodiscard]] QString noticeText() const;
+  void showSaved(const std::string& path);
   void showFileError();
   [[nodiscard]] KestroPaneController& paneAt(std::size_t index) const;
 
@@ -130,6 +143,9 @@ class KestroApp : public QApplication, private PaneHost {
   std::unique_ptr<SystemColours> _systemColours;
   QPointer<AlertView> _alert;
   bool _isPlain = false;
+  std::string _serverName;
+  bool _isDemo = false;
+  bool _isRenewed = true;  ///< also before there is anything that could be renewed
 };
 
 }  // namespace kestro

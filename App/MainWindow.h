@@ -7,10 +7,12 @@
 #include <memory>
 
 #include "App/Toolkit/NavigationController.h"
+#include "App/Toolkit/NoticeBar.h"
 
 namespace kestro {
 
-/// Holds a navigation stack, which fills it and which it owns. It is empty at first.
+/// Holds a navigation stack, which it owns, below the lines of a notice bar. It is empty at first.
+/// Ctrl-Q and Ctrl-W close it, F11 gives it the whole screen and takes that back.
 class MainWindow : public QWidget {
   Q_OBJECT
 
@@ -18,6 +20,8 @@ class MainWindow : public QWidget {
   MainWindow();
 
   void setNavController(std::unique_ptr<NavigationController> navController);
+
+  [[nodiscard]] NoticeBar& noticeBar() const noexcept { return *_noticeBar; }
 
   /// Called once, while the window is painted for the first time.
   void setFirstFrameHandler(std::function<void()> handler) { _firstFrame = std::move(handler); }
@@ -27,6 +31,11 @@ class MainWindow : public QWidget {
   void resizeEvent(QResizeEvent* event) override;
 
  private:
+  void placeParts();
+  void addShortcuts();
+  void toggleFullScreen();
+
+  NoticeBar* _noticeBar;
   NavigationController* _navController = nullptr;
   std::function<void()> _firstFrame;
 };

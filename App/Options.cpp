@@ -21,13 +21,17 @@ namespace {
 constexpr int kSmallestSide = 240;
 constexpr int kLargestSide = 16384;
 constexpr double kLongestDelay = 86400;
+constexpr const char* kLight = "light";
+constexpr const char* kDark = "dark";
 
 constexpr const char* kKeys =
     R"(  arrows, Page Up and Down, Home, End   move from row to row
-  Enter          opens the row
+  Enter                                 opens the row, or the first one
   Backspace, Escape                     go back
-  Ctrl-S         saves a snapshot, where saving is offered
-  Ctrl-C         copies the row as "key<TAB>value")";
+  Ctrl-S                                saves a snapshot, where saving is offered
+  Ctrl-C                                copies the row as "key<TAB>value"
+  F11                                   the whole screen, and back
+  Ctrl-W, Ctrl-Q                        close the window)";
 constexpr const char* kExamples = R"(  kestro --demo --size=390x780
   kestro --demo=capture:drive.pcap
   kestro --demo --screenshot=kestro.png --after=5)";
@@ -68,6 +72,10 @@ std::vector<OptionRow> windowOptions(Options& options) {
        .target = &options.size,
        .problem = sizeProblem},
       {.name = "--plain", .help = "Do not mark values that have changed", .target = &options.plain},
+      {.name = "--style",
+       .help = "The window's colours; otherwise those of the desktop",
+       .target = &options.style,
+       .choices = {{kLight, ""}, {kDark, ""}}},
       {.name = "--screenshot",
        .value = "FILE",
        .help = "Write a picture of the window, end",
@@ -85,6 +93,11 @@ std::vector<OptionRow> windowOptions(Options& options) {
 }  // namespace
 
 std::optional<QSize> Options::windowSize() const { return sizeFrom(size); }
+
+ColourStyle Options::colourStyle() const {
+  if (style.empty()) return ColourStyle::System;
+  return style == kDark ? ColourStyle::Dark : ColourStyle::Light;
+}
 
 CommandRow Options::program(const Bundle& bundle, Options& options) {
   CommandRow program{

@@ -6,6 +6,7 @@
 #include <optional>
 #include <string>
 
+#include "App/Toolkit/SystemColours.h"
 #include "Options/CommandRow.h"
 #include "Options/ProgramOptions.h"
 
@@ -15,10 +16,12 @@ struct Options {
   LiveOptions live;
   std::string size;  ///< as in "390x780"; empty: the screen's
   bool plain = false;
+  std::string style;       ///< "light" or "dark"; empty: the desktop's
   std::string screenshot;  ///< the file of a picture to take before ending; empty: none
   double after = 5;        ///< seconds until then
 
   [[nodiscard]] std::optional<QSize> windowSize() const;
+  [[nodiscard]] ColourStyle colourStyle() const;
 
   /// The program's rows, which fill `options` when they are parsed; both must live until then.
   [[nodiscard]] static CommandRow program(const Bundle& bundle, Options& options);

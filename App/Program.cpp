@@ -71,6 +71,9 @@ class Run {
     _platform->setTerminationHandler([this] { finish(kDone, ""); });
     _app.applicationDidFinishLaunching(*_platform, {.windowSize = _options.windowSize(),
                                                     .plain = _options.plain,
+                                                    .style = _options.colourStyle(),
+                                                    .serverName = _options.live.serverName,
+                                                    .isDemo = _demo != nullptr,
                                                     .connectsAtLaunch = _demo == nullptr});
     if (_demo != nullptr) watchDemo();
     if (!_options.screenshot.empty()) scheduleScreenshot();
@@ -150,8 +153,9 @@ int runProgram(int argumentCount, char** arguments) {
   std::signal(SIGPIPE, SIG_IGN);
   std::unique_ptr<DemoServer> demo;
   if (!options.live.demoSource.empty()) {
-    auto started = startDemoServer(
-      {.source = options.live.demoSource, .speed = options.live.demoSpeed, .loops = options.live.demoLoops});
+    auto started = startDemoServer({.source = options.live.demoSource,
+                                    .speed = options.live.demoSpeed,
+                                    .loops = options.live.demoLoops});
     if (!started) {
       complain(started.error().message);
       return kNothingDone;

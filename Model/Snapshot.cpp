@@ -35,12 +35,12 @@ Result<Bytes> Snapshot::file(const PropertyListCoding& coding, std::string_view 
   return snapshotFile(coding, dictionary(description));
 }
 
-bool Snapshot::save(Platform& platform, std::string_view description) const {
+std::optional<std::string> Snapshot::save(Platform& platform, std::string_view description) const {
   const std::string path = snapshotPath(platform.clock().now());
   const auto contents = file(platform.propertyListCoding(), description);
-  if (contents && platform.deviceRoot().write(path, *contents)) return true;
+  if (contents && platform.deviceRoot().write(path, *contents)) return path;
   platform.systemLog().log(LogPriority::Error, "Unable to write snapshot to {}", path);
-  return false;
+  return std::nullopt;
 }
 
 std::string entryDescription(const Value& entry) {

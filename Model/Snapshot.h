@@ -3,6 +3,7 @@
 // the device.
 #pragma once
 
+#include <optional>
 #include <string>
 #include <string_view>
 
@@ -41,9 +42,11 @@ class Snapshot {
   [[nodiscard]] Result<Bytes> file(const PropertyListCoding& coding,
                                    std::string_view description) const;
 
-  /// Writes the file on the device, in place, under the path for this moment. A failure leaves its
-  /// line in the system log (priority error), perhaps part of the file, and yields false.
-  [[nodiscard]] bool save(Platform& platform, std::string_view description) const;
+  /// Writes the file on the device, in place, under the path for this moment, which is returned. A
+  /// failure leaves its line in the system log (priority error), perhaps part of the file, and
+  /// yields nothing.
+  [[nodiscard]] std::optional<std::string> save(Platform& platform,
+                                                std::string_view description) const;
 
  private:
   std::string _timeStamp;

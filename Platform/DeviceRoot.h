@@ -2,6 +2,7 @@
 // The device's file system, as far as the program uses it: absolute device paths under one root.
 #pragma once
 
+#include <string>
 #include <string_view>
 
 #include "Platform/Bytes.h"
@@ -18,6 +19,9 @@ class DeviceRoot {
 
   /// Whether something exists at the absolute device path.
   [[nodiscard]] virtual bool exists(std::string_view devicePath) const = 0;
+
+  /// Where the absolute device path lies in this system's own files.
+  [[nodiscard]] virtual std::string hostPath(std::string_view devicePath) const = 0;
 
   /// Writes a whole file in place (not atomically), replacing an earlier one. Makes no directory.
   /// A failure says why and may leave part of the file.

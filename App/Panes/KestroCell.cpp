@@ -14,6 +14,9 @@ namespace {
 constexpr int kValuePoints = 15;
 constexpr QMarginsF kMarkMargins(7, 3, 7, 3);
 constexpr qreal kEdgeWidth = 24;
+/// How much of the text's colour a value has, and one that is not renewed.
+constexpr qreal kValueShare = 0.82;
+constexpr qreal kKeptValueShare = 0.5;
 
 /// What both texts are measured in, whatever they are drawn in.
 const TextStyle& measuringStyle() { return systemTextStyle(kValuePoints, QFont::Bold); }
@@ -36,6 +39,10 @@ void KestroCell::setValue(const QString& text) {
   if (!_value) return;
   _value->text = text;
   updateAccessibleName();
+}
+
+void KestroCell::setRenewed(bool isRenewed) {
+  if (std::exchange(_isRenewed, isRenewed) != isRenewed) update();
 }
 
 void KestroCell::updateAccessibleName() {
@@ -95,9 +102,19 @@ bool KestroCell::scrollContentBy(qreal distance) {
   return true;
 }
 
+QString KestroCell::hiddenText() const {
+  if (_layout == Layout::Key) {
+    const qreal room = contentBounds().width() - _key.frame.left();
+    return _key.frame.width() > room ? _key.text : QString();
+  }
+  return maximumOffset() > 0 ? _key.text + u'\n' + value() : QString();
+}
+
 QRectF KestroCell::markedArea() const {
   if (!_value) return contentBounds();
-  return _value->frame.translated(-_offset, 0).marginsAdded(kMarkMargins);
+  QRectF drawn = _value->frame.translated(-_offset, 0);
+  drawn.setWidth(_value->style().size(_value->text).width());
+  return drawn.marginsAdded(kMarkMargins);
 }
 
 void KestroCell::paintContent(QPainter& painter) {
@@ -110,7 +127,8 @@ void KestroCell::paintContent(QPainter& painter) {
   painter.translate(-_offset, 0);
   keyStyle.draw(painter, _key.frame, _key.text);
   if (_value) {
-    painter.setPen(mixed(coloursOf(palette()).row, coloursOf(palette()).text, 0.82));
+    painter.setPen(mixed(coloursOf(palette()).row, coloursOf(palette()).text,
+                         _isRenewed ? kValueShare : kKeptValueShare));
     _value->style().draw(painter, _value->frame, _value->text);
   }
   painter.translate(_offset, 0);

@@ -35,6 +35,10 @@ class KestroCell : public TableCell {
   /// Does nothing in a key-only cell.
   void setValue(const QString& text);
 
+  /// A value that is not renewed is drawn faint.
+  void setRenewed(bool isRenewed);
+  [[nodiscard]] bool isRenewed() const noexcept { return _isRenewed; }
+
   /// Places the key alone.
   void setLayoutKey();
   /// Places key and value in their container.
@@ -49,10 +53,12 @@ class KestroCell : public TableCell {
   [[nodiscard]] qreal containerOffset() const noexcept { return _offset; }
 
   bool scrollContentBy(qreal distance) override;
+  [[nodiscard]] QString hiddenText() const override;
 
  protected:
   void paintContent(QPainter& painter) override;
   void layoutContent() override;
+  /// As wide as the value is drawn, not as it is measured.
   [[nodiscard]] QRectF markedArea() const override;
 
  private:
@@ -71,6 +77,7 @@ class KestroCell : public TableCell {
   QSizeF _contentSize;
   qreal _offset = 0;
   Layout _layout = Layout::Key;
+  bool _isRenewed = true;
 };
 
 }  // namespace kestro

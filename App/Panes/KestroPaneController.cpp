@@ -28,7 +28,8 @@ KestroPaneController::KestroPaneController(PaneHost& host, NodePointer node, std
   _table->setDataSource({.numberOfRows = [this] { return rowCount(); },
                          .cellForRow = [this](int row) { return cellForRow(row); },
                          .rowSelected = [this](int row) { rowSelected(row); },
-                         .textOfRow = [this](int row) { return textOfRow(row); }});
+                         .textOfRow = [this](int row) { return textOfRow(row); },
+                         .copied = [this](const QString& text) { _host.rowCopied(text); }});
   updateTitle();
   _table->reloadData();
 }
@@ -81,6 +82,8 @@ void KestroPaneController::reloadWithNode(NodePointer node) {
   createToolbarItems();
 }
 
+void KestroPaneController::updateRenewal() { _table->reloadData(); }
+
 /// Rows may have come or gone above the one that has the focus.
 void KestroPaneController::keepFocusOn(const std::string& name) {
   const int focused = _table->focusedRow();
@@ -109,6 +112,7 @@ std::unique_ptr<TableCell> KestroPaneController::cellForRow(int row) {
   cell->setKey(QString::fromStdString(node.displayName()));
   cell->setAccessory(isTree ? CellAccessory::DisclosureIndicator : CellAccessory::None);
   cell->setValue(isTree ? QString() : QString::fromStdString(*node.value()));
+  cell->setRenewed(_host.isRenewed());
   if (isTree) {
     cell->setLayoutKey();
   } else {

@@ -25,7 +25,11 @@ class PaneHost {
   [[nodiscard]] virtual bool allowSaveButton() const = 0;
   /// Whether values that have changed are marked for a moment.
   [[nodiscard]] virtual bool marksChanges() const = 0;
+  /// Whether values are still renewed; what is not is drawn so that nobody takes it for live.
+  [[nodiscard]] virtual bool isRenewed() const { return true; }
   virtual void showSaveView() = 0;
+  /// A row's text is on the clipboard now.
+  virtual void rowCopied(const QString& /*text*/) {}
   /// Puts a pane on top of the stack, animated.
   virtual void pushPane(std::unique_ptr<ViewController> pane) = 0;
 };
@@ -44,6 +48,8 @@ class KestroPaneController : public ViewController {
   void setStatus(const QString& status, bool isLoading);
   /// Shows another node in this one's place, with the scroll position and the focus as they are.
   void reloadWithNode(NodePointer node);
+  /// Shows whether its values are renewed, as the host says now.
+  void updateRenewal();
   /// The pane's path in the tree; "/" for the root.
   [[nodiscard]] const std::string& path() const noexcept { return _keyPath; }
 

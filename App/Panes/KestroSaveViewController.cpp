@@ -11,6 +11,7 @@
 #include "App/Toolkit/Colours.h"
 #include "App/Toolkit/Column.h"
 #include "App/Toolkit/TextStyle.h"
+#include "Platform/DeviceRoot.h"
 #include "Platform/MainQueue.h"
 #include "ui_KestroSaveViewController.h"
 
@@ -119,8 +120,9 @@ std::unique_ptr<TableCell> KestroSaveViewController::cellForRow(int row) {
 }
 
 void KestroSaveViewController::savePressed() {
-  const bool saved = _snapshot.save(_platform, _ui->saveDescription->text().toStdString());
-  if (!saved && _handlers.writeFailed) _handlers.writeFailed();
+  const auto path = _snapshot.save(_platform, _ui->saveDescription->text().toStdString());
+  if (!path && _handlers.writeFailed) _handlers.writeFailed();
+  if (path && _handlers.saved) _handlers.saved(_platform.deviceRoot().hostPath(*path));
   postClose();
 }
 

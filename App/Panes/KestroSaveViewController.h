@@ -6,6 +6,7 @@
 #include <QWidget>
 #include <functional>
 #include <memory>
+#include <string>
 
 #include "App/Toolkit/TableView.h"
 #include "Model/Snapshot.h"
@@ -26,6 +27,8 @@ class KestroSaveViewController : public QWidget {
   struct Handlers {
     std::function<void()> close;        ///< called in a later turn of the main queue
     std::function<void()> writeFailed;  ///< called at once when the file cannot be written
+    /// Called at once when it was, with its path in this system's own files.
+    std::function<void(const std::string& path)> saved = {};
   };
 
   /// The snapshot's time is now, and its contents are a copy of `saveContents` (null for none).

@@ -23,7 +23,7 @@ struct CellFrames {
 
 /// The frames of a key/value cell in the content area's `bounds`; `key` and `value` are the sizes
 /// of their texts. The value is flush with the right edge where both fit with a gap between them,
-/// else it follows the key, and the container scrolls.
+/// else it stands below the key; the container scrolls where one of them is wider than the area.
 [[nodiscard]] CellFrames keyValueFrames(const QRectF& bounds, const QSizeF& key,
                                         const QSizeF& value);
 

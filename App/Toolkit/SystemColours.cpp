@@ -54,7 +54,26 @@ QPalette darkPalette() {
   return palette;
 }
 
-SystemColours::SystemColours() : _usualPalette(QApplication::palette()) {
+QPalette lightPalette() {
+  constexpr QColor kText(0x1c, 0x1c, 0x1e);
+  QPalette palette(QColor(0xe6, 0xe6, 0xe6));
+  palette.setColor(QPalette::Window, QColor(0xf2, 0xf2, 0xf2));
+  palette.setColor(QPalette::WindowText, kText);
+  palette.setColor(QPalette::Base, Qt::white);
+  palette.setColor(QPalette::Text, kText);
+  palette.setColor(QPalette::ButtonText, kText);
+  palette.setColor(QPalette::PlaceholderText, QColor(0x8e, 0x8e, 0x93));
+  palette.setColor(QPalette::Highlight, QColor(0x1c, 0x71, 0xd8));
+  palette.setColor(QPalette::HighlightedText, Qt::white);
+  return palette;
+}
+
+SystemColours::SystemColours(ColourStyle style)
+    : _usualPalette(QApplication::palette()), _isChosen(style != ColourStyle::System) {
+  if (_isChosen) {
+    QApplication::setPalette(style == ColourStyle::Dark ? darkPalette() : lightPalette());
+    return;
+  }
   const auto address = busAddress();
   if (!address || isDark(_usualPalette)) return;
   // Connecting has no time limit, so it gets a thread that can be left behind.
@@ -68,7 +87,10 @@ SystemColours::SystemColours() : _usualPalette(QApplication::palette()) {
   }).detach();
 }
 
-SystemColours::~SystemColours() { QDBusConnection::disconnectFromBus(connectionName()); }
+SystemColours::~SystemColours() {
+  QDBusConnection::disconnectFromBus(connectionName());
+  if (_isChosen) QApplication::setPalette(_usualPalette);
+}
 
 void SystemColours::follow() {
   QDBusConnection bus(connectionName());

@@ -5,9 +5,11 @@
 #include <QPainterPath>
 #include <algorithm>
 #include <array>
+#include <cmath>
 #include <utility>
 
 #include "App/Toolkit/Colours.h"
+#include "App/Toolkit/TextStyle.h"
 
 namespace kestro {
 namespace {
@@ -16,6 +18,9 @@ constexpr qreal kLeftMargin = 6;  // the content has a margin of its own
 constexpr qreal kRightMargin = 16;
 constexpr qreal kAccessoryWidth = 22;
 constexpr qreal kFocusBarWidth = 3;
+
+constexpr int kRowPoints = 15;
+constexpr int kRowPadding = 8;
 
 constexpr int kMarkMilliseconds = 1600;
 constexpr qreal kMarkStrength = 0.26;
@@ -26,6 +31,11 @@ constexpr std::array kChevron = {QPointF(-3, -5), QPointF(2, 0), QPointF(-3, 5)}
 constexpr std::array kCheck = {QPointF(-6, 0), QPointF(-2, 4.5), QPointF(6, -5)};
 
 }  // namespace
+
+int rowHeight() {
+  const qreal line = systemTextStyle(kRowPoints, QFont::Bold).size(QStringLiteral("Ag")).height();
+  return std::max(kRowHeight, static_cast<int>(std::ceil(2 * line)) + kRowPadding);
+}
 
 TableCell::TableCell(QString reuseIdentifier) : _reuseIdentifier(std::move(reuseIdentifier)) {
   // Where a press began and what became of it is the table's to know.

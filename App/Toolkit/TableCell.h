@@ -6,11 +6,16 @@
 #include <QString>
 #include <QVariantAnimation>
 #include <QWidget>
+#include <functional>
+#include <utility>
 
 namespace kestro {
 
-/// The height of every row.
+/// The height of every row at usual text sizes.
 inline constexpr int kRowHeight = 50;
+
+/// The height of every row: two lines of text find room.
+[[nodiscard]] int rowHeight();
 
 enum class CellAccessory { None, DisclosureIndicator, Checkmark };
 
@@ -33,12 +38,21 @@ class TableCell : public QWidget {
   /// Moves content that is wider than its area by `distance` pixels. False when nothing moved.
   virtual bool scrollContentBy(qreal distance);
 
+  /// What its area is too narrow to show, for a tooltip; empty when all is shown.
+  [[nodiscard]] virtual QString hiddenText() const { return {}; }
+
   /// Marks the content as changed for a moment.
   void markChanged();
   [[nodiscard]] bool isMarkedChanged() const noexcept { return _mark > 0; }
 
   /// States that the table sets.
   void setFocusShown(bool shown);
+  [[nodiscard]] bool isFocusShown() const noexcept { return _isFocusShown; }
+  /// Selects the row as a click would; for aids that have no mouse.
+  void setOpenHandler(std::function<void()> opened) { _opened = std::move(opened); }
+  void open() const {
+    if (const auto opened = _opened) opened();
+  }
   void setPressed(bool pressed);
   [[nodiscard]] bool isPressed() const noexcept { return _isPressed; }
 
@@ -63,6 +77,7 @@ class TableCell : public QWidget {
   qreal _mark = 0;  ///< how strong the mark of change is, from 0 to 1
   bool _isFocusShown = false;
   bool _isPressed = false;
+  std::function<void()> _opened;
 };
 
 }  // namespace kestro

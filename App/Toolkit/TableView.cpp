@@ -4,11 +4,13 @@
 #include <QAccessible>
 #include <QApplication>
 #include <QClipboard>
+#include <QHelpEvent>
 #include <QKeyEvent>
 #include <QMouseEvent>
 #include <QPainter>
 #include <QScrollBar>
 #include <QScroller>
+#include <QToolTip>
 #include <QTouchEvent>
 #include <QWheelEvent>
 #include <algorithm>
@@ -44,7 +46,7 @@ TableView::TableView(QWidget* parent)
   setVerticalScrollBar(_scrollBar);
   setFocusPolicy(Qt::StrongFocus);
   viewport()->setAutoFillBackground(false);
-  verticalScrollBar()->setSingleStep(kRowHeight);
+  verticalScrollBar()->setSingleStep(_rowHeight);
   setUpScrolling(viewport());
   _touchClock.start();
 }
@@ -58,6 +60,7 @@ QSize TableView::sizeHint() const { return {320, contentHeight()}; }
 void TableView::reloadData() {
   _reusable.merge(std::exchange(_cells, {}));
   _rowCount = _source.numberOfRows ? _source.numberOfRows() : 0;
+  _rowHeight = rowHeight();
   _reusable.erase(_reusable.lower_bound(_rowCount), _reusable.end());
   if (_focusedRow >= _rowCount) _focusedRow = _rowCount - 1;
   if (_selectedRow >= _rowCount) _selectedRow = -1;
@@ -85,8 +88,8 @@ void TableView::updateScrollRange() {
 
 void TableView::layoutRows() {
   const int top = verticalScrollBar()->value();
-  const int first = top / kRowHeight;
-  const int last = std::min(_rowCount - 1, (top + viewport()->height()) / kRowHeight);
+  const int first = top / _rowHeight;
+  const int last = std::min(_rowCount - 1, (top + viewport()->height()) / _rowHeight);
   retireCells(first, last);
   for (int row = first; row <= last; ++row) showRow(row);
   // What a row on the screen had and did not take again.
@@ -118,10 +121,11 @@ void TableView::showRow(int row) {
   const bool isNew = cell == nullptr;
   if (isNew) cell = _source.cellForRow(row);
   // A row's last pixel is its hairline.
-  const QRect place(column.left, row * kRowHeight - verticalScrollBar()->value(), column.width,
-                    kRowHeight - 1);
+  const QRect place(column.left, row * _rowHeight - verticalScrollBar()->value(), column.width,
+                    _rowHeight - 1);
   if (cell->parentWidget() != viewport()) cell->setParent(viewport());
   cell->setGeometry(place);
+  cell->setOpenHandler([this, row] { select(row); });
   if (isNew) cell->show();
 }
 
@@ -175,8 +179,8 @@ void TableView::setFocusedRow(int row) {
 
 void TableView::scrollToRow(int row) {
   QScrollBar* bar = verticalScrollBar();
-  const int top = row * kRowHeight;
-  const int lowest = top + kRowHeight - viewport()->height();
+  const int top = row * _rowHeight;
+  const int lowest = top + _rowHeight - viewport()->height();
   bar->setValue(std::clamp(bar->value(), std::min(lowest, top), top));
 }
 
@@ -234,7 +238,7 @@ void TableView::keyPressEvent(QKeyEvent* event) {
 
 std::optional<int> TableView::rowAfter(const QKeyEvent& event) const {
   if ((event.modifiers() & ~Qt::KeypadModifier) != Qt::NoModifier) return std::nullopt;
-  const int page = std::max(1, viewport()->height() / kRowHeight - 1);
+  const int page = std::max(1, viewport()->height() / _rowHeight - 1);
   // The first arrow shows where the focus is, or takes it to the first row.
   const int step = _focusedRow >= 0 ? 1 : 0;
   const int from = std::max(0, _focusedRow);
@@ -259,7 +263,9 @@ std::optional<int> TableView::rowAfter(const QKeyEvent& event) const {
 bool TableView::actOnFocus(const QKeyEvent& event) {
   if (event.matches(QKeySequence::Copy)) {
     if (!_source.textOfRow || _focusedRow < 0) return false;
-    QGuiApplication::clipboard()->setText(_source.textOfRow(_focusedRow));
+    const QString text = _source.textOfRow(_focusedRow);
+    QGuiApplication::clipboard()->setText(text);
+    if (_source.copied) _source.copied(text);
     return true;
   }
   TableCell* cell = cellAtRow(_focusedRow);
@@ -267,6 +273,7 @@ bool TableView::actOnFocus(const QKeyEvent& event) {
     case Qt::Key_Return:
     case Qt::Key_Enter:
     case Qt::Key_Select:
+      if (_focusedRow < 0) focusByKey(0);
       select(_focusedRow);
       return _focusedRow >= 0;
     case Qt::Key_Left:
@@ -283,7 +290,7 @@ bool TableView::actOnFocus(const QKeyEvent& event) {
 int TableView::rowAt(const QPoint& position) const {
   const Column column = columnIn(viewport()->width());
   const bool isInside = position.x() >= column.left && position.x() < column.left + column.width;
-  const int row = (position.y() + verticalScrollBar()->value()) / kRowHeight;
+  const int row = (position.y() + verticalScrollBar()->value()) / _rowHeight;
   return isInside && position.y() >= 0 && row < _rowCount ? row : -1;
 }
 
@@ -314,7 +321,9 @@ void TableView::releaseAt(const QPointF& position) {
   const Movement movement = std::exchange(_movement, Movement::None);
   const int row = std::exchange(_pressedRow, -1);
   updateStates();
-  if (movement == Movement::Pressed && row >= 0 && row == rowAt(position.toPoint())) select(row);
+  if (movement != Movement::Pressed || row < 0 || row != rowAt(position.toPoint())) return;
+  _showsFocus = true;
+  select(row);
 }
 
 void TableView::cancelPress() {
@@ -334,8 +343,17 @@ void TableView::mouseReleaseEvent(QMouseEvent* event) {
   if (event->button() == Qt::LeftButton) releaseAt(event->position());
 }
 
+void TableView::showToolTip(const QHelpEvent& event) const {
+  const TableCell* cell = cellAtRow(rowAt(event.pos()));
+  QToolTip::showText(event.globalPos(), cell == nullptr ? QString() : cell->hiddenText(),
+                     viewport());
+}
+
 bool TableView::viewportEvent(QEvent* event) {
   switch (event->type()) {
+    case QEvent::ToolTip:
+      showToolTip(static_cast<QHelpEvent&>(*event));
+      return true;
     case QEvent::TouchBegin:
     case QEvent::TouchUpdate:
     case QEvent::TouchEnd:

@@ -13,6 +13,7 @@
 #include "App/Toolkit/TableCell.h"
 #include "App/Toolkit/ThinScrollBar.h"
 
+class QHelpEvent;
 class QTouchEvent;
 
 namespace kestro {
@@ -20,7 +21,8 @@ namespace kestro {
 /// Only rows on the screen have cells. It scrolls by wheel, scroll bar, keys and, kinetically, by
 /// touch; a sideways movement moves the content of the row under it. Arrows, Page Up and Down, Home
 /// and End move the focus from row to row; Enter selects the focused row, as a click or tap does a
-/// row. The focus shows once a key has moved it. Events that it has no use for go to its parent.
+/// row; Enter without a focused row selects the first. The focus shows once a key has moved it or
+/// a row was clicked. Events that it has no use for go to its parent.
 class TableView : public QAbstractScrollArea {
   Q_OBJECT
 
@@ -33,6 +35,8 @@ class TableView : public QAbstractScrollArea {
     std::function<void(int row)> rowSelected;
     /// What copying a row puts on the clipboard; without the function nothing is copied.
     std::function<QString(int row)> textOfRow;
+    /// Told what was put there.
+    std::function<void(const QString& text)> copied = {};
   };
 
   explicit TableView(QWidget* parent = nullptr);
@@ -64,7 +68,7 @@ class TableView : public QAbstractScrollArea {
   void deselectRow();
 
   /// The height of all rows, so that nothing has to be scrolled.
-  [[nodiscard]] int contentHeight() const noexcept { return _rowCount * kRowHeight; }
+  [[nodiscard]] int contentHeight() const noexcept { return _rowCount * _rowHeight; }
   [[nodiscard]] QSize sizeHint() const override;
 
  protected:
@@ -103,12 +107,14 @@ class TableView : public QAbstractScrollArea {
   void touch(const QTouchEvent& event);
   void pan(const QPointF& position);
   void announceFocus() const;
+  void showToolTip(const QHelpEvent& event) const;
 
   ThinScrollBar* _scrollBar;
   DataSource _source;
   Cells _cells;     ///< of the rows on the screen
   Cells _reusable;  ///< of rows near it, and of those being reloaded
   int _rowCount = 0;
+  int _rowHeight = kRowHeight;
   int _focusedRow = -1;
   int _selectedRow = -1;
   bool _showsFocus = false;

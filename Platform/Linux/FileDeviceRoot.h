@@ -20,6 +20,9 @@ class FileDeviceRoot final : public DeviceRoot {
   [[nodiscard]] static Result<void> createDefault();
 
   [[nodiscard]] bool exists(std::string_view devicePath) const override;
+  [[nodiscard]] std::string hostPath(std::string_view devicePath) const override {
+    return pathOf(devicePath).string();
+  }
   [[nodiscard]] Result<void> write(std::string_view devicePath, ByteView contents) override;
 
  private:

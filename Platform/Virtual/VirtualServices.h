@@ -106,6 +106,9 @@ class VirtualDeviceRoot : public DeviceRoot {
   [[nodiscard]] bool exists(std::string_view devicePath) const override {
     return _files.contains(devicePath);
   }
+  [[nodiscard]] std::string hostPath(std::string_view devicePath) const override {
+    return "/device" + std::string(devicePath);
+  }
   [[nodiscard]] Result<void> write(std::string_view devicePath, ByteView contents) override;
 
   /// Every write fails with this message until it is taken back.

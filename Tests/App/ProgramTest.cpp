@@ -115,8 +115,8 @@ TEST_F(ProgramTest, APictureThatCannotBeWrittenSaysSo) {
 }
 
 TEST_F(ProgramTest, WrongUsageIsRefusedAtOnce) {
-  for (const char* wrong : {"--screenshot=/tmp/a.bogus", "--screenshot=/tmp/a", "--demo=nonsense:x",
-                            "--after=nan", "--server="}) {
+  for (const char* wrong : {"--screenshot=/tmp/a.bogus", "--screenshot=/tmp/a",
+                            "--demo=simulation:5G", "--after=nan", "--server="}) {
     const auto kestro = startKestro({"--screenshot=" + folder("a.png"), wrong});
     EXPECT_EQ(kestro->wait(), 2) << wrong;
     EXPECT_THAT(kestro->errors(), HasSubstr(std::string(wrong).substr(0, 6)));

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <gtest/gtest.h>
 
+#include <QApplication>
 #include <QFontMetricsF>
 
 #include "App/Panes/KestroCell.h"
@@ -100,6 +101,45 @@ TEST_F(KestroCellTest, ScreenReadersHearNameAndValue) {
   cell->setValue("-70 dBm");
   EXPECT_EQ(cell->accessibleName(), "RSCP");
   EXPECT_EQ(cell->accessibleDescription(), "-70 dBm");
+}
+
+TEST_F(KestroCellTest, WhatIsNotShownWholeIsATooltip) {
+  const auto leaf = makeCell(KestroCell::Style::KeyValue);
+  leaf->setKey("RSCP");
+  leaf->setValue("-70 dBm");
+  leaf->setLayout();
+  EXPECT_EQ(leaf->hiddenText(), "");
+  leaf->setValue(QString(100, u'8'));
+  leaf->setLayout();
+  EXPECT_EQ(leaf->hiddenText(), "RSCP\n" + QString(100, u'8'));
+  const auto tree = makeCell(KestroCell::Style::Key);
+  tree->setKey("Short");
+  tree->setLayoutKey();
+  EXPECT_EQ(tree->hiddenText(), "");
+  tree->setKey(QString(100, u'n'));
+  tree->setLayoutKey();
+  EXPECT_EQ(tree->hiddenText(), QString(100, u'n'));
+}
+
+TEST_F(KestroCellTest, AtAnyTextSizeAMeasurementIsWhole) {
+  const QFont before = QApplication::font();
+  for (const int pixels : {14, 20, 27, 60}) {
+    QFont larger = before;
+    larger.setPixelSize(pixels);
+    QApplication::setFont(larger);
+    for (const int width : {240, 390, 760}) {
+      const auto cell = makeCell(KestroCell::Style::KeyValue, width);
+      cell->resize(width, rowHeight());
+      cell->setKey("Measured RSRP");
+      cell->setValue("-88.50 dBm");
+      cell->setLayout();
+      const QRectF& key = cell->keyLabel().frame;
+      const QRectF& value = cell->valueLabel()->frame;
+      EXPECT_TRUE(cell->contentBounds().contains(value)) << pixels << " " << width;
+      EXPECT_FALSE(key.intersects(value)) << pixels << " " << width;
+    }
+  }
+  QApplication::setFont(before);
 }
 
 }  // namespace

@@ -38,11 +38,25 @@ TEST(CellFramesTest, AValueThatJustFitsFollowsTheKeyInAnAreaFurtherRight) {
   EXPECT_EQ(frames.contentSize, QSizeF(200, 50));
 }
 
-TEST(CellFramesTest, AValueThatDoesNotFitFollowsTheKeyAndTheContainerScrolls) {
+TEST(CellFramesTest, AValueThatDoesNotFitStandsBelowTheKey) {
   const CellFrames frames = keyValueFrames(QRectF(0, 0, 199, 50), kKey, kValue);
-  EXPECT_EQ(frames.value, QRectF(140, 16, 60, 18));
-  EXPECT_EQ(frames.contentSize, QSizeF(199 + 80 + 60, 50));
+  EXPECT_EQ(frames.key, QRectF(10, 7, 80, 18));
+  EXPECT_EQ(frames.value, QRectF(10, 25, 60, 18));
+  EXPECT_EQ(frames.contentSize, QSizeF(199, 50));
   EXPECT_EQ(frames.container, QRectF(0, 0, 199, 50));
+}
+
+TEST(CellFramesTest, WhatIsWiderThanTheAreaEvenSoIsScrolledTo) {
+  const CellFrames frames = keyValueFrames(QRectF(0, 0, 100, 50), kKey, QSizeF(91, 18));
+  EXPECT_EQ(frames.contentSize, QSizeF(10 + 91 + 10, 50));
+  EXPECT_EQ(keyValueFrames(QRectF(0, 0, 101, 50), kKey, QSizeF(91, 18)).contentSize,
+            QSizeF(101, 50));
+}
+
+TEST(CellFramesTest, TwoLinesStandInTheMiddleOfATallRow) {
+  const CellFrames frames = keyValueFrames(QRectF(0, 0, 100, 78), kKey, kValue);
+  EXPECT_EQ(frames.key.top(), (78 - 36) / 2);
+  EXPECT_EQ(frames.value.bottom(), 78 - (78 - 36) / 2);
 }
 
 TEST(CellFramesTest, TheContainerIsFiftyHighWhateverTheArea) {
@@ -53,9 +67,9 @@ TEST(CellFramesTest, TheContainerIsFiftyHighWhateverTheArea) {
   EXPECT_EQ(frames.value, QRectF(240, 13, 60, 18));
 }
 
-TEST(CellFramesTest, TheGapIsCountedFromTheAreasLeftEdge) {
+TEST(CellFramesTest, AValueBelowItsKeyFollowsTheAreasLeftEdge) {
   const CellFrames frames = keyValueFrames(QRectF(5, 0, 100, 50), kKey, kValue);
-  EXPECT_EQ(frames.value.left(), 5 + 10 + 80 + 50);
+  EXPECT_EQ(frames.value.left(), 5 + 10);
 }
 
 }  // namespace
