@@ -40,7 +40,7 @@ int serve(LinuxPlatform& platform, const ServerOptions& options) {
   if (!server) return fail(platform, server.error().message);
   const LogSourceState state = stateOf(options.source, **source);
   (*server)->setSource(state);
-  report(announcement(state, (*source)->technology(), options.portName));
+  const std::string words = announcement(state, (*source)->technology(), options.portName);
   Playback playback(std::move(*source), options.playback, platform.mainQueue(), platform.clock(),
                     **server, report);
   platform.setTerminationHandler([&platform] {
@@ -48,6 +48,7 @@ int serve(LinuxPlatform& platform, const ServerOptions& options) {
     platform.quit(0);
   });
   playback.start();
+  report(words);  // when it can be asked to end, and not before: somebody may wait for this line
   return platform.run();
 }
 
