@@ -17,7 +17,7 @@ DriveFeed::DriveFeed(InputFeed feed, const std::vector<Rule>& rules, Sink sink)
   const MeasurerServices measuring{services.bundle, services.propertyListCoding};
   for (std::size_t i = 0; i < _feed.inputs().size(); ++i) {
     const auto tell = [sink, i](const Event& event) { sink(i, event); };
-    _drives.push_back(std::unique_ptr<Drive>(new Drive{Measurer(measuring), {rules, tell}}));
+    _drives.push_back(std::make_unique<Drive>(measuring, rules, tell));
   }
 }
 

@@ -41,6 +41,9 @@ class DriveFeed {
 
  private:
   struct Drive {
+    Drive(const MeasurerServices& services, const std::vector<Rule>& rules, const EventSink& sink)
+        : measurer(services), watch(rules, sink) {}
+
     Measurer measurer;
     DriveWatch watch;
   };

@@ -81,7 +81,9 @@ std::optional<std::chrono::minutes> zoneOffset(IsoScanner& scanner) {
 }  // namespace
 
 std::optional<Moment> momentOfIsoText(std::string_view text) {
-  using namespace std::chrono;
+  using std::chrono::day, std::chrono::hours, std::chrono::microseconds, std::chrono::minutes,
+      std::chrono::month, std::chrono::seconds, std::chrono::sys_days, std::chrono::year,
+      std::chrono::year_month_day;
   IsoScanner scanner(text);
   const int y = scanner.digits(4, 1970, 9999);
   const int m = scanner.take('-') ? scanner.digits(2, 1, 12) : -1;

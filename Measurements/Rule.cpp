@@ -27,6 +27,9 @@ constexpr std::string_view kOperatorCharacters = "<>=!";
 constexpr std::string_view kBlanks = " \t\r";
 constexpr double kLongestSeconds = 86'400;
 
+/// Whether a byte of UTF-8 is a character's first.
+bool beginsCharacter(char c) { return (static_cast<unsigned char>(c) & 0xC0) != 0x80; }
+
 bool isBlank(char c) { return kBlanks.find(c) != std::string_view::npos; }
 
 std::string_view withoutBlanks(std::string_view text) {
@@ -63,8 +66,7 @@ class RuleReader {
   /// The column, from 1, at which reading stopped.
   [[nodiscard]] std::size_t column() const {
     const std::string_view before = _line.substr(0, _at);
-    constexpr auto isBegin = [](char c) { return (static_cast<unsigned char>(c) & 0xC0) != 0x80; };
-    return 1 + static_cast<std::size_t>(std::ranges::count_if(before, isBegin));
+    return 1 + static_cast<std::size_t>(std::ranges::count_if(before, beginsCharacter));
   }
 
  private:

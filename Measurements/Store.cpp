@@ -218,12 +218,12 @@ void Store::removeRecording(const std::string& sha256) {
                        .bind(std::string_view(sha256))
                        .number();
   if (!old) return;
+  constexpr const char* kDeleteValues =
+      "DELETE FROM measurement WHERE series IN (SELECT id FROM series WHERE recording = ?)";
   for (const char* sql :
-       {"DELETE FROM measurement WHERE series IN "
-        "(SELECT id FROM series WHERE recording = ?)",
-        "DELETE FROM series WHERE recording = ?", "DELETE FROM cell WHERE recording = ?",
-        "DELETE FROM event WHERE recording = ?", "DELETE FROM position WHERE recording = ?",
-        "DELETE FROM recording WHERE id = ?"}) {
+       {kDeleteValues, "DELETE FROM series WHERE recording = ?",
+        "DELETE FROM cell WHERE recording = ?", "DELETE FROM event WHERE recording = ?",
+        "DELETE FROM position WHERE recording = ?", "DELETE FROM recording WHERE id = ?"}) {
     Statement(*_database, sql).bind(*old).run();
   }
 }

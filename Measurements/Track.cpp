@@ -22,8 +22,8 @@ double longitudeBetween(double from, double to, double part) {
 
 Track::Track(std::vector<Fix> fixes) : _fixes(std::move(fixes)) {
   std::ranges::stable_sort(_fixes, {}, &Fix::time);
-  const auto again = std::ranges::unique(_fixes, {}, &Fix::time);
-  _fixes.erase(again.begin(), again.end());
+  const auto isSameTime = [](const Fix& one, const Fix& other) { return one.time == other.time; };
+  _fixes.erase(std::unique(_fixes.begin(), _fixes.end(), isSameTime), _fixes.end());
 }
 
 std::optional<Coordinates> Track::at(Moment time) const {
