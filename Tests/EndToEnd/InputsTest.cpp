@@ -5,6 +5,7 @@
 
 #include <filesystem>
 #include <nlohmann/json.hpp>
+#include <set>
 #include <sstream>
 #include <string>
 #include <vector>
@@ -248,8 +249,78 @@ TEST_F(InputsEndToEndTest, ASnapshotIsSavedOfSeveralInputs) {
   EXPECT_THAT(refused.errors, HasSubstr("the output would replace the input"));
 }
 
+TEST_F(InputsEndToEndTest, EveryFormGoesIntoEveryCommand) {
+  const auto path = [&](const std::string& name) { return directory.pathOf(name); };
+  for (const std::string technology : {"LTE", "Ondrel_GSM", "Ondrel_CDMA", "UTRAN2"}) {
+    // Few enough for a snapshot's history to hold all of it.
+    ASSERT_EQ(
+        cli({"convert", "simulation:" + technology, "--to=+9.5s", "-o", path("a.pcapng")}).status,
+        0);
+    ASSERT_EQ(cli({"convert", path("a.pcapng"), "-o", path("a.pcap")}).status, 0);
+    ASSERT_EQ(cli({"convert", path("a.pcapng"), "-o", path("a.dlf")}).status, 0);
+    ASSERT_EQ(cli({"snapshot", "save", path("a.pcapng"), "-o", path("a.kestro"), "--description="})
+                  .status,
+              0);
+    const auto display = cli({"decode", path("a.pcap")}).output;
+    const auto packets = linesOf(cli({"explain", path("a.pcap"), "--list"}).output).size();
+    for (const std::string name : {"a.pcapng", "a.dlf", "a.kestro"}) {
+      EXPECT_EQ(cli({"decode", path(name)}).output, display) << name << technology;
+      EXPECT_THAT(linesOf(cli({"explain", path(name), "--list"}).output), SizeIs(packets))
+          << name << technology;
+      EXPECT_EQ(cli({"explain", path(name)}).status, 0);
+      EXPECT_THAT(cli({"info", path(name)}).output, HasSubstr(technology));
+      ASSERT_EQ(cli({"convert", path(name), "-o", path("b.pcap")}).status, 0) << name;
+      EXPECT_EQ(cli({"decode", path("b.pcap")}).output, display) << name << technology;
+      EXPECT_EQ(
+          cli({"snapshot", "save", path(name), "-o", path("b.kestro"), "--description="}).status,
+          0);
+    }
+  }
+}
+
+TEST_F(InputsEndToEndTest, ADlfLogAmongOthersKeepsItsTechnology) {
+  const auto lte = directory.pathOf("lte.dlf");
+  const auto gsm = directory.pathOf("gsm.dlf");
+  ASSERT_EQ(cli({"convert", "simulation:LTE", "--to=+2s", "-o", lte}).status, 0);
+  ASSERT_EQ(cli({"convert", "simulation:Ondrel_GSM", "--to=+2s", "-o", gsm}).status, 0);
+  const auto technologies = [](const Outcome& outcome) {
+    std::set<std::string> names;
+    const auto messages = OrderedJson::parse(outcome.output)["messages"];
+    for (const auto& message : messages) names.insert(message["technology"]);
+    return names;
+  };
+  EXPECT_THAT(technologies(cli({"explain", "--list", "--format=json", lte, gsm})),
+              ElementsAre("LTE", "Ondrel_GSM"));
+}
+
+TEST_F(InputsEndToEndTest, AServerAndADemoPlayAnyRecording) {
+  // Half a minute of a row a second, so that there is something to see whenever the display is up.
+  std::string log = "Timestamp,NetworkMode,RSRP,RSRQ,RSSI,CELLHEX,LACHEX,RAWCELLID\n";
+  for (int second = 10; second < 40; ++second) {
+    log += "2019.11.21_15.38." + std::to_string(second) + ",LTE,-90,-7,-70,1,9CBA,258\n";
+  }
+  const auto csv = directory.write("log.csv", log);
+  const auto drive = directory.pathOf("drive.pcapng");
+  ASSERT_EQ(cli({"convert", csv, "-o", drive}).status, 0);
+  for (const auto& recording : {drive, csv}) {
+    const auto outcome = cli({"watch", "--demo=" + recording, "--format=ndjson", "--count=1"});
+    EXPECT_EQ(outcome.status, 0) << outcome.errors;
+    EXPECT_THAT(outcome.output, HasSubstr(R"("Measured RSRP":"-90.00 dBm")"));
+  }
+}
+
+TEST_F(InputsEndToEndTest, ARecordingThatADemoPlaysIsNotRecordedOver) {
+  const auto a = capture("a.pcap", {ifxMessage("1")});
+  for (const auto& demo : {"--demo=" + a, "--demo=capture:" + a}) {
+    const auto outcome = cli({"record", demo, "-o", a, "--duration=0.1"});
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_THAT(outcome.errors, HasSubstr("the output would replace the input"));
+  }
+  EXPECT_THAT(cli({"decode", a}).output, HasSubstr("Count  1"));
+}
+
 TEST_F(InputsEndToEndTest, InAPipeNoProgressIsShown) {
-  const auto outcome = cli({"decode", "simulation:LTE", "--to=+3h"});
+  const auto outcome = cli({"decode", "simulation:LTE", "--to=+8h"});
   EXPECT_EQ(outcome.errors, "");
 }
 
