@@ -23,12 +23,12 @@ namespace kestro {
 template <class Writer>
 class FieldWriter {
  public:
-  /// `writer` must outlive it.
-  explicit FieldWriter(Writer& writer) : _writer(writer) {}
+  /// `output` must outlive it.
+  explicit FieldWriter(Writer& output) : writer(output) {}
 
   void place(const Place& place) {
     static constexpr std::string_view kOrigins[] = {"record", "packet", "twin"};
-    _writer.beginObject();
+    writer.beginObject();
     number("offset", place.offset);
     number("width", place.width);
     number("firstBit", place.firstBit);
@@ -36,49 +36,49 @@ class FieldWriter {
     boolean("signed", place.isSigned);
     text("order", place.isBigEndian ? "big" : "little");
     text("origin", kOrigins[static_cast<std::size_t>(place.origin)]);
-    _writer.endObject();
+    writer.endObject();
   }
 
   // --- Members -----------------------------------------------------------------------------------
 
   void text(std::string_view key, std::string_view value) {
-    _writer.key(key);
-    _writer.text(value);
+    writer.key(key);
+    writer.text(value);
   }
   void number(std::string_view key, std::uint64_t value) {
-    _writer.key(key);
-    _writer.number(value);
+    writer.key(key);
+    writer.number(value);
   }
   void integer(std::string_view key, std::int64_t value) {
-    _writer.key(key);
-    _writer.integer(value);
+    writer.key(key);
+    writer.integer(value);
   }
   void real(std::string_view key, double value) {
-    _writer.key(key);
-    _writer.real(value);
+    writer.key(key);
+    writer.real(value);
   }
   void boolean(std::string_view key, bool value) {
-    _writer.key(key);
-    _writer.boolean(value);
+    writer.key(key);
+    writer.boolean(value);
   }
   void place(std::string_view key, const Place& value) {
-    _writer.key(key);
+    writer.key(key);
     place(value);
   }
   void places(std::span<const Place> all) {
-    _writer.key("places");
-    _writer.beginArray();
+    writer.key("places");
+    writer.beginArray();
     for (const Place& value : all) place(value);
-    _writer.endArray();
+    writer.endArray();
   }
   void condition(std::string_view key, const Condition& condition) {
     if (condition.isAlways()) return;
-    _writer.key(key);
-    _writer.beginObject();
+    writer.key(key);
+    writer.beginObject();
     place("place", condition.place);
     integer("lowest", condition.lowest);
     integer("highest", condition.highest);
-    _writer.endObject();
+    writer.endObject();
   }
 
   // --- How a value is shown ----------------------------------------------------------------------
@@ -89,15 +89,15 @@ class FieldWriter {
   }
 
   void names(const TextRule& rule) {
-    _writer.key("names");
-    _writer.beginArray();
+    writer.key("names");
+    writer.beginArray();
     for (const NamedValue& name : rule.names) {
-      _writer.beginObject();
+      writer.beginObject();
       integer("value", name.value);
       text("text", name.text);
-      _writer.endObject();
+      writer.endObject();
     }
-    _writer.endArray();
+    writer.endArray();
     if (rule.otherName.empty()) {
       format(rule);
     } else {
@@ -137,15 +137,15 @@ class FieldWriter {
   }
 
   void shown(const TextRule& rule) {
-    _writer.key("shown");
-    _writer.beginObject();
+    writer.key("shown");
+    writer.beginObject();
     kind(rule);
     if (!rule.functionName.empty()) text("function", rule.functionName);
     if (rule.hasAbsentValue) {
       integer("absentValue", rule.absentValue);
       text("absentText", rule.absentText);
     }
-    _writer.endObject();
+    writer.endObject();
   }
 
   void field(std::string_view key, const Field& field, std::span<const Place> allPlaces) {
@@ -157,18 +157,18 @@ class FieldWriter {
   }
 
   void fields(std::span<const Field> fields) {
-    _writer.key("fields");
-    _writer.beginArray();
+    writer.key("fields");
+    writer.beginArray();
     for (const Field& known : fields) {
-      _writer.beginObject();
+      writer.beginObject();
       field(known.key, known, known.allPlaces());
-      _writer.endObject();
+      writer.endObject();
     }
-    _writer.endArray();
+    writer.endArray();
   }
 
  protected:
-  Writer& _writer;
+  Writer& writer;
 };
 
 }  // namespace kestro

@@ -15,17 +15,17 @@ class LayoutWriter : private FieldWriter<Writer> {
   using FieldWriter<Writer>::FieldWriter;
 
   void takers(std::span<const Outline> outlines) {
-    _writer.beginArray();
+    writer.beginArray();
     for (const Outline& outline : outlines) {
-      _writer.beginArray();
+      writer.beginArray();
       for (const OutlinedReading& known : outline.readings) reading(known);
-      _writer.endArray();
+      writer.endArray();
     }
-    _writer.endArray();
+    writer.endArray();
   }
 
  private:
-  using FieldWriter<Writer>::_writer;
+  using FieldWriter<Writer>::writer;
   using FieldWriter<Writer>::boolean;
   using FieldWriter<Writer>::condition;
   using FieldWriter<Writer>::field;
@@ -85,9 +85,9 @@ class LayoutWriter : private FieldWriter<Writer> {
   }
 
   void part(const OutlinedPart& part) {
-    _writer.beginObject();
+    writer.beginObject();
     std::visit([this](const auto& known) { members(known); }, part);
-    _writer.endObject();
+    writer.endObject();
   }
 
   // --- Readings ----------------------------------------------------------------------------------
@@ -116,28 +116,28 @@ class LayoutWriter : private FieldWriter<Writer> {
   }
 
   void subPackets(std::span<const std::uint8_t> identifiers) {
-    _writer.key("identifiers");
-    _writer.beginArray();
-    for (const std::uint8_t identifier : identifiers) _writer.number(identifier);
-    _writer.endArray();
+    writer.key("identifiers");
+    writer.beginArray();
+    for (const std::uint8_t identifier : identifiers) writer.number(identifier);
+    writer.endArray();
   }
 
   void reading(const OutlinedReading& reading) {
-    _writer.beginObject();
+    writer.beginObject();
     number("minimumLength", reading.minimumLength);
-    _writer.key("requirements");
-    _writer.beginArray();
+    writer.key("requirements");
+    writer.beginArray();
     for (const Requirement& requirement : reading.requirements) {
-      _writer.beginObject();
+      writer.beginObject();
       members(requirement, reading);
-      _writer.endObject();
+      writer.endObject();
     }
-    _writer.endArray();
-    _writer.key("parts");
-    _writer.beginArray();
+    writer.endArray();
+    writer.key("parts");
+    writer.beginArray();
     for (const OutlinedPart& known : reading.parts) part(known);
-    _writer.endArray();
-    _writer.endObject();
+    writer.endArray();
+    writer.endObject();
   }
 };
 
