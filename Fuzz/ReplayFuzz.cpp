@@ -51,12 +51,11 @@ class Recording {
   std::string_view _technology;
   ReplayOptions _options;
   ReplayClock _clock{_channel.platform().clock()};
-  Replay _replay{
-      [this](std::string_view technology) {
-        return LogGenerator::generatorFromTechnology(generatorServices(_channel.platform()),
-                                                     technology);
-      },
-      _clock, _options, [this](const ReplayRefresh& refresh) { didRefresh(refresh); }};
+  Replay _replay{[this](std::string_view technology) {
+                   return LogGenerator::generatorFromTechnology(
+                       generatorServices(_channel.platform()), technology);
+                 },
+                 _clock, _options, [this](const ReplayRefresh& refresh) { didRefresh(refresh); }};
   Moment _time{std::chrono::seconds(1'330'862'709)};
   std::uint64_t _number = 0;
   std::uint64_t _refreshed = 0;
