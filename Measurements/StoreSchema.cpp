@@ -92,12 +92,13 @@ CREATE TABLE position (
 ) WITHOUT ROWID;
 )sql";
 
-// A bare column beside max() is that of the row with the greatest value.
+// A bare column beside max() is that of the row with the greatest value. Messages of one time keep
+// their order by their numbers.
 const char* const kStoreViews = R"sql(
 CREATE VIEW serving AS
   WITH serving_value AS (
     SELECT series.recording, series.quantity, measurement.time_us / 1000000 AS second,
-           measurement.cell, measurement.value, max(measurement.time_us) AS latest
+           measurement.cell, measurement.value, max(measurement.message) AS latest
     FROM measurement JOIN series ON series.id = measurement.series
     WHERE measurement.serving = 1
     GROUP BY series.recording, series.quantity, second

@@ -116,6 +116,19 @@ TEST_F(StoreTest, ServingHasOneRowASecond) {
                           "6|2023-11-14 22:13:26|||LTE|800|-99.0|-10.0"));
 }
 
+TEST_F(StoreTest, OfMessagesAtOneTimeTheLastOneCounts) {
+  openStore();
+  store->beginRecording();
+  at(0);
+  add(lteCell(700, 14));
+  add(lteConnected(14, -95, 15, -88));
+  add(lteServing(14, -90));
+  ASSERT_TRUE(store->finishRecording({.sha256 = kSha, .name = "drive.pcap"}, measurer.series(),
+                                     watch->cells()));
+  ASSERT_TRUE(store->commit());
+  EXPECT_THAT(rows("SELECT level FROM serving"), ElementsAre("-90.0"));
+}
+
 TEST_F(StoreTest, NeighboursHaveLevelAndQuality) {
   driveInto(kSha, "drive.pcap");
   // -12 = 64 / 8 - 20 of the first; the second says no quality but its format's zero, -30.
