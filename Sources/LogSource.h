@@ -69,6 +69,14 @@ class LogSource {
   /// For sources that yield SourceWaits: `handler` runs on the main thread when `next` may have
   /// more. It must not destroy the source.
   virtual void setReadyHandler(std::function<void()> handler) { static_cast<void>(handler); }
+
+  /// Whether anybody gets the messages; nobody does at first. A source that asks others asks them
+  /// only while somebody does. `done` runs once the source has come to rest, or goes on, in the
+  /// call or later; it may be empty, and is dropped when the next call comes first.
+  virtual void setWatched(bool isWatched, std::function<void()> done) {
+    static_cast<void>(isWatched);
+    if (done) done();
+  }
 };
 
 /// What sources say of messages that they made up; see `LogSource::madeUp`.

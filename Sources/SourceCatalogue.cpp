@@ -20,6 +20,8 @@
 #include "Sources/IFX/IFXDriveTest.h"
 #include "Sources/IFX/IFXSimulation.h"
 #include "Sources/LTE/LTESimulation.h"
+#include "Sources/Modem/ModemSource.h"
+#include "Sources/Modem/ShownText.h"
 #include "Sources/PacketSimulation.h"
 #include "Sources/RecordingSource.h"
 #include "Sources/StoredStream.h"
@@ -189,11 +191,47 @@ OpenedSource openStream(const SourceRequest& request, const SourceServices& serv
   return StreamSource::open(*services.inputStreams, request.argument, technology);
 }
 
+Result<void> checkModem(const SourceRequest& request) {
+  const bool isIFX = request.technology.empty() ||
+                     request.technology == kTqLogChannelTechnology_IFX ||
+                     request.technology == kAutomaticTechnology;
+  if (!isIFX) return failure("a modem's messages are IFX; --technology cannot make them another");
+  if (request.gps.empty()) return {};
+  if (const auto gps = parseGps(request.gps); !gps) return tl::unexpected(gps.error());
+  return {};
+}
+
+OpenedSource openModem(const SourceRequest& request, const SourceServices& services,
+                       const SourceReporter& report) {
+  const auto name = modemNamed(request.argument);
+  if (!name) return failure(fmt::format("\"{}\" names no modem", request.argument));
+  if (services.mainQueue == nullptr || services.modemService == nullptr ||
+      services.positionService == nullptr) {
+    return failure("a modem is live: kestro-telephonyd plays it");
+  }
+  ModemWish wish{.modem = *name, .isPersonal = request.isPersonal};
+  if (!request.gps.empty()) {
+    auto gps = parseGps(request.gps);
+    if (!gps) return tl::unexpected(gps.error());
+    wish.gps = *std::move(gps);
+  }
+  return std::make_unique<ModemSource>(ModemServices{.coding = services.propertyListCoding,
+                                                     .clock = services.clock,
+                                                     .queue = *services.mainQueue,
+                                                     .modems = *services.modemService,
+                                                     .positions = *services.positionService},
+                                       std::move(wish), report);
+}
+
+bool isModemName(std::string_view argument) { return modemNamed(argument).has_value(); }
+
 bool isTechnologyOrEmpty(std::string_view argument) {
   return argument.empty() || !technologyNamed(argument).empty();
 }
 
 bool isGiven(std::string_view argument) { return !argument.empty(); }
+
+constexpr std::string_view kModemKind = "modem";
 
 constexpr std::array kKinds = {
     SourceKind{"simulation", isTechnologyOrEmpty, "simulation[:TECHNOLOGY]",
@@ -225,6 +263,13 @@ constexpr std::array kKinds = {
                "each behind its length (32 bits, little-endian). --technology says\n"
                "what they are; IFX unless given. --speed does not apply.",
                false, false, checkStream, openStream},
+    SourceKind{kModemKind, isModemName, "modem[:N|:PATH|:IMEI]",
+               "A cellular modem of this machine, by ModemManager: the one with\n"
+               "ModemManager's number N (now; it is followed when it comes back under\n"
+               "another), of that path or equipment identifier, else the first that\n"
+               "is enabled. Its messages are IFX. --gps, --personal and --list-modems\n"
+               "go with it. --speed does not apply.",
+               false, true, checkModem, openModem},
 };
 
 }  // namespace
@@ -233,7 +278,10 @@ SourceServices sourceServices(Platform& platform) {
   return {.propertyListCoding = platform.propertyListCoding(),
           .clock = platform.clock(),
           .technologiesOfCode = technologiesByCode(generatorServices(platform)),
-          .inputStreams = &platform.inputStreams()};
+          .inputStreams = &platform.inputStreams(),
+          .mainQueue = &platform.mainQueue(),
+          .modemService = &platform.modemService(),
+          .positionService = &platform.positionService()};
 }
 
 std::span<const SourceKind> sourceKinds() noexcept { return kKinds; }
@@ -270,10 +318,37 @@ Result<SourceRequest> parseSource(std::string_view text, std::string_view techno
   return request;
 }
 
+Result<PositionServer> parseGps(std::string_view text) {
+  constexpr std::string_view kGpsd = "gpsd";
+  const auto wrong = failure(
+      fmt::format("\"{}\" is no source of positions; the form is gpsd[:HOST[:PORT]]", text));
+  if (!text.starts_with(kGpsd)) return wrong;
+  PositionServer server;
+  std::string_view rest = text.substr(kGpsd.size());
+  if (rest.empty()) return server;
+  if (rest.front() != ':') return wrong;
+  rest.remove_prefix(1);
+  const bool isBracketed = rest.starts_with('[');
+  const auto end = isBracketed ? rest.find(']') : rest.find(':');
+  if (isBracketed && end == std::string_view::npos) return wrong;
+  server.host = rest.substr(isBracketed ? 1 : 0, isBracketed ? end - 1 : end);
+  rest = end == std::string_view::npos ? "" : rest.substr(end + (isBracketed ? 1 : 0));
+  if (server.host.empty()) return wrong;
+  if (rest.empty()) return server;
+  const auto port = rest.front() == ':' ? numberIn(rest.substr(1), 10) : std::nullopt;
+  if (!port || *port == 0 || *port > 0xFFFF) return wrong;
+  server.port = rest.substr(1);
+  return server;
+}
+
 LogSourceState stateOf(const SourceRequest& request) {
   LogSourceState state{.kind = request.kind};
   if (const auto* kind = sourceKindNamed(request.kind)) state.isSimulated = kind->isSimulated;
   if (!request.argument.empty()) state.name = request.argument;
+  if (request.kind == kModemKind && !request.isPersonal) {
+    const auto name = modemNamed(request.argument);
+    if (name && name->kind == ModemName::Kind::Equipment) state.name = maskedText(name->text);
+  }
   return state;
 }
 

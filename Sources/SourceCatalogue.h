@@ -10,7 +10,10 @@
 #include "Platform/Clock.h"
 #include "Platform/InputStream.h"
 #include "Platform/LogSourceState.h"
+#include "Platform/MainQueue.h"
+#include "Platform/ModemService.h"
 #include "Platform/Platform.h"
+#include "Platform/PositionService.h"
 #include "Platform/PropertyListCoding.h"
 #include "Platform/Result.h"
 #include "Recordings/OpenRecording.h"
@@ -28,6 +31,10 @@ struct SourceRequest {
   /// The technology asked for, a constant text of Platform/TelephonyService.h or "auto"; empty to
   /// leave it to the source.
   std::string_view technology;
+  /// Of a modem: where its positions come from (`parseGps`), and whether identities are shown
+  /// whole.
+  std::string gps = {};
+  bool isPersonal = false;
 };
 
 /// What sources are made with. What it refers to must outlive them.
@@ -39,6 +46,10 @@ struct SourceServices {
   TechnologiesOfCode technologiesOfCode = {};
   /// How streams are read; null where nobody serves them: reading waits then.
   InputStreams* inputStreams = nullptr;
+  /// What a modem takes; null where nobody serves it: there is none then.
+  MainQueue* mainQueue = nullptr;
+  ModemService* modemService = nullptr;
+  PositionService* positionService = nullptr;
 };
 
 /// A platform's services, streams included; it must outlive the sources.
@@ -81,6 +92,10 @@ struct SourceKind {
 /// that the kind's argument is missing or too much. `technology` as in SourceRequest; a file
 /// without one is followed from technology to technology.
 [[nodiscard]] Result<SourceRequest> parseSource(std::string_view text, std::string_view technology);
+
+/// Takes "gpsd[:HOST[:PORT]]" apart; an address of IPv6 stands in brackets. The error says the
+/// form.
+[[nodiscard]] Result<PositionServer> parseGps(std::string_view text);
 
 /// What a server can tell of the source that was asked for, and of the one that was opened.
 [[nodiscard]] LogSourceState stateOf(const SourceRequest& request);

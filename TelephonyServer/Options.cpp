@@ -28,6 +28,7 @@ server stays: clients keep their channels, and no more messages come.)";
 constexpr const char* kExamples = R"(  kestro-telephonyd
   kestro-telephonyd --source=capture:drive.pcap --speed=10 --loop
   kestro-telephonyd --source=drive-test:log.csv --technology=IFX
+  kestro-telephonyd --source=modem --gps=gpsd
   bridge | kestro-telephonyd --source=stream:- --technology=LTE)";
 constexpr const char* kPortsText =
     R"(Ports live in $KESTRO_PORT_DIR, else $XDG_RUNTIME_DIR/kestro, else /tmp/kestro-<uid>.
@@ -55,6 +56,17 @@ std::vector<OptionRow> sourceOptions(ServerArguments& arguments) {
        .choices = choicesOf(technologyChoices())},
       speedOption(arguments.options.playback.speed),
       loopOption(arguments.options.playback.loop),
+      {.name = "--gps",
+       .value = "gpsd[:HOST[:PORT]]",
+       .help = "Of a modem: where positions come from;\nthe modem itself unless given",
+       .target = &arguments.gps},
+      {.name = "--personal",
+       .help = "Of a modem: show IMSI, ICCID, IMEI, numbers and addresses\nwhole, not the last "
+               "four digits alone",
+       .target = &arguments.isPersonal},
+      {.name = "--list-modems",
+       .help = "List the modems that ModemManager has, and end",
+       .target = &arguments.options.listsModems},
   };
 }
 
@@ -62,7 +74,17 @@ Result<void> understand(ServerArguments& arguments) {
   ServerOptions& options = arguments.options;
   auto source = parseSource(arguments.source, technologyChosen(arguments.technology));
   if (!source) return tl::unexpected(source.error());
-  options.source = std::move(*source);
+  options.source = *std::move(source);
+  const bool isModem = options.source.kind == "modem";
+  if (!arguments.gps.empty() && !isModem) return failure("--gps goes with --source=modem");
+  if (arguments.isPersonal && !isModem && !options.listsModems) {
+    return failure("--personal goes with --source=modem");
+  }
+  if (!arguments.gps.empty()) {
+    if (const auto gps = parseGps(arguments.gps); !gps) return tl::unexpected(gps.error());
+  }
+  options.source.gps = arguments.gps;
+  options.source.isPersonal = arguments.isPersonal;
   options.exitsWithParent = arguments.parent.has_value();
   if (arguments.parent > 0) options.parent = arguments.parent;
   return {};

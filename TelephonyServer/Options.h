@@ -18,6 +18,8 @@ namespace kestro {
 struct ServerOptions {
   SourceRequest source;
   PlaybackOptions playback;
+  /// Whether the modems are listed, and nothing else is done.
+  bool listsModems = false;
   std::string portName = "TelephonyServer";
   LogPriority logThreshold = LogPriority::Notice;
   /// Whether the server ends with the process that started it.
@@ -34,6 +36,8 @@ struct ServerArguments {
   ServerOptions options;
   std::string source;
   std::string technology;
+  std::string gps;
+  bool isPersonal = false;
   std::optional<int> parent;
 };
 

@@ -4,9 +4,11 @@
 
 #include <chrono>
 #include <cstdint>
+#include <functional>
 #include <memory>
 #include <optional>
 #include <string_view>
+#include <utility>
 
 #include "Platform/Clock.h"
 #include "Platform/MainQueue.h"
@@ -57,6 +59,11 @@ class Playback {
 
   /// Starts the source's time. Nothing is handed over inside this call.
   void start();
+
+  /// Says to the source whether anybody gets its messages; see `LogSource::setWatched`.
+  void setWatched(bool isWatched, std::function<void()> done = {}) {
+    _source->setWatched(isWatched, std::move(done));
+  }
 
  private:
   /// What one turn on the main thread may hand over before others have theirs.

@@ -107,6 +107,12 @@ void Server::closeChannels(const std::function<bool(LogChannel&)>& isOver) {
     if (auto lost = channel->close()) _lostChannels.remember(*std::move(lost));
     return true;
   });
+  tellWhetherWatched();
+}
+
+void Server::tellWhetherWatched() {
+  if (std::exchange(_isWatched, !_channels.empty()) == !_channels.empty()) return;
+  if (_watchHandler) _watchHandler(_isWatched);
 }
 
 void Server::forgetWhoIsGone() {
@@ -187,7 +193,9 @@ tl::expected<LogChannel*, LogChannelError> Server::openChannel(const std::string
   auto channel =
       std::make_unique<LogChannel>(_platform, std::move(*client), [this] { return _technology; });
   if (!channel->open()) return tl::unexpected(LogChannelError::NoChannel);
-  return _channels.emplace_back(std::move(channel)).get();
+  LogChannel* opened = _channels.emplace_back(std::move(channel)).get();
+  tellWhetherWatched();
+  return opened;
 }
 
 Result<std::shared_ptr<RemotePort>> Server::connectTo(const std::string& port) const {

@@ -59,6 +59,11 @@ class Server : public PlaybackListener {
   /// called.
   void setSource(LogSourceState source);
 
+  /// `handler` runs when the first channel has opened, and when the last one has closed.
+  void setWatchHandler(std::function<void(bool isWatched)> handler) {
+    _watchHandler = std::move(handler);
+  }
+
   [[nodiscard]] std::size_t channelCount() const noexcept { return _channels.size(); }
   [[nodiscard]] std::size_t registrationCount() const noexcept { return _registrations.size(); }
 
@@ -86,6 +91,7 @@ class Server : public PlaybackListener {
   /// The dictionary that a message is; an empty one when it is none.
   [[nodiscard]] Dictionary dictionaryIn(ByteView message) const;
   void forgetWhoIsGone();
+  void tellWhetherWatched();
 
   Platform& _platform;
   std::string _name;
@@ -95,6 +101,8 @@ class Server : public PlaybackListener {
   std::vector<std::unique_ptr<LogChannel>> _channels;
   LostChannels _lostChannels;
   LogSourceState _source{.hasEnded = false};
+  std::function<void(bool isWatched)> _watchHandler;
+  bool _isWatched = false;
   std::map<std::string, std::shared_ptr<RemotePort>, std::less<>> _registrations;
 };
 

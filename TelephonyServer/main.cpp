@@ -2,6 +2,7 @@
 // kestro-telephonyd: the telephony server.
 #include <fmt/format.h>
 
+#include <chrono>
 #include <string>
 #include <string_view>
 #include <utility>
@@ -10,7 +11,9 @@
 #include "Options/ArgumentParser.h"
 #include "Platform/Linux/LinuxPlatform.h"
 #include "Platform/LogSourceState.h"
+#include "Platform/MainQueue.h"
 #include "Platform/TextSink.h"
+#include "Sources/Modem/ModemLister.h"
 #include "TelephonyServer/Announcement.h"
 #include "TelephonyServer/DescriptorLimit.h"
 #include "TelephonyServer/EndWithParent.h"
@@ -22,9 +25,30 @@
 namespace kestro {
 namespace {
 
+/// How long a source may take to come to rest when the server ends.
+constexpr std::chrono::seconds kRestTime{2};
+
 int fail(Platform& platform, std::string_view why) {
   platform.consoleLog().writeLine(fmt::format("kestro-telephonyd: {}", why));
   return 1;
+}
+
+int listModems(LinuxPlatform& platform, bool isPersonal) {
+  OptionsText answer{"", 1};
+  const ModemLister lister(platform.modemService(), platform.mainQueue(),
+                           [&](const Result<const ModemObjects*>& objects) {
+                             if (!objects) {
+                               answer.text =
+                                   fmt::format("kestro-telephonyd: {}\n", objects.error().message);
+                             } else if ((*objects)->modems().empty()) {
+                               answer.text = "kestro-telephonyd: no modem\n";
+                             } else {
+                               answer = {modemListText(**objects, isPersonal), 0};
+                             }
+                             platform.quit(0);
+                           });
+  static_cast<void>(platform.run());
+  return tell(answer);
 }
 
 int serve(LinuxPlatform& platform, const ServerOptions& options) {
@@ -43,10 +67,12 @@ int serve(LinuxPlatform& platform, const ServerOptions& options) {
   const std::string words = announcement(state, (*source)->technology(), options.portName);
   Playback playback(std::move(*source), options.playback, platform.mainQueue(), platform.clock(),
                     **server, report);
-  platform.setTerminationHandler([&platform] {
+  platform.setTerminationHandler([&platform, &playback] {
     ignoreParentsEnd();
-    platform.quit(0);
+    platform.mainQueue().postAfter(kRestTime, [&platform] { platform.quit(0); });
+    playback.setWatched(false, [&platform] { platform.quit(0); });
   });
+  (*server)->setWatchHandler([&playback](bool isWatched) { playback.setWatched(isWatched); });
   playback.start();
   report(words);  // when it can be asked to end, and not before: somebody may wait for this line
   return platform.run();
@@ -63,6 +89,7 @@ int runServer(int argumentCount, const char* const* arguments) {
   LinuxPlatformOptions platformOptions;
   platformOptions.logThreshold = options.logThreshold;
   const auto platform = createLinuxPlatform(platformOptions);
+  if (options.listsModems) return listModems(*platform, options.source.isPersonal);
   return serve(*platform, options);
 }
 

@@ -63,8 +63,35 @@ TEST_F(SourceCatalogueTest, WhatBeginsWithNoKindIsAFile) {
   EXPECT_EQ((*open(capture))->technology(), "UTRAN2");
   EXPECT_EQ(open("film").error().message,
             "film: No such file or directory (nor is it one of the sources simulation, capture, "
-            "drive-test, stream)");
+            "drive-test, stream, modem)");
   EXPECT_EQ(open("/film").error().message, "/film: No such file or directory");
+}
+
+TEST_F(SourceCatalogueTest, AGpsdHasAHostAndAPort) {
+  const auto parsed = [](std::string_view text) {
+    const auto server = parseGps(text);
+    return server ? server->host + " " + server->port : "refused";
+  };
+  EXPECT_EQ(parsed("gpsd"), "localhost 2947");
+  EXPECT_EQ(parsed("gpsd:car"), "car 2947");
+  EXPECT_EQ(parsed("gpsd:car:1234"), "car 1234");
+  EXPECT_EQ(parsed("gpsd:[::1]"), "::1 2947");
+  EXPECT_EQ(parsed("gpsd:[::1]:65535"), "::1 65535");
+  for (const std::string text :
+       {"", "gps", "gpsdx", "gpsd:", "gpsd::1", "gpsd:car:", "gpsd:car:0", "gpsd:car:65536",
+        "gpsd:car:x", "gpsd:[::1", "gpsd:[]", "gpsd:[a]b"}) {
+    EXPECT_EQ(parsed(text), "refused") << text;
+  }
+}
+
+TEST_F(SourceCatalogueTest, WithoutAMainQueueThereIsNoModem) {
+  const auto request = parseSource("modem", "");
+  ASSERT_TRUE(request);
+  const SourceServices services{.propertyListCoding = platform.propertyListCoding(),
+                                .clock = platform.clock()};
+  const auto source = openSource(*request, services, [](std::string_view) {});
+  ASSERT_FALSE(source);
+  EXPECT_EQ(source.error().message, "a modem is live: kestro-telephonyd plays it");
 }
 
 TEST_F(SourceCatalogueTest, ADriveTestLogAsAFileIsFollowedFromTechnologyToTechnology) {

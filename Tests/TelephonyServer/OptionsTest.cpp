@@ -81,6 +81,22 @@ TEST(OptionsTest, TheParentNeedsNoNumber) {
   EXPECT_TRUE(parsed.playback.loop);
 }
 
+TEST(OptionsTest, AModemHasOptionsOfItsOwn) {
+  const auto parsed =
+      options({"--source=modem:490154203237518", "--gps=gpsd:[::1]:1234", "--personal"});
+  EXPECT_EQ(parsed.source.kind, "modem");
+  EXPECT_EQ(parsed.source.argument, "490154203237518");
+  EXPECT_EQ(parsed.source.gps, "gpsd:[::1]:1234");
+  EXPECT_TRUE(parsed.source.isPersonal);
+  EXPECT_FALSE(options({"--source=modem"}).source.isPersonal);
+  EXPECT_TRUE(options({"--list-modems"}).listsModems);
+  EXPECT_EQ(refusal({"--gps=gpsd"}).exitStatus, 2);
+  EXPECT_EQ(refusal({"--personal"}).exitStatus, 2);
+  EXPECT_EQ(refusal({"--source=modem", "--gps=film"}).exitStatus, 2);
+  EXPECT_EQ(refusal({"--source=modem:film"}).exitStatus, 2);
+  EXPECT_EQ(refusal({"--source=modem", "--technology=LTE"}).exitStatus, 2);
+}
+
 TEST(OptionsTest, WrongUsageIsStatusTwo) {
   EXPECT_EQ(refusal({"--source=simulation:film"}).exitStatus, 2);
   EXPECT_EQ(refusal({"--source=capture"}).exitStatus, 2);

@@ -151,6 +151,20 @@ TEST_F(ServerTest, EveryChannelHasAPortOfItsOwn) {
   EXPECT_EQ(_server->channelCount(), 2U);
 }
 
+TEST_F(ServerTest, TheFirstChannelAndTheEndOfTheLastAreTold) {
+  std::vector<bool> told;
+  _server->setWatchHandler([&told](bool isWatched) { told.push_back(isWatched); });
+  auto first = openChannel("First");
+  auto second = openChannel("Second");
+  EXPECT_EQ(told, std::vector<bool>{true});
+  _clientPorts.erase("First");
+  _platform.mainQueue().advance(seconds(2));
+  EXPECT_EQ(told, std::vector<bool>{true});
+  _clientPorts.erase("Second");
+  _platform.mainQueue().advance(seconds(2));
+  EXPECT_EQ(told, (std::vector<bool>{true, false}));
+}
+
 TEST_F(ServerTest, BadChannelRequestsAreAnsweredWithOne) {
   openClientPort("A");
   EXPECT_EQ(request(bytesOf("garbage"))["Error"], Value::integer(1));
