@@ -15,7 +15,8 @@ SERVICE = "org.freedesktop.ModemManager1"
 PATIENCE = 20
 
 # What a test of the services group takes, by the package that brings it.
-PROGRAMS = {"ModemManager": "modemmanager", "gdbus": "libglib2.0-bin", "dbus-daemon": "dbus-daemon"}
+PROGRAMS = {"ModemManager": "modemmanager", "gdbus": "libglib2.0-bin", "dbus-daemon": "dbus-daemon",
+            "gpsd": "gpsd", "gpsfake": "gpsd-clients"}
 
 
 def program(name):
