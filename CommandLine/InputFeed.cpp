@@ -25,11 +25,6 @@ std::optional<std::string> usageProblem(const std::vector<SourceRequest>& reques
 
 }  // namespace
 
-bool haveSeveralTechnologies(const InputOptions& options) {
-  OfflineServices services;
-  return haveSeveralTechnologies(requestsOf(options), narrowingOf(options), services.forSources());
-}
-
 tl::expected<InputFeed, ExitStatus> InputFeed::open(const InputOptions& options,
                                                     bool printsResults) {
   const auto requests = requestsOf(options);
@@ -45,6 +40,12 @@ tl::expected<InputFeed, ExitStatus> InputFeed::open(const InputOptions& options,
     return tl::unexpected(kExitNothingDone);
   }
   return InputFeed(std::move(services), *std::move(inputs), printsResults);
+}
+
+bool InputFeed::hasSeveralTechnologies(const InputOptions& options) const {
+  return _inputs.mayHaveSeveralTechnologies() &&
+         haveSeveralTechnologies(requestsOf(options), narrowingOf(options),
+                                 _services->forSources());
 }
 
 bool InputFeed::takeNext(const Handler& take) {

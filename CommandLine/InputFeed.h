@@ -19,9 +19,6 @@
 
 namespace kestro {
 
-/// Whether the messages that are wanted are of several technologies; see `haveSeveralTechnologies`.
-[[nodiscard]] bool haveSeveralTechnologies(const InputOptions& options);
-
 /// Names on standard error what cannot be read or done, and goes on as far as that is possible; on
 /// a terminal it shows how far it is.
 class InputFeed {
@@ -30,6 +27,10 @@ class InputFeed {
   /// the exit status. `printsResults` as for Progress.
   [[nodiscard]] static tl::expected<InputFeed, ExitStatus> open(const InputOptions& options,
                                                                 bool printsResults);
+
+  /// Whether the messages that are wanted are of several technologies; `options` are those of the
+  /// feed, which is unread still. See `haveSeveralTechnologies`.
+  [[nodiscard]] bool hasSeveralTechnologies(const InputOptions& options) const;
 
   /// What is done with a whole message; an error is named with the message's number.
   using Handler = std::function<Result<void>(const InputMessage&)>;

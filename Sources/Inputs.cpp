@@ -162,19 +162,13 @@ double Inputs::shareOfEnd() const noexcept {
   return std::clamp(share, 0.0, 1.0);
 }
 
-namespace {
-
-/// Whether more than one technology is to be expected.
-bool canDiffer(const Inputs& inputs) {
-  for (std::size_t i = 0; i < inputs.size(); ++i) {
-    const InputReader& reader = inputs.reader(i);
-    if (reader.mayChangeTechnology()) return true;
-    if (reader.technology() != inputs.reader(0).technology()) return true;
-  }
-  return false;
+bool Inputs::mayHaveSeveralTechnologies() const noexcept {
+  if (!_narrowing.technology.empty()) return false;
+  return std::ranges::any_of(_inputs, [this](const Input& input) {
+    return input.reader->mayChangeTechnology() ||
+           input.reader->technology() != _inputs.front().reader->technology();
+  });
 }
-
-}  // namespace
 
 bool haveSeveralTechnologies(std::span<const SourceRequest> requests,
                              const InputNarrowing& narrowing, const SourceServices& services) {
@@ -182,7 +176,7 @@ bool haveSeveralTechnologies(std::span<const SourceRequest> requests,
   if (!std::ranges::all_of(requests, canBeReadTwice)) return true;
   auto inputs = Inputs::open(requests, narrowing, services, [](std::string_view) {});
   if (!inputs) return false;
-  if (!canDiffer(*inputs)) return false;
+  if (!inputs->mayHaveSeveralTechnologies()) return false;
   std::string_view technology;
   while (true) {
     const auto message = inputs->next();

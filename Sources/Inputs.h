@@ -54,6 +54,9 @@ class Inputs {
   /// as far as it is known, else empty.
   [[nodiscard]] std::string_view technology() const noexcept;
 
+  /// Whether more than one technology is to be expected, before any message is read.
+  [[nodiscard]] bool mayHaveSeveralTechnologies() const noexcept;
+
   /// What messages call an input.
   [[nodiscard]] const std::string& nameOf(std::size_t input) const { return _inputs[input].name; }
   [[nodiscard]] std::size_t size() const noexcept { return _inputs.size(); }

@@ -54,8 +54,8 @@ class Decoder {
   /// Writes the displays; false when nothing could be done.
   [[nodiscard]] bool decode() {
     const auto& format = _options.chosenFormat();
-    const auto writer =
-        format.makeWriter(_output, format.isStreamed && haveSeveralTechnologies(_options.inputs));
+    const auto writer = format.makeWriter(
+        _output, format.isStreamed && _feed.hasSeveralTechnologies(_options.inputs));
     ReplayedInputs replayed(_feed, _services,
                             {.refreshInterval = durationOfSeconds(_options.refreshSeconds)},
                             [&](const ReplayRefresh& refresh) { writer->refreshed(refresh); });

@@ -15,7 +15,7 @@ Explanation::Explanation(const ExplainOptions& options, InputFeed feed)
     : _options(options), _feed(std::move(feed)), _services(std::nullopt, options.shownLog) {}
 
 int Explanation::run() {
-  const bool hasSeveral = haveSeveralTechnologies(_options.inputs);
+  const bool hasSeveral = _feed.hasSeveralTechnologies(_options.inputs);
   if (!hasSeveral && !_options.isList) {
     const auto* only = technologyNamed(_feed.technology());
     if (only != nullptr && only->names.isEmpty()) return nothingDone(onlyPropertyLists());

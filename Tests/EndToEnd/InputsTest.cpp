@@ -151,6 +151,13 @@ TEST_F(InputsEndToEndTest, StandardInputIsReadByContent) {
   EXPECT_EQ(decoded(log).output, cli({"decode", log, "--format=json"}).output);
 }
 
+TEST_F(InputsEndToEndTest, ACaptureThroughAPipeNeedsNoFieldEither) {
+  const auto a = capture("a", {ifxMessage("1")});
+  const auto piped =
+      run({"/bin/sh", "-c", "cat '" + a + "' | \"$0\" decode - --format=csv", kProgram});
+  EXPECT_EQ(piped.output, cli({"decode", a, "--format=csv"}).output);
+}
+
 TEST_F(InputsEndToEndTest, AnEndlessStreamEndsWhereItIsAsked) {
   // A stream that repeats one IFX message for ever.
   const std::string message = ifxMessage("5");
