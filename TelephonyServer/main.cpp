@@ -98,5 +98,5 @@ int runServer(int argumentCount, const char* const* arguments) {
 
 int main(int argumentCount, char** arguments) {
   kestro::prepareStandardStreams();
-  return kestro::runServer(argumentCount, arguments);
+  kestro::endProcess(kestro::runServer(argumentCount, arguments));
 }

@@ -65,6 +65,10 @@ class LinuxPlatform : public Platform {
 /// fails, and no signal ends the process.
 void prepareStandardStreams() noexcept;
 
+/// Ends the process, as the end of `main` does. Call it there, when the platform is gone. Should a
+/// system bus still keep a connection waiting, the end does not wait with it.
+[[noreturn]] void endProcess(int status);
+
 /// Lines on standard error, for programs that need no event loop. A line that cannot be written is
 /// dropped, whatever the reason.
 [[nodiscard]] TextSink& standardErrorSink();

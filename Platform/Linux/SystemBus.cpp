@@ -3,10 +3,13 @@
 
 #include <QDBusError>
 #include <atomic>
+#include <cstdio>
 #include <cstdlib>
 #include <mutex>
 #include <thread>
 #include <utility>
+
+#include "Platform/Linux/LinuxPlatform.h"
 
 namespace kestro {
 namespace {
@@ -18,6 +21,12 @@ QString systemBusAddress() {
   const char* address = std::getenv("DBUS_SYSTEM_BUS_ADDRESS");
   const bool isGiven = address != nullptr && address[0] != '\0';
   return QString::fromLocal8Bit(isGiven ? address : kUsualAddress);
+}
+
+/// Attempts that are not over. A thread in the bus library may never come back from one.
+std::atomic<int>& attempts() {
+  static std::atomic<int> count{0};
+  return count;
 }
 
 QString nextName() {
@@ -37,8 +46,10 @@ struct SystemBusConnector::Outcome {
 
 SystemBusConnector::SystemBusConnector()
     : _name(nextName()), _outcome(std::make_shared<Outcome>()) {
+  ++attempts();
   std::thread([outcome = _outcome, name = _name, address = systemBusAddress()] {
     QDBusConnection connection = QDBusConnection::connectToBus(address, name);
+    --attempts();
     const std::scoped_lock lock(outcome->mutex);
     outcome->hasEnded = true;
     if (!outcome->isWanted) {
@@ -49,6 +60,14 @@ SystemBusConnector::SystemBusConnector()
       outcome->reason = connection.lastError().message().toStdString();
     }
   }).detach();
+}
+
+void endProcess(int status) {
+  if (attempts() > 0) {
+    static_cast<void>(std::fflush(nullptr));
+    std::_Exit(status);
+  }
+  std::exit(status);
 }
 
 SystemBusConnector::~SystemBusConnector() {

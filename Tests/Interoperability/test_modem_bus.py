@@ -11,6 +11,8 @@ import os
 import signal
 import socket
 import subprocess
+import tempfile
+import time
 import unittest
 
 import modem_manager
@@ -161,6 +163,21 @@ class StandIn(unittest.TestCase):
         eventually(lambda: False, 8)
         # 1 % of a core is 8 ticks of 10 ms; what the machine does besides may count, too.
         self.assertLessEqual(ticks() - before, 16)
+
+
+class SilentBus(unittest.TestCase):
+    def test_a_bus_that_never_answers_does_not_keep_the_server(self):
+        with tempfile.TemporaryDirectory() as folder, socket.socket(socket.AF_UNIX) as bus:
+            bus.bind(f"{folder}/bus")
+            bus.listen(5)
+            environment = {**os.environ, "DBUS_SYSTEM_BUS_ADDRESS": f"unix:path={folder}/bus"}
+            begin = time.monotonic()
+            listed = subprocess.run([os.environ["KESTRO_TELEPHONYD"], "--list-modems"],
+                                    env=environment, capture_output=True, text=True, check=False,
+                                    timeout=30)
+            self.assertLess(time.monotonic() - begin, 15)
+            self.assertEqual(listed.returncode, 1)
+            self.assertIn("the system bus does not answer", listed.stderr)
 
 
 if __name__ == "__main__":
