@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "Benchmarks/DecodeSpeed.h"
+#include "Benchmarks/MeasureSpeed.h"
 #include "Benchmarks/MessageMix.h"
 #include "LogGenerator/LTE/LTEClassIndex.h"
 #include "LogGenerator/LTE/LTELogGenerator.h"
@@ -243,6 +244,7 @@ int main(int argc, char** argv) {
   using namespace kestro::benchmarks;  // NOLINT(google-build-using-namespace)
   Display display("LTE");
   if (!registerKinds(display, kKinds)) return EXIT_FAILURE;
+  if (!registerMeasured("LTE", display, kKinds)) return EXIT_FAILURE;
   benchmark::Initialize(&argc, argv);
   benchmark::RunSpecifiedBenchmarks();
   return EXIT_SUCCESS;

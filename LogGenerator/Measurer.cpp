@@ -70,9 +70,9 @@ Measurer::~Measurer() = default;
 Measured Measurer::measure(std::string_view technology, ByteView message) {
   TechnologyMeasurer* measurer = measurerOf(technology);
   if (measurer == nullptr) return {};
-  _values.clear();
+  _values.cut(0);
   const LogCode code = measurer->measure(message, _values);
-  return {.code = code, .values = _values};
+  return {.code = code, .values = _values.all()};
 }
 
 TechnologyMeasurer* Measurer::measurerOf(std::string_view technology) {

@@ -44,17 +44,20 @@ MeasuredFields::MeasuredFields(std::span<const Field> fields, const SectionPlace
 void MeasuredFields::measure(PacketView packet, const RecordPosition& position,
                              std::span<const Series* const> series, std::uint32_t row,
                              const NumberSupplier* supplier, MeasuredValues& values) const {
-  const std::size_t before = values.size();
-  values.resize(before + _fields.size());
-  MeasuredValue* value = values.data() + before;
-  for (std::size_t i = 0; i < _fields.size(); ++i) {
+  MeasuredValue* const first = values.reserve(_fields.size());
+  MeasuredValue* value = first;
+  // What is written might be what is read, for all the compiler knows: it is asked for once.
+  const RecordPosition here = position;
+  const Series* const* of = series.data();
+  for (const MeasuredField *field = _fields.data(), *end = field + _fields.size(); field != end;
+       ++field, ++of) {
     value->text = {};
-    if (!_fields[i].measure(*value, packet, position, supplier) || series[i] == nullptr) continue;
-    value->series = series[i];
+    if (!field->measure(*value, packet, here, supplier) || *of == nullptr) continue;
+    value->series = *of;
     value->row = row;
     ++value;
   }
-  values.resize(static_cast<std::size_t>(value - values.data()));
+  values.take(static_cast<std::size_t>(value - first));
 }
 
 // --- Records -------------------------------------------------------------------------------------
@@ -97,7 +100,7 @@ void MeasuredTable::measure(PacketView packet, const NumberSupplier* supplier,
       ++row;
     });
   } catch (const ArrayOutOfBoundsException&) {
-    values.resize(before);
+    values.cut(before);
   }
 }
 

@@ -85,46 +85,52 @@ MeasuredField::MeasuredField(const Field& field)
       _signBit(_place.isSigned ? 1U << (_place.bitCount - 1) : 0),
       _scale(field.text.kind == TextRule::Kind::Integer ? field.text.multiplier : field.text.scale),
       _offset(field.text.kind == TextRule::Kind::Integer ? field.text.addend : field.text.offset),
+      _isRead(field.placeCount == 1 && field.condition.isAlways() && field.text.number == nullptr &&
+              !field.text.hasAbsentValue),
       _isQuick(field.placeCount == 1 && field.condition.isAlways() && isCommonPlace(_place) &&
                isQuickRule(field.text, _place)) {
-  const auto unit = unitOfNames(field.text.names);
-  _isOfNumbers = field.text.kind == TextRule::Kind::Named && unit.has_value();
-  if (_isOfNumbers) {
-    _unit = *unit;
-  } else if (field.text.kind != TextRule::Kind::Named) {
-    _unit = unitOfRule(field.text, field.placeCount);
-  }
+  _isOfNumbers = field.text.kind == TextRule::Kind::Named && unitOfNames(field.text.names);
 }
 
 SeriesGroup MeasuredField::group(const SectionPlace& place) const {
-  const bool isState = _field->text.kind == TextRule::Kind::Named && !_isOfNumbers;
+  const bool isNamed = _field->text.kind == TextRule::Kind::Named;
+  const auto unit =
+      isNamed ? unitOfNames(_field->text.names) : unitOfRule(_field->text, _field->placeCount);
   return {.technology = place.technology,
           .section = place.section,
           .key = std::string(_field->key),
-          .unit = std::string(_unit),
-          .kind = isState ? SeriesKind::State : SeriesKind::Number,
+          .unit = std::string(unit.value_or("")),
+          .kind = isNamed && !_isOfNumbers ? SeriesKind::State : SeriesKind::Number,
           .path = {.container = place.container,
                    .key = std::string(place.rowsAreEntries ? std::string_view() : _field->key),
                    .rowsAreEntries = place.rowsAreEntries}};
 }
 
-std::optional<std::int64_t> MeasuredField::raw(PacketView packet, const RecordPosition& position,
-                                               const NumberSupplier* supplier) const {
+bool MeasuredField::otherRaw(std::int64_t& number, PacketView packet,
+                             const RecordPosition& position, const NumberSupplier* supplier) const {
   const TextRule& rule = _field->text;
-  if (!holds(_field->condition, packet, position)) return std::nullopt;
+  if (!holds(_field->condition, packet, position)) return false;
   if (rule.kind == TextRule::Kind::Supplied) {
-    return supplier == nullptr ? std::nullopt : supplier->supply(*_field, packet, position);
+    const auto supplied =
+        supplier == nullptr ? std::nullopt : supplier->supply(*_field, packet, position);
+    number = supplied.value_or(0);
+    return supplied.has_value();
   }
-  std::int64_t number = readNumber(_place, packet, position);
+  number = readNumber(_place, packet, position);
   if (rule.number != nullptr) {
     std::array<std::int64_t, Field::kMaximumPlaces> numbers;
-    for (std::size_t i = 0; i < _field->placeCount; ++i) {
-      numbers[i] = readNumber(_field->places[i], packet, position);
-    }
-    number = rule.number({numbers.data(), _field->placeCount});
+    number = rule.number(rawNumbers(packet, position, numbers));
   }
-  if (rule.hasAbsentValue && number == rule.absentValue) return std::nullopt;
-  return number;
+  return !rule.hasAbsentValue || number != rule.absentValue;
+}
+
+std::span<const std::int64_t> MeasuredField::rawNumbers(
+    PacketView packet, const RecordPosition& position,
+    std::span<std::int64_t, Field::kMaximumPlaces> numbers) const {
+  for (std::size_t i = 0; i < _field->placeCount; ++i) {
+    numbers[i] = readNumber(_field->places[i], packet, position);
+  }
+  return numbers.first(_field->placeCount);
 }
 
 bool MeasuredField::measureOther(MeasuredValue& value, PacketView packet,
@@ -132,21 +138,21 @@ bool MeasuredField::measureOther(MeasuredValue& value, PacketView packet,
                                  const NumberSupplier* supplier) const {
   const TextRule& rule = _field->text;
   if (rule.kind == TextRule::Kind::Computed) return measureComputed(value, packet, position);
-  const auto number = raw(packet, position, supplier);
-  if (!number) return false;
+  std::int64_t number = 0;
+  if (!raw(number, packet, position, supplier)) return false;
   value.format = &rule.format;
   switch (rule.kind) {
     case TextRule::Kind::Named:
-      return measureName(value, *number);
+      return measureName(value, number);
     case TextRule::Kind::Integer:
-      value.number = shownInteger(rule.format, *number * rule.multiplier + rule.addend);
+      value.number = shownInteger(rule.format, number * rule.multiplier + rule.addend);
       return true;
     case TextRule::Kind::Scaled:
-      value.number = scaledNumber(rule, *number);
+      value.number = scaledNumber(rule, number);
       return true;
     default:
       value.format = &kDecimal;
-      value.number = static_cast<double>(*number);
+      value.number = static_cast<double>(number);
       return true;
   }
 }
@@ -155,10 +161,7 @@ bool MeasuredField::measureComputed(MeasuredValue& value, PacketView packet,
                                     const RecordPosition& position) const {
   if (!holds(_field->condition, packet, position)) return false;
   std::array<std::int64_t, Field::kMaximumPlaces> numbers;
-  for (std::size_t i = 0; i < _field->placeCount; ++i) {
-    numbers[i] = readNumber(_field->places[i], packet, position);
-  }
-  const ComputedValue computed = _field->text.computed({numbers.data(), _field->placeCount});
+  const ComputedValue computed = _field->text.computed(rawNumbers(packet, position, numbers));
   if (computed.isAbsent || !std::isfinite(computed.number)) return false;
   value.number = computed.number;
   value.format = computed.format;

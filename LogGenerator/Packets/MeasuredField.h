@@ -5,6 +5,7 @@
 #include <cstddef>
 #include <cstdint>
 #include <optional>
+#include <span>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -29,7 +30,33 @@ struct MeasuredValue {
 
   [[nodiscard]] bool hasNumber() const noexcept { return series->group->kind != SeriesKind::Text; }
 };
-using MeasuredValues = std::vector<MeasuredValue>;
+
+/// The values of a message. Their memory is kept for the next one's.
+class MeasuredValues {
+ public:
+  [[nodiscard]] std::span<const MeasuredValue> all() const noexcept {
+    return {_values.data(), _size};
+  }
+  [[nodiscard]] std::size_t size() const noexcept { return _size; }
+  void push_back(const MeasuredValue& value) {
+    *reserve(1) = value;
+    ++_size;
+  }
+  /// Room for so many values behind the last one, which may hold anything. Valid until the next
+  /// change.
+  [[nodiscard]] MeasuredValue* reserve(std::size_t count) {
+    if (_values.size() - _size < count) _values.resize(2 * (_size + count));
+    return _values.data() + _size;
+  }
+  /// Takes `count` of the values that were written into the room, the first ones.
+  void take(std::size_t count) noexcept { _size += count; }
+  /// Keeps the first `size` values, of which there must be so many.
+  void cut(std::size_t size) noexcept { _size = size; }
+
+ private:
+  std::vector<MeasuredValue> _values;
+  std::size_t _size = 0;
+};
 
 /// Appends what the display shows of the value: "-88.50 dBm".
 void writeShown(const MeasuredValue& value, TextBuffer& text);
@@ -64,8 +91,9 @@ class MeasuredField {
   /// What the series of the field's values have in common.
   [[nodiscard]] SeriesGroup group(const SectionPlace& place) const;
 
-  /// Writes what the packet says: number, text and format. False, with `value` of no use, when it
-  /// says nothing: its condition fails, it says that the value is absent, or it is no number.
+  /// Writes what the packet says: number, text and format; `value` has no text before. False, with
+  /// `value` of no use, when it says nothing: its condition fails, it says that the value is
+  /// absent, or it is no number.
   [[nodiscard, gnu::always_inline]] bool measure(MeasuredValue& value, PacketView packet,
                                                  const RecordPosition& position,
                                                  const NumberSupplier* supplier) const {
@@ -78,14 +106,26 @@ class MeasuredField {
     return true;
   }
 
-  /// The raw value that the rule shows; nothing where the packet has none.
-  [[nodiscard]] std::optional<std::int64_t> raw(PacketView packet, const RecordPosition& position,
-                                                const NumberSupplier* supplier) const;
+  /// Reads the raw value that the rule shows into `number`; false where the packet has none.
+  [[nodiscard]] bool raw(std::int64_t& number, PacketView packet, const RecordPosition& position,
+                         const NumberSupplier* supplier) const {
+    if (!_isRead) return otherRaw(number, packet, position, supplier);
+    number = readNumber(_place, packet, position);
+    return true;
+  }
+  /// Whether what it reads may be negative.
+  [[nodiscard]] bool isSigned() const noexcept { return _place.isSigned; }
 
  private:
+  [[nodiscard]] bool otherRaw(std::int64_t& number, PacketView packet,
+                              const RecordPosition& position, const NumberSupplier* supplier) const;
   [[nodiscard]] bool measureOther(MeasuredValue& value, PacketView packet,
                                   const RecordPosition& position,
                                   const NumberSupplier* supplier) const;
+  /// The values of all places, in their order.
+  [[nodiscard]] std::span<const std::int64_t> rawNumbers(
+      PacketView packet, const RecordPosition& position,
+      std::span<std::int64_t, Field::kMaximumPlaces> numbers) const;
   [[nodiscard]] bool measureComputed(MeasuredValue& value, PacketView packet,
                                      const RecordPosition& position) const;
   [[nodiscard]] bool measureName(MeasuredValue& value, std::int64_t raw) const;
@@ -96,9 +136,9 @@ class MeasuredField {
   std::uint32_t _signBit;  ///< the highest of a signed place; else 0
   double _scale;
   double _offset;
+  bool _isRead;       ///< the first place alone is the raw value, in every packet
   bool _isQuick;      ///< the number follows from the first place's bits alone, as in BoundField
   bool _isOfNumbers;  ///< all names are numbers of one unit
-  std::string_view _unit;
 };
 
 }  // namespace kestro

@@ -15,12 +15,10 @@ RowSeries::RowSeries(std::span<const Field> identity, std::span<const SeriesGrou
 }
 
 std::size_t RowSeries::Hash::operator()(const RowIdentity& identity) const noexcept {
-  std::uint64_t hash = identity.present;
-  for (const std::int64_t number : identity.numbers) {
-    hash = (hash ^ static_cast<std::uint64_t>(number)) * 0x9E3779B97F4A7C15U;
-    hash ^= hash >> 32;
-  }
-  return hash;
+  constexpr std::uint64_t kMultiplier = 0x9E3779B97F4A7C15U;
+  std::uint64_t hash = (identity.first ^ identity.present) * kMultiplier;
+  hash = (hash ^ hash >> 32 ^ identity.second) * kMultiplier;
+  return hash ^ hash >> 32;
 }
 
 RowIdentity RowSeries::identityOf(std::size_t row, PacketView packet,
@@ -28,13 +26,13 @@ RowIdentity RowSeries::identityOf(std::size_t row, PacketView packet,
                                   const NumberSupplier* supplier) const {
   RowIdentity identity;
   std::size_t count = 0;
-  for (std::size_t i = 0; i < _identity.size() && count < identity.numbers.size(); ++i) {
-    const auto number = _identity[i].raw(packet, position, supplier);
-    if (!number) continue;
-    identity.numbers[count++] = *number;
+  for (std::size_t i = 0; i < _identity.size() && count < RecordTable::kMaximumIdentity; ++i) {
+    std::int64_t number = 0;
+    if (!_identity[i].raw(number, packet, position, supplier)) continue;
+    identity.set(count++, static_cast<std::uint32_t>(number));
     identity.present |= 1U << i;
   }
-  if (count == 0) identity.numbers[0] = static_cast<std::int64_t>(row);
+  if (count == 0) identity.set(0, static_cast<std::uint32_t>(row));
   return identity;
 }
 
@@ -71,7 +69,9 @@ Item RowSeries::itemOf(const RowIdentity& identity, std::size_t occurrence) cons
   Item item;
   for (std::size_t i = 0; i < _fields.size(); ++i) {
     if ((identity.present >> i & 1) == 0) continue;
-    const std::int64_t number = identity.numbers[item.parts.size()];
+    const std::uint32_t bits = identity.number(item.parts.size());
+    const std::int64_t number =
+        _identity[i].isSigned() ? std::int64_t{static_cast<std::int32_t>(bits)} : bits;
     TextBuffer text;
     writeText(_fields[i].text, number, text);
     if (!item.text.empty()) item.text += '/';
@@ -79,7 +79,7 @@ Item RowSeries::itemOf(const RowIdentity& identity, std::size_t occurrence) cons
     item.parts.push_back(
         {.key = std::string(_fields[i].key), .number = number, .text = std::string(text.text())});
   }
-  if (item.parts.empty()) item.text = "#" + std::to_string(identity.numbers[0]);
+  if (item.parts.empty()) item.text = "#" + std::to_string(identity.number(0));
   if (occurrence > 1) item.text += " #" + std::to_string(occurrence);
   return item;
 }

@@ -2,7 +2,6 @@
 // Which series the rows of a list belong to, found by what tells one row from another.
 #pragma once
 
-#include <array>
 #include <cstddef>
 #include <cstdint>
 #include <span>
@@ -13,13 +12,23 @@
 
 namespace kestro {
 
-/// The numbers that identify a row: those of the identifying fields that the row has.
+/// The numbers that identify a row: those of the identifying fields that the row has. Made and
+/// compared for every row: in registers.
 struct RowIdentity {
-  std::array<std::int64_t, RecordTable::kMaximumIdentity> numbers{};  ///< one after the other
-  std::uint32_t present = 0;                                          ///< a bit for each field
+  std::uint64_t first = 0;    ///< the low 32 bits of the first number, and of the second
+  std::uint64_t second = 0;   ///< of the third and the fourth
+  std::uint32_t present = 0;  ///< a bit for each field
 
   bool operator==(const RowIdentity&) const = default;
+
+  void set(std::size_t index, std::uint32_t number) noexcept {
+    (index < 2 ? first : second) |= std::uint64_t{number} << (index % 2 * 32);
+  }
+  [[nodiscard]] std::uint32_t number(std::size_t index) const noexcept {
+    return static_cast<std::uint32_t>((index < 2 ? first : second) >> (index % 2 * 32));
+  }
 };
+static_assert(RecordTable::kMaximumIdentity == 4);
 
 /// The series of one list's rows, each row's made when it first comes up.
 class RowSeries {
