@@ -10,6 +10,7 @@
 #include "CommandLine/Commands/EventsCommand.h"
 #include "CommandLine/Commands/ExplainCommand.h"
 #include "CommandLine/Commands/InfoCommand.h"
+#include "CommandLine/Commands/MeasureCommand.h"
 #include "CommandLine/Commands/RecordCommand.h"
 #include "CommandLine/Commands/SnapshotCommand.h"
 #include "CommandLine/Commands/WatchCommand.h"
@@ -25,8 +26,8 @@ CommandRow commandLineProgram(const Bundle& bundle) {
           .help = "Shows live, or from a recording, what a phone's cellular baseband is doing.",
           .options = {versionOption("kestro-cli", bundle)},
           .commands = {watchCommand(), recordCommand(), decodeCommand(), convertCommand(),
-                       explainCommand(), infoCommand(), cellsCommand(), eventsCommand(),
-                       codesCommand(), snapshotCommand()},
+                       explainCommand(), infoCommand(), measureCommand(), cellsCommand(),
+                       eventsCommand(), codesCommand(), snapshotCommand()},
           .sections = {{.title = "Exit status",
                         .rows = {{"0", "done"},
                                  {"1", "nothing could be done; one line says why"},

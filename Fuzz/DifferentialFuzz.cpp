@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
-// Packets of one technology: its generator shows what a plain reader of the same layouts shows.
+// Packets of one technology: its generator shows what a plain reader of the same layouts shows, and
+// what is measured stands there, value for value.
 #include <algorithm>
+#include <optional>
 #include <set>
 #include <utility>
 #include <vector>
@@ -8,7 +10,9 @@
 #include "Fuzz/GeneratorChannel.h"
 #include "Fuzz/PlainReader/PlainReader.h"
 #include "Fuzz/Technology.h"
+#include "LogGenerator/Measurer.h"
 #include "Platform/PropertyListDescription.h"
+#include "Tests/Support/DisplayPlaces.h"
 #include "Tests/Support/SubscribedCodes.h"
 
 namespace kestro::fuzz {
@@ -28,6 +32,7 @@ class Comparison {
       _channel.platform().bundle().setResource(fmt::format("{}.plist", name), contents);
     }
     _channel.start();
+    _measurer.emplace(MeasurerServices{_channel.platform().bundle(), propertyListCoding()});
     const std::set<LogCode> known(_reader->codes().begin(), _reader->codes().end());
     require(testing::subscribedCodes(_channel.generator()) == known,
             "the plain reader knows the codes that the generator asks for, and no others");
@@ -81,6 +86,20 @@ class Comparison {
     const bool isSurvived = _reader->receive(message);
     require(_channel.receive(message) == isSurvived, "the same messages end the application");
     requireSame(_channel.state()[kStateDisplay], _reader->display());
+    const Measured measured = _measurer->measure(kTechnology, message);
+    if (isSurvived) requireMeasured(measured);
+  }
+
+  void requireMeasured(const Measured& measured) const {
+    const testing::Places shown = testing::placesOf(_reader->display());
+    for (const MeasuredValue& value : measured.values) {
+      const auto place = shown.find(testing::placeOf(value));
+      TextBuffer text;
+      writeShown(value, text);
+      if (place != shown.end() && place->second == text.text()) continue;
+      fmt::print(stderr, "{}: measured {}\n", testing::placeOf(value), text.text());
+      require(false, "what is measured is what the plain reader shows");
+    }
   }
 
   static void requireSame(const Value& shown, const Value& plain) {
@@ -97,6 +116,7 @@ class Comparison {
   GeneratorChannel _channel{kTechnology};
   std::unique_ptr<plain::PlainReader> _reader =
       plain::makePlainReader(kTechnology, propertyListCoding());
+  std::optional<Measurer> _measurer;
   std::vector<Entry> _history;
   bool _isChanged = true;
 };

@@ -4,12 +4,15 @@
 
 #include <fmt/format.h>
 
+#include <cmath>
 #include <memory>
+#include <optional>
 #include <string_view>
 
 #include "Fuzz/Harness.h"
 #include "LogGenerator/InternalConsistencyFailure.h"
 #include "LogGenerator/LogGenerator.h"
+#include "LogGenerator/Measurer.h"
 #include "LogGenerator/Ondrel/Base.h"
 #include "LogGenerator/Ondrel/SharedDecoders.h"
 #include "Model/KestroModelNode.h"
@@ -61,6 +64,20 @@ class GeneratorChannel {
     _generator->explainMessage(message, [&](const auto&...) { ++count; });
   }
 
+  /// Measures a message; values are numbers that can be written down.
+  void measure(ByteView message) {
+    if (!_measurer) {
+      _measurer.emplace(MeasurerServices{_platform.bundle(), propertyListCoding()});
+    }
+    for (const MeasuredValue& value : _measurer->measure(_technology, message).values) {
+      require(std::isfinite(value.number), "a number that is measured is one");
+      TextBuffer text;
+      writeShown(value, text);
+    }
+    require(_measurer->series().all().size() <= SeriesTable::kMaximumSeries,
+            "a recording has no more series than there may be");
+  }
+
   /// Refreshes and builds the tree.
   void refresh() {
     NodesByPath nodes;
@@ -85,6 +102,7 @@ class GeneratorChannel {
   std::string_view _technology;
   QuietPlatform _platform{propertyListCoding()};
   std::unique_ptr<LogGenerator> _generator;
+  std::optional<Measurer> _measurer;
   Dictionary _state;
 };
 

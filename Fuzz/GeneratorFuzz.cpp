@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT
-// Messages, refreshes, saves and reconnections of one technology, in any order, with and without
-// its template.
+// Messages that are decoded, explained and measured, refreshes, saves and reconnections of one
+// technology, in any order, with and without its template.
 #include "Fuzz/GeneratorChannel.h"
 #include "Fuzz/Technology.h"
 
@@ -25,6 +25,7 @@ void takeStep(Input& input, GeneratorChannel& channel) {
   const ByteView message = input.bytes(input.number16() % 2048);
   channel.receive(message);
   channel.explain(message);
+  channel.measure(message);
 }
 
 }  // namespace

@@ -22,7 +22,7 @@ SectionPlace C2KSeriesNames::placeOfList(const PacketKind& packet,
   SectionPlace place{.technology = std::string(kTqLogChannelTechnology_Ondrel_CDMA),
                      .section = group.name(),
                      .container = std::move(group.path.container)};
-  if (!place.container.empty()) place.container.push_back(std::move(group.path.key));
+  if (!group.path.key.empty()) place.container.push_back(std::move(group.path.key));
   return place;
 }
 

@@ -4,6 +4,8 @@
 #include <algorithm>
 #include <string>
 
+#include "LogGenerator/DisplayKeys.h"
+
 namespace kestro {
 namespace {
 
@@ -27,7 +29,7 @@ ListMeasurer::ListMeasurer(const Section& section, const SectionPlace& place, Se
          .key = std::string(value.key),
          .unit = std::string(isOfTexts ? std::string_view() : unitOf(value.text.format)),
          .kind = isOfTexts ? SeriesKind::Text : SeriesKind::Number,
-         .path = {.container = place.container, .key = std::string(value.key)}}));
+         .path = pathIn(place, value.key)}));
   }
 }
 
@@ -104,6 +106,7 @@ void ListMeasurer::measureElements(const Array& elements, MeasuredValues& values
     const Item* item = _series.item({.text = "#" + std::to_string(row)});
     for (const auto& [key, value] : element.dictionary()) {
       if (item == nullptr || !key.isText() || !value.isText()) continue;
+      if (key.text() == kSortedMarker) continue;  // it is never shown
       const Series* series = textSeries(key.text(), item);
       if (series != nullptr) {
         values.push_back({.series = series, .text = value.text(), .row = row});
@@ -114,12 +117,11 @@ void ListMeasurer::measureElements(const Array& elements, MeasuredValues& values
 }
 
 const Series* ListMeasurer::textSeries(std::string_view key, const Item* item) {
-  const SeriesGroup* group =
-      _series.group({.technology = _place.technology,
-                     .section = _place.section,
-                     .key = std::string(key),
-                     .kind = SeriesKind::Text,
-                     .path = {.container = _place.container, .key = std::string(key)}});
+  const SeriesGroup* group = _series.group({.technology = _place.technology,
+                                            .section = _place.section,
+                                            .key = std::string(key),
+                                            .kind = SeriesKind::Text,
+                                            .path = pathIn(_place, key)});
   return group == nullptr ? nullptr : _series.series(*group, item);
 }
 

@@ -92,6 +92,13 @@ MeasuredField::MeasuredField(const Field& field)
   _isOfNumbers = field.text.kind == TextRule::Kind::Named && unitOfNames(field.text.names);
 }
 
+DisplayPath pathIn(const SectionPlace& place, std::string_view key) {
+  if (place.container.empty()) return {};
+  return {.container = place.container,
+          .key = std::string(place.rowsAreEntries ? std::string_view() : key),
+          .rowsAreEntries = place.rowsAreEntries};
+}
+
 SeriesGroup MeasuredField::group(const SectionPlace& place) const {
   const bool isNamed = _field->text.kind == TextRule::Kind::Named;
   const auto unit =
@@ -101,9 +108,7 @@ SeriesGroup MeasuredField::group(const SectionPlace& place) const {
           .key = std::string(_field->key),
           .unit = std::string(unit.value_or("")),
           .kind = isNamed && !_isOfNumbers ? SeriesKind::State : SeriesKind::Number,
-          .path = {.container = place.container,
-                   .key = std::string(place.rowsAreEntries ? std::string_view() : _field->key),
-                   .rowsAreEntries = place.rowsAreEntries}};
+          .path = pathIn(place, _field->key)};
 }
 
 bool MeasuredField::otherRaw(std::int64_t& number, PacketView packet,

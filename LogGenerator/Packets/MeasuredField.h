@@ -73,6 +73,9 @@ struct SectionPlace {
   bool rowsAreEntries = false;           ///< as in DisplayPath
 };
 
+/// Where the display shows a key of the section.
+[[nodiscard]] DisplayPath pathIn(const SectionPlace& place, std::string_view key);
+
 /// Knows the values of fields that are not read from the packet (`supplied()`).
 class NumberSupplier {
  public:

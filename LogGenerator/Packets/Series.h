@@ -22,7 +22,8 @@ enum class SeriesKind : std::uint8_t {
 /// Where a generator's display shows a value.
 struct DisplayPath {
   /// The keys, as the display has them ("01;Serving Cell"), from the root to the container that the
-  /// value stands in; for a list's row, to the list. Empty: the display has no place for it.
+  /// value stands in; for a list's row, to the list. Without any, and without a key, the display
+  /// has no place for the value.
   std::vector<std::string> container{};
   /// The value's key in the container, or in its row; empty for a row that is a plain text.
   std::string key{};
