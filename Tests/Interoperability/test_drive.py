@@ -83,15 +83,19 @@ class Drive(unittest.TestCase):
         self.assertIn("made-up: drive-test", comments)
 
     def test_both_technologies_decode_to_the_displays_that_were_watched(self):
+        # Each technology stays for two ticks of the display, which begin anew with it.
+        rows = [f"2019.11.21_15.38.{10 + second},{mode}"
+                for second, mode in enumerate(4 * ["LTE,-93,-11,27447297,1,2A"]
+                                              + 4 * ["UMTS,-81,-5,1234,2,2A"])]
         log = self.folder / "mixed.csv"
-        log.write_text("\n".join((COLUMNS, *ROWS)) + "\n")
+        log.write_text("\n".join((COLUMNS, *rows)) + "\n")
         self.serve([f"--source=drive-test:{log}", "--technology=auto", "--loop"])
         path = self.folder / "drive.pcapng"
         recorder = subprocess.Popen(
             self.command(path), env=self.environment, stdin=subprocess.DEVNULL,
             stderr=subprocess.PIPE)
         recorder.stderr.readline()  # it records
-        watched = self.displays("watch", "--count=5")
+        watched = self.displays("watch", "--count=4")
         recorder.send_signal(signal.SIGINT)
         recorder.communicate(timeout=PATIENCE)
         decoded = self.displays("decode", path, "--refresh-every=0")
