@@ -5,6 +5,7 @@
 
 #include <utility>
 
+#include "Measurements/DriveTestSeries.h"
 #include "Measurements/PacketText.h"
 
 namespace kestro {
@@ -26,16 +27,14 @@ std::vector<Alarms::Watched>& Alarms::watchedOf(const Series& series) {
   if (known != _watched.end()) return known->second;
   auto [rules, isNew] = _rulesOfGroup.try_emplace(series.group);
   for (std::uint32_t i = 0; isNew && i < _rules.size(); ++i) {
-    if (!means(_rules[i], *series.group)) continue;
-    rules->second.push_back(i);
-    _hasMet[i] = true;
+    if (means(_rules[i], *series.group)) rules->second.push_back(i);
   }
   std::vector<Watched>& watched = _watched[&series];
   for (const std::uint32_t rule : rules->second) {
     if (_watchedCount == kMaximumWatched) {
       ++_notWatched;
     } else {
-      watched.push_back({.rule = rule});
+      watched.push_back({.rule = rule, .isOfLog = isOfDriveTestLog(*series.group)});
       ++_watchedCount;
     }
   }
@@ -51,6 +50,8 @@ void Alarms::take(const MeasuredMessage& message) {
 
 void Alarms::takeValue(const MeasuredMessage& message, const MeasuredValue& value,
                        Watched& watched) {
+  if (message.isFromDriveTest && !watched.isOfLog) return;
+  _hasMet[watched.rule] = true;
   const Rule& rule = _rules[watched.rule];
   if (!compares(value.number, rule.comparison, rule.limit)) {
     if (!watched.broken) return;

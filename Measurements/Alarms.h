@@ -15,7 +15,8 @@ namespace kestro {
 
 /// Watches every item of every series that a rule means by itself. The time is the messages' own:
 /// an alarm begins with the first value at which the rule has been broken for its duration, all
-/// values since having broken it, and is over with the first value that keeps the rule.
+/// values since having broken it, and is over with the first value that keeps the rule. What is
+/// made up in a drive-test log's packets is no value.
 class Alarms {
  public:
   /// So many series are watched, each for every rule that means it; further ones are not, and are
@@ -27,7 +28,7 @@ class Alarms {
   void take(const MeasuredMessage& message);
 
   [[nodiscard]] const std::vector<Rule>& rules() const noexcept { return _rules; }
-  /// Whether the rule has met a series that it means.
+  /// Whether the rule has met a value of a series that it means.
   [[nodiscard]] bool hasMet(std::size_t rule) const { return _hasMet[rule]; }
   [[nodiscard]] std::uint64_t notWatchedCount() const noexcept { return _notWatched; }
 
@@ -39,6 +40,7 @@ class Alarms {
   /// The rules that mean a series, and where each of them is broken at present.
   struct Watched {
     std::uint32_t rule;
+    bool isOfLog;  ///< a drive-test log says its values: they are not made up
     std::optional<Broken> broken{};
   };
   [[nodiscard]] std::vector<Watched>& watchedOf(const Series& series);

@@ -271,6 +271,18 @@ TEST_F(LTEDriveTest, ARuleWithAnotherUnitOrNameMeetsNothing) {
   EXPECT_FALSE(watch->alarms().hasMet(1));
 }
 
+TEST_F(LTEDriveTest, WhatIsMadeUpInADriveTestLogBreaksNoRule) {
+  watchWith("E-ARFCN == 1300\nMeasured RSRP < -110");
+  isFromDriveTest = true;
+  at(0).take(lteServing(14, -115));
+  ASSERT_EQ(events.size(), 1u);
+  EXPECT_EQ(events[0].to, "Measured RSRP < -110");
+  EXPECT_FALSE(watch->alarms().hasMet(0));
+  isFromDriveTest = false;
+  take(lteServing(14, -115));
+  EXPECT_TRUE(watch->alarms().hasMet(0));
+}
+
 TEST_F(LTEDriveTest, AClockThatIsSetBackBeginsARulesTimeAnew) {
   watchWith("Measured RSRP < -110 dBm for 4 s");
   at(100'000).take(lteServing(14, -111));
