@@ -28,6 +28,7 @@ NavigationBar::NavigationBar(QWidget* parent) : QWidget(parent), _back(new BarBu
 void NavigationBar::setTitles(const QString& title, const QString& backTitle) {
   _title = title;
   setAccessibleName(title);
+  setToolTip(title);  // it may be elided
   _back->setVisible(!backTitle.isNull());
   _back->setText(backTitle);
   _back->setAccessibleName(tr("Back to %1").arg(backTitle));

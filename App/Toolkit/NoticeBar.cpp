@@ -20,8 +20,11 @@ constexpr int kNoticePoints = 13;
 constexpr int kNoticeMargin = 16;
 constexpr int kNoticePadding = 5;
 
-/// A path may be wrapped behind each of its folders.
-QString wrappable(QString text) { return text.replace(u'/', QStringLiteral("/\u200b")); }
+/// A path may be wrapped behind each of its folders and hyphens.
+QString wrappable(QString text) {
+  for (const QChar sign : {u'/', u'-'}) text.replace(sign, QString(sign) + QChar(0x200b));
+  return text;
+}
 
 int textHeight(const QLabel& label, int width) {
   return label.isHidden() ? 0 : label.heightForWidth(width) + 2 * kNoticePadding;

@@ -4,6 +4,7 @@
 #include <gmock/gmock.h>
 
 #include <algorithm>
+#include <csignal>
 #include <cstdlib>
 #include <set>
 
@@ -91,6 +92,35 @@ TEST_P(PicturesTest, TheSaveScreenAndTheFileError) {
   ASSERT_TRUE(waitFor([] { return app().saveViewController() == nullptr; }));
   ASSERT_NE(app().alert(), nullptr);
   takePicture("file-error");
+}
+
+TEST_P(PicturesTest, WhereASnapshotWasSaved) {
+  key(Qt::Key_S, Qt::ControlModifier);
+  app().saveViewController()->savePressed();
+  ASSERT_TRUE(waitFor([] { return app().saveViewController() == nullptr; }));
+  EXPECT_NE(app().window()->noticeBar().message(), QString());
+  takePicture("saved");
+}
+
+TEST_P(PicturesTest, ALostConnection) {
+  open("Serving Cell");
+  open("Serving Cell Measurements");
+  server->signal(SIGKILL);
+  ASSERT_TRUE(waitFor([] { return !app().window()->noticeBar().notice().isEmpty(); }));
+  waitUntilUnmarked();
+  takePicture("lost");
+}
+
+TEST_P(PicturesTest, LargeTexts) {
+  const QFont before = QApplication::font();
+  QFont larger = before;
+  larger.setPointSize(20);
+  QApplication::setFont(larger);
+  open("Serving Cell");
+  open("Serving Cell Measurements");
+  ASSERT_TRUE(waitFor([] { return rows().size() >= 5; }));
+  takePicture("large");
+  QApplication::setFont(before);
 }
 
 INSTANTIATE_TEST_SUITE_P(Colours, PicturesTest, ::testing::Values("light", "dark"),
