@@ -123,7 +123,10 @@ QWidget* Toolbar::makeWidget(std::size_t index) {
 void Toolbar::fill(std::size_t index) {
   const ToolbarItem& item = _items[index];
   QWidget* widget = _widgets[index];
-  if (item.kind == ToolbarItem::Kind::Label) static_cast<BarLabel*>(widget)->setText(item.text);
+  if (item.kind == ToolbarItem::Kind::Label) {
+    static_cast<BarLabel*>(widget)->setText(item.text);
+    widget->setToolTip(item.text);  // it may be elided
+  }
   if (item.kind == ToolbarItem::Kind::Button) static_cast<BarButton*>(widget)->setText(item.text);
   if (item.kind != ToolbarItem::Kind::ActivityIndicator) return;
   auto* indicator = static_cast<ActivityIndicator*>(widget);
