@@ -161,8 +161,7 @@ class StandIn(unittest.TestCase):
 
         before = ticks()
         eventually(lambda: False, 8)
-        # 1 % of a core is 8 ticks of 10 ms; what the machine does besides may count, too.
-        self.assertLessEqual(ticks() - before, 16)
+        self.assertLessEqual(ticks() - before, 8)  # of 10 ms, in 8 s: 1 % of a core
 
 
 class SilentBus(unittest.TestCase):
