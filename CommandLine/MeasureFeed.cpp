@@ -22,8 +22,7 @@ MeasureFeed::MeasureFeed(InputFeed feed, MeasureChoice choice, const Events& eve
     if (events) events(event);
   };
   for (std::size_t i = 0; i < _feed.inputs().size(); ++i) {
-    _drives.push_back(std::unique_ptr<Drive>(
-        new Drive{Measurer(measuring), DriveWatch(std::vector<Rule>(), tell)}));
+    _drives.push_back(std::make_unique<Drive>(measuring, tell));
   }
 }
 

@@ -67,6 +67,9 @@ class MeasureFeed {
     std::string text{};
   };
   struct Drive {
+    Drive(const MeasurerServices& services, const EventSink& sink)
+        : measurer(services), watch({}, sink) {}
+
     Measurer measurer;
     DriveWatch watch;
     std::vector<Known> known{};  ///< by the series' identifiers

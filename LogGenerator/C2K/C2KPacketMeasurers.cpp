@@ -140,7 +140,7 @@ class ThroughputMeasurer : public C2KPacketMeasurer {
     const auto rate = _previous ? rateBetween(*_previous, current) : std::nullopt;
     _previous = current;
     if (!rate || _series == nullptr) return;
-    values.push_back({.series = _series, .number = *rate, .format = &kDataRateFormat});
+    values.add({.series = _series, .number = *rate, .format = &kDataRateFormat});
   }
 
  private:
@@ -162,8 +162,7 @@ class FrameErrorMeasurer : public C2KPacketMeasurer {
   void take(const TakenPacket& packet, MeasuredValues& values) override {
     _rate = FrameErrorRate::after(_rate, isBadFrame(packet));
     if (_series == nullptr) return;
-    values.push_back(
-        {.series = _series, .number = _rate->percent(), .format = &kFrameErrorRateFormat});
+    values.add({.series = _series, .number = _rate->percent(), .format = &kFrameErrorRateFormat});
   }
 
  private:
@@ -208,8 +207,7 @@ class OneXStatusMeasurer : public C2KPacketMeasurer {
           _pilots.of(row, _pilots.identityOf(row, packet, set.pilotAt(row), nullptr))[0];
       if (series == nullptr) continue;
       const ComputedValue energy = set.energyOf(row);
-      values.push_back(
-          {.series = series, .number = energy.number, .format = energy.format, .row = row});
+      values.add({.series = series, .number = energy.number, .format = energy.format, .row = row});
     }
   }
 

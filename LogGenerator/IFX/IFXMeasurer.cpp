@@ -109,10 +109,10 @@ void IFXMeasurer::measureText(DisplayPath path, std::string_view name, const Val
                      .path = std::move(path)});
   const Series* series = group == nullptr ? nullptr : _series.series(*group, position.item);
   if (series == nullptr) return;
-  values.push_back({.series = series,
-                    .number = number ? number->number : 0,
-                    .text = text.text(),
-                    .row = position.row});
+  values.add({.series = series,
+              .number = number ? number->number : 0,
+              .text = text.text(),
+              .row = position.row});
 }
 
 }  // namespace kestro

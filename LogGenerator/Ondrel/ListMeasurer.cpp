@@ -73,7 +73,7 @@ void ListMeasurer::measureNumber(std::size_t index, const Dictionary& cell, cons
   if (!number || _groups[index] == nullptr) return;
   const Series* series = _series.series(*_groups[index], item);
   if (series == nullptr) return;
-  values.push_back({.series = series, .number = *number, .format = &value.text.format, .row = row});
+  values.add({.series = series, .number = *number, .format = &value.text.format, .row = row});
 }
 
 const Item* ListMeasurer::itemOf(const Dictionary& cell, std::size_t row) {
@@ -96,7 +96,7 @@ void ListMeasurer::measureFiles(const Dictionary& files, MeasuredValues& values)
     const Value& value = files[_reading.values[i].listKey];
     if (!value.isText() || _groups[i] == nullptr) continue;
     const Series* series = _series.series(*_groups[i], nullptr);
-    if (series != nullptr) values.push_back({.series = series, .text = value.text()});
+    if (series != nullptr) values.add({.series = series, .text = value.text()});
   }
 }
 
@@ -109,7 +109,7 @@ void ListMeasurer::measureElements(const Array& elements, MeasuredValues& values
       if (key.text() == kSortedMarker) continue;  // it is never shown
       const Series* series = textSeries(key.text(), item);
       if (series != nullptr) {
-        values.push_back({.series = series, .text = value.text(), .row = row});
+        values.add({.series = series, .text = value.text(), .row = row});
       }
     }
     ++row;

@@ -38,7 +38,7 @@ class MeasuredValues {
     return {_values.data(), _size};
   }
   [[nodiscard]] std::size_t size() const noexcept { return _size; }
-  void push_back(const MeasuredValue& value) {
+  void add(const MeasuredValue& value) {
     *reserve(1) = value;
     ++_size;
   }
