@@ -14,7 +14,7 @@ namespace kestro {
 /// series must outlive who is given it.
 struct MeasuredMessage {
   Moment time{};
-  std::uint64_t number = 0;     ///< its place in the recording, from 1
+  std::uint64_t number = 0;  ///< its place in the recording, from 1
   /// As the log channel names it: a constant text of Platform/TelephonyService.h.
   std::string_view technology;
   /// It was encoded from a drive-test log: what such a log does not hold is made up.

@@ -115,8 +115,9 @@ class Recorder(Process):
 
     def __init__(self, world, name, path=None, pipe=False, **options):
         self.path = path or world.folder / f"{name}.pcap"
-        command = [world.program("kestro-cli"), "record", "--output"]
-        command += ["/dev/stdout" if pipe else str(self.path)]
+        if pipe:  # by a name that asks for pcap
+            self.path.symlink_to("/dev/stdout")
+        command = [world.program("kestro-cli"), "record", "--output", str(self.path)]
         super().__init__(name, command, world.environment, world.folder, pipe=pipe, **options)
         self.recording = Recording(name)
         self._file = None
