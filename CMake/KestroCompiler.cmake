@@ -18,7 +18,7 @@ set(CMAKE_CXX_FLAGS_RELWITHDEBINFO "-O2 -g1 -DNDEBUG")
 
 # Compiling is mostly reading the same headers again. Sources that are compiled at one time must not
 # give one name to different things, not even in unnamed namespaces.
-set(CMAKE_UNITY_BUILD_BATCH_SIZE 6)
+set(CMAKE_UNITY_BUILD_BATCH_SIZE 12)
 
 find_program(KESTRO_CCACHE ccache)
 if(KESTRO_CCACHE AND NOT CMAKE_CXX_COMPILER_LAUNCHER)
