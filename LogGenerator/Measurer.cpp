@@ -81,7 +81,8 @@ TechnologyMeasurer* Measurer::measurerOf(std::string_view technology) {
   const auto row =
       std::ranges::find(kMeasuredTechnologies, technology, &MeasuredTechnology::technology);
   if (row == std::end(kMeasuredTechnologies)) return nullptr;
-  return _known.emplace_back(std::string(technology), row->make(_services, _series)).measurer.get();
+  _known.push_back({std::string(technology), row->make(_services, _series)});
+  return _known.back().measurer.get();
 }
 
 }  // namespace kestro

@@ -79,8 +79,7 @@ std::optional<ConnectionProblem> LogChannelClient::tryToConnect() {
   }
   _technology.clear();
   requestTechnology();
-  const auto problem = sendStartCommand();
-  if (problem) return problem;
+  if (auto problem = sendStartCommand()) return problem;
   _isRunning = true;
   _seen = _platform.clock().now();
   if (_watch == ChannelWatch::ByClient) {

@@ -86,7 +86,7 @@ class LayoutWriter : private FieldWriter<Writer> {
 
   void part(const OutlinedPart& part) {
     writer.beginObject();
-    std::visit([this](const auto& known) { members(known); }, part);
+    std::visit([this](const auto& known) { this->members(known); }, part);
     writer.endObject();
   }
 

@@ -42,7 +42,7 @@ bool isEnabled(const ModemObjects& objects, std::string_view path) {
 }
 
 std::string ModemChoice::path(const ModemObjects& objects) {
-  const std::string found = find(objects);
+  std::string found = find(objects);
   if (found.empty()) return found;
   if (found != _path) _equipment.clear();
   _path = found;
