@@ -16,6 +16,7 @@
 #include "Tests/EndToEnd/IFXMessages.h"
 #include "Tests/EndToEnd/PacketMessages.h"
 #include "Tests/EndToEnd/Process.h"
+#include "Tests/EndToEnd/RecordingFixture.h"
 #include "Tests/Support/TemporaryDirectory.h"
 
 namespace kestro::testing {
@@ -34,20 +35,8 @@ constexpr std::string_view kTwoModes =
     "2019.11.21_15.38.30,LTE,-90,-7,-70,1,9CBA,258,51.5,-8.5\n"
     "2019.11.21_15.38.40,EDGE,-71,-,-,2B,1A,43,51.6,-8.6\n";
 
-class ConvertTest : public ::testing::Test {
+class ConvertTest : public RecordingFixture {
  protected:
-  static Outcome cli(std::vector<std::string> arguments) {
-    arguments.insert(arguments.begin(), "kestro-cli");
-    return run(std::move(arguments));
-  }
-
-  std::string capture(std::string_view name, const std::vector<std::string>& messages,
-                      std::string_view technology = "IFX") {
-    const auto path = directory.pathOf(name);
-    writeCapture(path, messages, 800ms, technology);
-    return path;
-  }
-
   /// Nothing else lies in the directory.
   [[nodiscard]] std::vector<std::string> files() const {
     std::vector<std::string> names;
@@ -57,8 +46,6 @@ class ConvertTest : public ::testing::Test {
     std::ranges::sort(names);
     return names;
   }
-
-  TemporaryDirectory directory;
 };
 
 TEST_F(ConvertTest, ACaptureComesBackByteForByteThroughADrive) {

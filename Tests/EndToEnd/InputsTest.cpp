@@ -13,6 +13,7 @@
 #include "Tests/EndToEnd/IFXMessages.h"
 #include "Tests/EndToEnd/PacketMessages.h"
 #include "Tests/EndToEnd/Process.h"
+#include "Tests/EndToEnd/RecordingFixture.h"
 #include "Tests/Support/TemporaryDirectory.h"
 
 namespace kestro::testing {
@@ -42,22 +43,7 @@ std::vector<std::string> linesOf(const std::string& text) {
   return lines;
 }
 
-class InputsEndToEndTest : public ::testing::Test {
- protected:
-  static Outcome cli(std::vector<std::string> arguments) {
-    arguments.insert(arguments.begin(), "kestro-cli");
-    return run(std::move(arguments));
-  }
-
-  std::string capture(std::string_view name, const std::vector<std::string>& messages,
-                      std::string_view technology = "IFX") {
-    const auto path = directory.pathOf(name);
-    writeCapture(path, messages, 800ms, technology);
-    return path;
-  }
-
-  TemporaryDirectory directory;
-};
+class InputsEndToEndTest : public RecordingFixture {};
 
 TEST_F(InputsEndToEndTest, AMissingInputIsStatusOneAndWrongOnesAreWrongUsage) {
   const auto ifx = capture("a.pcap", {ifxMessage("1")});
