@@ -19,7 +19,6 @@
 namespace kestro::testing {
 namespace {
 
-using namespace std::chrono_literals;
 using ::testing::Contains;
 using ::testing::ElementsAre;
 using ::testing::HasSubstr;
